@@ -1,0 +1,38 @@
+# Shared helpers for the project's targets.
+
+# Warnings as errors for our own code.
+function(sg_warnings target)
+    target_compile_options(${target} PRIVATE -Wall -Wextra -Wpedantic -Werror)
+endfunction()
+
+# sg_add_gtest(NAME name LABELS l1 [l2] SOURCES ... LIBS ... [ENV ...] [RESOURCE_LOCK lock] [TIMEOUT s])
+# Builds one GoogleTest executable and registers it as one CTest test with its labels.
+# Widget tests run headless through the offscreen platform.
+function(sg_add_gtest)
+    cmake_parse_arguments(T "" "NAME;TIMEOUT;RESOURCE_LOCK" "LABELS;SOURCES;LIBS;ENV" ${ARGN})
+    add_executable(${T_NAME} ${T_SOURCES})
+    target_link_libraries(${T_NAME} PRIVATE ${T_LIBS} GTest::gtest GTest::gtest_main)
+    sg_warnings(${T_NAME})
+    add_test(NAME ${T_NAME} COMMAND ${T_NAME})
+    if(NOT T_TIMEOUT)
+        set(T_TIMEOUT 300)
+    endif()
+    set_tests_properties(${T_NAME} PROPERTIES LABELS "${T_LABELS}" TIMEOUT ${T_TIMEOUT}
+        ENVIRONMENT "QT_QPA_PLATFORM=offscreen;SG_TEST_ARTIFACTS=${CMAKE_BINARY_DIR}/artifacts;${T_ENV}")
+    if(T_RESOURCE_LOCK)
+        set_tests_properties(${T_NAME} PROPERTIES RESOURCE_LOCK ${T_RESOURCE_LOCK})
+    endif()
+endfunction()
+
+# sg_add_fuzzer(NAME name SOURCES ... LIBS ... CORPUS dir)
+# A libFuzzer target (clang only, SG_BUILD_FUZZ=ON), built with AddressSanitizer and
+# UndefinedBehaviorSanitizer. scripts/run-fuzz.sh replays its corpus and fuzzes it for a bounded time.
+function(sg_add_fuzzer)
+    cmake_parse_arguments(F "" "NAME;CORPUS" "SOURCES;LIBS" ${ARGN})
+    add_executable(${F_NAME} ${F_SOURCES})
+    target_link_libraries(${F_NAME} PRIVATE ${F_LIBS})
+    target_compile_options(${F_NAME} PRIVATE -fsanitize=fuzzer)
+    target_link_options(${F_NAME} PRIVATE -fsanitize=fuzzer)
+    sg_warnings(${F_NAME})
+    set_property(GLOBAL APPEND PROPERTY SG_FUZZERS "${F_NAME}|${F_CORPUS}")
+endfunction()

@@ -1,0 +1,27 @@
+#!/usr/bin/env bash
+# Sets up, builds and runs every test suite. Usage: scripts/run-tests.sh [ctest args...]
+set -euo pipefail
+cd "$(dirname "$0")/.."
+ROOT=$PWD
+BUILD=${SG_BUILD_DIR:-$ROOT/build}
+JOBS=${SG_JOBS:-$(nproc)}
+
+bash scripts/setup-deps.sh
+
+export CCACHE_BASEDIR=$ROOT
+launcher=()
+command -v ccache >/dev/null && launcher=(-DCMAKE_CXX_COMPILER_LAUNCHER=ccache -DCMAKE_C_COMPILER_LAUNCHER=ccache)
+
+cmake -S . -B "$BUILD" -G Ninja -DCMAKE_BUILD_TYPE=RelWithDebInfo "${launcher[@]}"
+cmake --build "$BUILD" -j "$JOBS"
+
+export QT_QPA_PLATFORM=offscreen
+status=0
+# Sanitized fuzz targets: corpus replay plus a bounded run each (skipped with SG_SKIP_FUZZ=1).
+if [ "${SG_SKIP_FUZZ:-0}" != 1 ]; then
+    bash scripts/run-fuzz.sh || status=1
+fi
+
+# The test suites last, so that their summary closes the output.
+(cd "$BUILD" && ctest --output-on-failure -j "$JOBS" "$@") || status=1
+exit $status
