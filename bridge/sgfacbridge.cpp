@@ -43,7 +43,7 @@ SgControlRecord *controlRecord(SgSharedMemory &control) {
 
 SgFacBridge::SgFacBridge() : SgAction(QStringLiteral("Send to Facetor..."), QString()) {
     m_timer = new QTimer(this);
-    m_control = std::make_unique<SgSharedMemory>(kSgControlKey);
+    m_control = std::make_unique<SgSharedMemory>(kSgControlSegmentKey);
     connect(m_timer, &QTimer::timeout, this, &SgFacBridge::checkSharedMap);
     connect(sgApp, &SgApp::starting, this, &SgFacBridge::starting);
     connect(sgApp, &SgApp::closing, this, &SgFacBridge::closing);
@@ -118,9 +118,7 @@ void SgFacBridge::executeAction() {
     if (m_control->attach(SgSharedMemory::kReadWrite) &&
         m_control->size() >= int32_t(sizeof(SgControlRecord))) {
         // A fresh record: both slots free, no message, written before the modeler is told.
-        SgControlRecord fresh{};
-        fresh.hostToModelerFlag = 1;
-        fresh.modelerToHostFlag = 1;
+        const SgControlRecord fresh = SgControlRecord::fresh();
         std::memcpy(m_control->data(), &fresh, sizeof fresh);
     }
     startPolling();
@@ -159,8 +157,8 @@ QString SgFacBridge::modelerInstallPath() const {
     HKEY key = nullptr;
     if (RegOpenKeyExA(HKEY_LOCAL_MACHINE, "SOFTWARE\\Varn\\Facetor", 0, KEY_READ, &key) !=
             ERROR_SUCCESS &&
-        RegOpenKeyExA(HKEY_LOCAL_MACHINE, "SOFTWARE\\Varn\\Facetor", 0,
-                      KEY_READ | KEY_WOW64_64KEY, &key) != ERROR_SUCCESS)
+        RegOpenKeyExA(HKEY_LOCAL_MACHINE, "SOFTWARE\\Varn\\Facetor", 0, KEY_READ | KEY_WOW64_64KEY,
+                      &key) != ERROR_SUCCESS)
         return QString();
     char buffer[256] = {};
     DWORD type = 0;
@@ -207,10 +205,10 @@ bool SgFacBridge::postMessage(int code, int value) {
     bool posted = false;
     try {
         SgControlRecord *record = controlRecord(*m_control);
-        if (record->hostToModelerFlag == 1) {
-            record->hostToModelerCode = uint8_t(code);
-            record->hostToModelerParameter = value;
-            record->hostToModelerFlag = 0;
+        if (record->toModelerFlag == 1) {
+            record->toModelerCode = uint8_t(code);
+            record->toModelerParameter = value;
+            record->toModelerFlag = 0;
             posted = true;
         }
     } catch (const std::exception &) {
@@ -228,10 +226,10 @@ int SgFacBridge::readMessage(int &value) {
     int code = NoMessage;
     try {
         SgControlRecord *record = controlRecord(*m_control);
-        if (record->modelerToHostFlag == 0) {
-            value = record->modelerToHostParameter;
-            code = record->modelerToHostCode;
-            record->modelerToHostFlag = 1;
+        if (record->toHostFlag == 0) {
+            value = record->toHostParameter;
+            code = record->toHostCode;
+            record->toHostFlag = 1;
         }
     } catch (const std::exception &) {
         code = NoMessage;
@@ -257,7 +255,7 @@ void SgFacBridge::sendNext() {
         return;
     releaseDataSegment();
     if (!m_data)
-        m_data = std::make_unique<SgSharedMemory>(kSgDataKey);
+        m_data = std::make_unique<SgSharedMemory>(kSgDataSegmentKey);
     if (m_data->exists()) {
         // The modeler still holds the last record: ask it to let go, send nothing now.
         m_data->attach(SgSharedMemory::kReadWrite);
@@ -329,7 +327,7 @@ void SgFacBridge::checkSharedMap() {
 
 void SgFacBridge::receiveGeometry() {
     if (!m_data)
-        m_data = std::make_unique<SgSharedMemory>(kSgDataKey);
+        m_data = std::make_unique<SgSharedMemory>(kSgDataSegmentKey);
     std::unique_ptr<SgPolyShape> shape;
     if (m_data->exists() && m_data->attach(SgSharedMemory::kReadWrite)) {
         if (m_data->lock()) {
@@ -405,8 +403,10 @@ void SgFacBridge::copyMaterialsToTarget(SgPolyShape *shape, SgNode *target) {
     if (!targetShape)
         return;
     for (SgMaterial *returned : shape->getAllMaterials()) {
-        auto *namesake = dynamic_cast<SgDefaultMaterial *>(targetShape->findMaterial(returned->getName()));
-        auto *diffuse = dynamic_cast<SgColorProperty *>(returned->findProperty(QStringLiteral("Diffuse Color")));
+        auto *namesake =
+            dynamic_cast<SgDefaultMaterial *>(targetShape->findMaterial(returned->getName()));
+        auto *diffuse = dynamic_cast<SgColorProperty *>(
+            returned->findProperty(QStringLiteral("Diffuse Color")));
         if (!namesake || !diffuse)
             continue;
         namesake->setDiffuseColor(diffuse->getColorValue());

@@ -28,7 +28,8 @@ bool describe() {
 const bool s_described = describe();
 
 // The class identifier of SgFacBridge; fixed for every build.
-const SgGUID s_classGuid = SgGUID::fromString(QStringLiteral("6b1f3c2e-8d4a-4e57-9a0c-5f2e7d914b36"));
+const SgGUID s_classGuid =
+    SgGUID::fromString(QStringLiteral("6b1f3c2e-8d4a-4e57-9a0c-5f2e7d914b36"));
 
 SgFacBridgeFactory s_factory(s_classGuid, &s_definition);
 

@@ -12,8 +12,8 @@ constexpr int kControlLockMs = 25;
 } // namespace
 
 SgFacetorLink::SgFacetorLink()
-    : m_control(std::make_unique<SgSharedMemory>(kSgControlKey)),
-      m_data(std::make_unique<SgSharedMemory>(kSgDataKey)) {}
+    : m_control(std::make_unique<SgSharedMemory>(kSgControlSegmentKey)),
+      m_data(std::make_unique<SgSharedMemory>(kSgDataSegmentKey)) {}
 
 SgFacetorLink::~SgFacetorLink() = default;
 
@@ -29,7 +29,7 @@ bool SgFacetorLink::tryLink() {
     // The host writes a fresh record (both flags "free") right after creating the segment; a
     // record of zeros is one the host has not set up yet.
     const auto *record = reinterpret_cast<const SgControlRecord *>(m_control->data());
-    const bool ready = record->modelerToHostFlag == 1;
+    const bool ready = record->toHostFlag == 1;
     m_control->unlock();
     if (!ready) {
         m_control->detach();
@@ -44,10 +44,10 @@ bool SgFacetorLink::post(int code, int value) {
         return false;
     auto *record = reinterpret_cast<SgControlRecord *>(m_control->data());
     bool posted = false;
-    if (record->modelerToHostFlag == 1) {
-        record->modelerToHostCode = uint8_t(code);
-        record->modelerToHostParameter = value;
-        record->modelerToHostFlag = 0;
+    if (record->toHostFlag == 1) {
+        record->toHostCode = uint8_t(code);
+        record->toHostParameter = value;
+        record->toHostFlag = 0;
         posted = true;
     }
     m_control->unlock();
@@ -59,10 +59,10 @@ int SgFacetorLink::take(int &value) {
         return -1;
     auto *record = reinterpret_cast<SgControlRecord *>(m_control->data());
     int code = -1;
-    if (record->hostToModelerFlag == 0) {
-        code = record->hostToModelerCode;
-        value = record->hostToModelerParameter;
-        record->hostToModelerFlag = 1;
+    if (record->toModelerFlag == 0) {
+        code = record->toModelerCode;
+        value = record->toModelerParameter;
+        record->toModelerFlag = 1;
     }
     m_control->unlock();
     return code;

@@ -43,8 +43,8 @@ void SgFacetorModeler::requestQuit() {
 }
 
 void SgFacetorModeler::log(const QString &line) {
-    const QString stamped = QStringLiteral("%1 %2\n")
-                                .arg(QDateTime::currentDateTime().toString(Qt::ISODateWithMs), line);
+    const QString stamped = QStringLiteral("%1 %2\n").arg(
+        QDateTime::currentDateTime().toString(Qt::ISODateWithMs), line);
     if (m_logFile) {
         m_logFile->write(stamped.toUtf8());
         m_logFile->flush();

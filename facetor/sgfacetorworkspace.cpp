@@ -33,15 +33,15 @@ bool writeMtl(const QString &path, const SgExchangeNode &node) {
         out << "\nnewmtl " << materialName(node, uint32_t(m)) << "\n";
         out << "Kd " << number(material.diffuse[0]) << ' ' << number(material.diffuse[1]) << ' '
             << number(material.diffuse[2]) << "\n";
-        out << "Ks " << number(material.specular[0]) << ' ' << number(material.specular[1])
-            << ' ' << number(material.specular[2]) << "\n";
+        out << "Ks " << number(material.specular[0]) << ' ' << number(material.specular[1]) << ' '
+            << number(material.specular[2]) << "\n";
         out << "Ns " << number((1.0f - material.invertedGlossiness) * 1000.0f) << "\n";
         out << "d " << number(material.opacity) << "\n";
         if (!material.diffuseImageCopy.isEmpty())
             out << "map_Kd " << material.diffuseImageCopy << "\n";
         if (!material.bumpImageCopy.isEmpty())
-            out << "map_bump -bm " << number(material.bumpStrength) << ' '
-                << material.bumpImageCopy << "\n";
+            out << "map_bump -bm " << number(material.bumpStrength) << ' ' << material.bumpImageCopy
+                << "\n";
     }
     return file.commit();
 }
@@ -196,7 +196,9 @@ bool SgFacetorWorkspace::readObj(const QString &path, const QString &name, SgExc
         } else if (key == QLatin1String("f")) {
             const int cornerCount = int(parts.size()) - 1;
             if (cornerCount < 3 || cornerCount > kMaxPolygonCorners) {
-                error = QStringLiteral("Line %1: a face with %2 corners.").arg(lineNumber).arg(cornerCount);
+                error = QStringLiteral("Line %1: a face with %2 corners.")
+                            .arg(lineNumber)
+                            .arg(cornerCount);
                 return false;
             }
             if (activeMaterial < 0) {

@@ -105,9 +105,9 @@ inline SgPolyShape *makeShape(const QString &name, SgPolyMesh *mesh,
 // A prop node labelled `name` whose object shows a triangle around `at`.
 inline SgNode *makeProp(const QString &name, SgVec3 at = SgVec3()) {
     auto *object = new SgObject(name);
-    object->addShape(makeShape(name, makeMesh({SgVec3(at.x, at.y, at.z),
-                                               SgVec3(at.x + 10, at.y, at.z),
-                                               SgVec3(at.x, at.y + 10, at.z)})));
+    object->addShape(
+        makeShape(name, makeMesh({SgVec3(at.x, at.y, at.z), SgVec3(at.x + 10, at.y, at.z),
+                                  SgVec3(at.x, at.y + 10, at.z)})));
     auto *node = new SgNode(name);
     node->setObject(object);
     return node;

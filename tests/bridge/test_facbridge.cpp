@@ -36,7 +36,7 @@ public:
 // The modeler's view of the control record, from a second segment object.
 class Peer {
 public:
-    Peer() : m_control(kSgControlKey) { m_control.attach(SgSharedMemory::kReadWrite); }
+    Peer() : m_control(kSgControlSegmentKey) { m_control.attach(SgSharedMemory::kReadWrite); }
     SgControlRecord record() const {
         SgControlRecord copy{};
         if (m_control.data())
@@ -45,16 +45,16 @@ public:
     }
     SgControlRecord *live() { return reinterpret_cast<SgControlRecord *>(m_control.data()); }
     void post(int code) {
-        live()->modelerToHostCode = uint8_t(code);
-        live()->modelerToHostParameter = 0;
-        live()->modelerToHostFlag = 0;
+        live()->toHostCode = uint8_t(code);
+        live()->toHostParameter = 0;
+        live()->toHostFlag = 0;
     }
     // Takes the host's message: its code, or -1 when none waits.
     int take() {
-        if (live()->hostToModelerFlag != 0)
+        if (live()->toModelerFlag != 0)
             return -1;
-        live()->hostToModelerFlag = 1;
-        return live()->hostToModelerCode;
+        live()->toModelerFlag = 1;
+        return live()->toModelerCode;
     }
 
 private:
@@ -132,8 +132,7 @@ TEST_F(BridgeAction, CollectingSendsEachFigureOnceWithFollowersAndDescendants) {
         scene()->selectNode(scene()->findNodeByLabel(QString::fromLatin1(label)), true);
     StandInModeler modeler;
     bridge.executeAction();
-    EXPECT_EQ(labels(bridge.sendList()),
-              (QStringList{"Body", "Shirt", "Ring", "Hat", "Cup"}));
+    EXPECT_EQ(labels(bridge.sendList()), (QStringList{"Body", "Shirt", "Ring", "Hat", "Cup"}));
 
     TestBridge single;
     single.collectNode(nullptr);
@@ -167,10 +166,10 @@ TEST_F(BridgeAction, NothingSelectedAsksBeforeLaunching) {
     EXPECT_EQ(bridge.sendList().count(), 0);
     // The control record was written fresh: both slots free, nothing else.
     const SgControlRecord record = Peer().record();
-    EXPECT_EQ(record.hostToModelerFlag, 1);
-    EXPECT_EQ(record.modelerToHostFlag, 1);
-    EXPECT_EQ(record.hostToModelerCode, 0);
-    EXPECT_EQ(record.modelerToHostParameter, 0);
+    EXPECT_EQ(record.toModelerFlag, 1);
+    EXPECT_EQ(record.toHostFlag, 1);
+    EXPECT_EQ(record.toModelerCode, 0);
+    EXPECT_EQ(record.toHostParameter, 0);
 }
 
 TEST_F(BridgeAction, TriggeringWhileActiveAppendsWithoutALaunch) {
@@ -193,8 +192,8 @@ TEST_F(BridgeAction, AMissingModelerIsLoggedAndTheBridgeStaysIdle) {
     scene()->selectNode(scene()->findNodeByLabel(QStringLiteral("Cup")));
     bridge.executeAction();
     qunsetenv("FACETOR_INSTALL_PATH");
-    EXPECT_TRUE(sgApp->getMessageSink()->logLines().contains(
-        QStringLiteral("Failed to launch Facetor.")));
+    EXPECT_TRUE(
+        sgApp->getMessageSink()->logLines().contains(QStringLiteral("Failed to launch Facetor.")));
     EXPECT_FALSE(bridge.isActive());
     EXPECT_FALSE(bridge.pollTimer()->isActive());
     EXPECT_EQ(labels(bridge.sendList()), QStringList{"Cup"});
@@ -213,18 +212,18 @@ TEST_F(BridgeAction, MessagesWaitForTheirSlot) {
     EXPECT_EQ(bridge->readMessage(value), 5); // nothing waits
     EXPECT_TRUE(bridge->postMessage(4, 7));
     const SgControlRecord before = peer.record();
-    EXPECT_EQ(before.hostToModelerFlag, 0);
-    EXPECT_EQ(before.hostToModelerCode, 4);
-    EXPECT_EQ(before.hostToModelerParameter, 7);
+    EXPECT_EQ(before.toModelerFlag, 0);
+    EXPECT_EQ(before.toModelerCode, 4);
+    EXPECT_EQ(before.toModelerParameter, 7);
     EXPECT_FALSE(bridge->postMessage(1, 9));
     EXPECT_EQ(std::memcmp(&before, peer.live(), sizeof before), 0);
 
-    peer.live()->modelerToHostParameter = -3;
-    peer.live()->modelerToHostCode = 200;
-    peer.live()->modelerToHostFlag = 0;
+    peer.live()->toHostParameter = -3;
+    peer.live()->toHostCode = 200;
+    peer.live()->toHostFlag = 0;
     EXPECT_EQ(bridge->readMessage(value), 200);
     EXPECT_EQ(value, -3);
-    EXPECT_EQ(peer.record().modelerToHostFlag, 1);
+    EXPECT_EQ(peer.record().toHostFlag, 1);
 
     // Closing says goodbye once the slot is free, and gives up quietly while it is taken.
     bridge->closing();
@@ -245,8 +244,8 @@ TEST_F(BridgeAction, ThePollCountsIdlePollsAndRetriesBeforeNotices) {
     EXPECT_EQ(peer.take(), -1);
     bridge->checkSharedMap(); // the eleventh poll sends the idle notice
     EXPECT_EQ(bridge->idlePolls(), 1);
-    EXPECT_EQ(peer.record().hostToModelerCode, 0);
-    EXPECT_EQ(peer.record().hostToModelerFlag, 0);
+    EXPECT_EQ(peer.record().toModelerCode, 0);
+    EXPECT_EQ(peer.record().toModelerFlag, 0);
 
     // Geometry announced without a readable segment is still acknowledged; with the slot
     // taken the acknowledgement waits in the retry queue.
@@ -271,11 +270,11 @@ TEST_F(BridgeAction, ThePollCountsIdlePollsAndRetriesBeforeNotices) {
     EXPECT_TRUE(bridge->isExchangeBusy());
     EXPECT_EQ(bridge->sendList().count(), 0);
     EXPECT_EQ(peer.take(), 1);
-    EXPECT_TRUE(SgSharedMemory(kSgDataKey).exists());
+    EXPECT_TRUE(SgSharedMemory(kSgDataSegmentKey).exists());
     peer.post(3);
     bridge->checkSharedMap();
     EXPECT_FALSE(bridge->isExchangeBusy());
-    EXPECT_FALSE(SgSharedMemory(kSgDataKey).exists());
+    EXPECT_FALSE(SgSharedMemory(kSgDataSegmentKey).exists());
 
     // The modeler quits: the poll stops and the link is dropped.
     peer.post(2);
@@ -293,8 +292,8 @@ TEST_F(BridgeAction, TheHostSwitchLinksWithoutRewritingTheRecord) {
     EXPECT_TRUE(bridge.pollTimer()->isActive());
     EXPECT_EQ(bridge.modelerProcessId(), 0);
     const SgControlRecord record = Peer().record();
-    EXPECT_EQ(record.hostToModelerFlag, 0);
-    EXPECT_EQ(record.modelerToHostFlag, 0);
+    EXPECT_EQ(record.toModelerFlag, 0);
+    EXPECT_EQ(record.toHostFlag, 0);
     // The host's start-up restarts the poll of a linked bridge.
     bridge.pollTimer()->stop();
     sgApp->emitStarting();
@@ -314,7 +313,7 @@ TEST_F(BridgeAction, ReturnedGeometryWithoutANamesakeBecomesAProp) {
     returned.facets.push_back({'T', 0, 0, 3});
     returned.corners = {{0, -1, -1}, {1, -1, -1}, {2, -1, -1}};
     const QByteArray record = SgFacetorReturn::encode(returned);
-    SgSharedMemory data(kSgDataKey);
+    SgSharedMemory data(kSgDataSegmentKey);
     ASSERT_TRUE(data.create(int32_t(record.size())));
     ASSERT_TRUE(data.attach(SgSharedMemory::kReadWrite));
     std::memcpy(data.data(), record.constData(), size_t(record.size()));
@@ -323,7 +322,7 @@ TEST_F(BridgeAction, ReturnedGeometryWithoutANamesakeBecomesAProp) {
     EXPECT_EQ(peer.take(), 3);
     data.detach();
     data.remove(SgSharedMemory::kRemoveUnlocked);
-    EXPECT_FALSE(SgSharedMemory(kSgDataKey).exists());
+    EXPECT_FALSE(SgSharedMemory(kSgDataSegmentKey).exists());
 
     SgNode *prop = scene()->findNodeByLabel(QStringLiteral("Gizmo"));
     ASSERT_NE(prop, nullptr);
@@ -370,8 +369,8 @@ TEST_F(BridgeAction, CopyingMaterialsTouchesOnlyNamesakesDiffuse) {
     }
     scene()->addNode(figure);
 
-    auto *returned = bridgetest::makeShape(QStringLiteral("Body"),
-                                           bridgetest::makeMesh({{0, 0, 0}}));
+    auto *returned =
+        bridgetest::makeShape(QStringLiteral("Body"), bridgetest::makeMesh({{0, 0, 0}}));
     auto *skin = static_cast<SgDefaultMaterial *>(returned->getMaterial(0));
     skin->setDiffuseColor(QColor(255, 128, 0));
     skin->setSpecularColor(QColor(1, 2, 3));

@@ -62,24 +62,6 @@ TEST(Plugin, LoadingGivesTheDefinitionAndOneWorkingAction) {
     EXPECT_EQ(sdk(), 0x0300013Du);
 }
 
-TEST(Plugin, TheLoaderRefusesWhatIsNotAUsablePlugin) {
-    bridgetest::app();
-    SgPluginLoader missing;
-    EXPECT_FALSE(missing.load(QStringLiteral("/nonexistent/libnothing.so")));
-    EXPECT_FALSE(missing.errorString().isEmpty());
-    EXPECT_EQ(missing.plugin(), nullptr);
-
-    // A real library without the entry points: the host's own core.
-    SgPluginLoader notPlugin;
-    EXPECT_FALSE(notPlugin.load(QStringLiteral(SGCORE_LIBRARY_PATH)));
-    EXPECT_TRUE(notPlugin.actions().isEmpty());
-
-    EXPECT_TRUE(SgPluginLoader::isCompatibleSdk(0x0300013D));
-    EXPECT_TRUE(SgPluginLoader::isCompatibleSdk(0x03000100));
-    EXPECT_FALSE(SgPluginLoader::isCompatibleSdk(0x0300013E)); // newer than the host
-    EXPECT_FALSE(SgPluginLoader::isCompatibleSdk(0x0200013D)); // another major version
-}
-
 TEST(Plugin, EveryScriptEngineGetsTheConstructorAndObjectsStayWithCpp) {
     SgPluginLoader &loader = loadedPlugin();
     QJSEngine first;
