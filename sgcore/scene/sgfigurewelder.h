@@ -51,6 +51,9 @@ class SgVertexMesh;
 // vertices that none of the bone's facets use are carried by extra degenerate facets of the
 // group, so that the extraction still finds them.)
 //
+// The welder keeps pointers to the bones and a reference on each bone's geometry: use it while
+// the figure exists and its geometry is not edited.
+//
 // Cost: building and unWeld are O(total vertices + total corners) (a hash on positions for
 // welding), independent of the number of bones.
 class SgFigureWelder {

@@ -14,7 +14,8 @@ class SgSkeleton;
 
 // A scene node: a named, labelled element in a parent/child hierarchy, with an origin (the
 // pivot of its rotation), a local rotation, a translation, a hidden flag and an optional
-// object (its geometry). A node owns its object; the scene owns its nodes.
+// object (its geometry). A node owns its object; the scene owns its nodes (children are not
+// owned by their parent: destroying a node detaches its children).
 //
 // Geometry of an object is stored in rest position in scene coordinates. The world-space
 // transform maps origin-relative coordinates to the world:
