@@ -8,6 +8,7 @@
 #include <QFile>
 #include <QHash>
 
+#include <algorithm>
 #include <charconv>
 #include <cmath>
 #include <cstdint>
@@ -297,22 +298,31 @@ private:
         return true;
     }
 
+    // Appends the collected corners; grows by doubling so that the copy stays inline.
+    static void appendCorners(std::vector<SgFaceCorner> &to,
+                              const std::vector<SgFaceCorner> &from) {
+        if (to.capacity() - to.size() < from.size()) {
+            to.reserve(std::max(to.capacity() * 2, to.size() + from.size()));
+        }
+        for (const SgFaceCorner &c : from) {
+            to.push_back(c);
+        }
+    }
+
     void addFace() {
         const size_t n = m_corners.size();
         const auto mat = static_cast<uint8_t>(m_material);
         if (n == 3) {
-            m_mesh->triangleCorners().insert(m_mesh->triangleCorners().end(), m_corners.begin(),
-                                             m_corners.end());
+            appendCorners(m_mesh->triangleCorners(), m_corners);
             m_mesh->triangleMaterials().push_back(mat);
             m_mesh->triangleGroups().push_back(m_group);
         } else if (n == 4) {
-            m_mesh->quadCorners().insert(m_mesh->quadCorners().end(), m_corners.begin(),
-                                         m_corners.end());
+            appendCorners(m_mesh->quadCorners(), m_corners);
             m_mesh->quadMaterials().push_back(mat);
             m_mesh->quadGroups().push_back(m_group);
         } else {
             auto &corners = m_mesh->polygonCorners();
-            corners.insert(corners.end(), m_corners.begin(), m_corners.end());
+            appendCorners(corners, m_corners);
             m_mesh->polygonStarts().push_back(static_cast<uint32_t>(corners.size()));
             m_mesh->polygonMaterials().push_back(mat);
             m_mesh->polygonGroups().push_back(m_group);
