@@ -1,6 +1,7 @@
 #include "sharedsource/propertyui/sgcreatepropertydlg.h"
 
 #include "sgcore/app/sgapp.h"
+#include "sgcore/app/sgimagemgr.h"
 #include "sgcore/geometry/sgmodifier.h"
 #include "sgcore/geometry/sgobject.h"
 #include "sgcore/morph/sgmorph.h"
@@ -466,12 +467,12 @@ void SgCreatePropertyDlg::updateDisplay() {
         m_defaultNodeLabel->setText(tr("Default Node:"));
         m_nodePage->setTitle(tr("Node Attributes"));
     }
-    fillNodeMenus();
+    fillChoosers();
     m_nodeMenu->setCurrentNode(nullptr);
     m_defaultNodeMenu->setCurrentNode(nullptr);
 }
 
-void SgCreatePropertyDlg::fillNodeMenus() {
+void SgCreatePropertyDlg::fillChoosers() {
     switch (currentType()) {
     case NumericNodeType:
         m_numericNodeMenu->setNodes(sceneNodes());
@@ -486,6 +487,15 @@ void SgCreatePropertyDlg::fillNodeMenus() {
         const QList<SgNode *> skeletons = m_skeletonMenuNodes.value_or(sceneSkeletons());
         m_nodeMenu->setNodes(skeletons);
         m_defaultNodeMenu->setNodes(skeletons);
+        break;
+    }
+    case ImageType: {
+        QList<SgTexture *> images;
+        if (SgImageMgr *manager = sgApp->getImageMgr()) {
+            for (int i = 0; i < manager->getImageCount(); ++i)
+                images.append(manager->getImageAt(i));
+        }
+        m_imageMenu->setImages(images);
         break;
     }
     default:

@@ -170,7 +170,7 @@ private:
     QTreeWidgetItem *enumPlaceholder() const;
     void renumberEnumRows();
     void swapEnumLabels(QTreeWidgetItem *upper, QTreeWidgetItem *lower);
-    void fillNodeMenus();
+    void fillChoosers();
     void configureFloat(SgProperty *property) const;
     void configureBase(SgProperty *property) const;
     void warn(const QString &text);

@@ -95,8 +95,6 @@ protected:
         sgApp->getScene()->addNode(node);
         return node;
     }
-
-    uitest::ModalGuard guard;
 };
 
 const QString Header = "Could not create properties for the following reasons:\n";

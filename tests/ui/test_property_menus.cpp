@@ -37,8 +37,6 @@ protected:
         EXPECT_EQ(element->addProperty(property), 0);
         return property;
     }
-
-    uitest::ModalGuard guard;
 };
 
 // Answers the next popup by choosing `path`.

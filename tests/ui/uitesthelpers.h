@@ -95,30 +95,6 @@ inline void answerMessageBox(QString *text, const QString &buttonText = QStringL
         previous);
 }
 
-// Closes stray modal widgets and popups after a few seconds, so that a broken test fails instead
-// of hanging. One per test.
-class ModalGuard {
-public:
-    ModalGuard() {
-        m_timer.setInterval(4000);
-        QObject::connect(&m_timer, &QTimer::timeout, [] {
-            if (QWidget *popup = QApplication::activePopupWidget()) {
-                ADD_FAILURE() << "closing a stray popup";
-                popup->close();
-            }
-            if (QWidget *modal = QApplication::activeModalWidget()) {
-                ADD_FAILURE() << "closing a stray modal widget "
-                              << modal->metaObject()->className();
-                modal->close();
-            }
-        });
-        m_timer.start();
-    }
-
-private:
-    QTimer m_timer;
-};
-
 // Picks the entry `path` (texts, one per menu level) in `menu`: sub-menus are opened with the
 // keyboard and the last entry is activated with Return, as a user would.
 inline void chooseInMenu(QMenu *menu, QStringList path) {
