@@ -10,6 +10,7 @@
 
 #include <gtest/gtest.h>
 
+#include <cstring>
 #include <memory>
 #include <random>
 #include <vector>
@@ -45,9 +46,10 @@ QByteArray validRecord() {
 
 // Reads `bytes` from a heap block of exactly their size, so that a read past it is caught.
 std::unique_ptr<SgPolyShape> readExact(const QByteArray &bytes) {
-    std::vector<char> block(bytes.begin(), bytes.end());
+    const std::unique_ptr<char[]> block(new char[size_t(bytes.size())]);
+    std::memcpy(block.get(), bytes.constData(), size_t(bytes.size()));
     QString trailer;
-    SgExchangeReader reader(block.empty() ? nullptr : block.data(), block.size());
+    SgExchangeReader reader(block.get(), size_t(bytes.size()));
     return std::unique_ptr<SgPolyShape>(reader.readShape(trailer));
 }
 
