@@ -8,6 +8,9 @@
 #include "sgcore/geometry/sgpolymesh.h"
 #include "sgcore/geometry/sgpolyshape.h"
 
+#include <QDir>
+#include <QFile>
+
 #include <gtest/gtest.h>
 
 #include <cstring>
@@ -130,6 +133,19 @@ TEST_F(ExchangeRobustnessTest, BadCountsAndIndicesAreRejected) {
         clearLog();
         EXPECT_FALSE(readExact(bad)) << "at " << c.at << " value " << c.value;
         EXPECT_EQ(logLines(), QStringList{"Error reading memory map"});
+    }
+}
+
+TEST_F(ExchangeRobustnessTest, FuzzSeedsAreValidRecords) {
+    const QDir corpus(QStringLiteral(SG_EXCHANGE_CORPUS));
+    const QStringList seeds = corpus.entryList(QDir::Files);
+    ASSERT_GE(seeds.size(), 5);
+    for (const QString &seed : seeds) {
+        QFile file(corpus.filePath(seed));
+        ASSERT_TRUE(file.open(QIODevice::ReadOnly));
+        auto shape = readExact(file.readAll());
+        ASSERT_TRUE(shape) << seed.toStdString();
+        expectSound(*shape);
     }
 }
 
