@@ -90,11 +90,14 @@ int main(int argc, char **argv) {
     const QByteArray mixedRecord = SgReturnRecordWriter("Prop", *mixed, two, "t").toByteArray();
     ok &= save(folder, "mixed", mixedRecord);
 
-    // An unknown facet type: the quad of material 0 (first facet) relabelled 'X'.
+    // An unknown facet type: the quad of material 0 (first facet) relabelled 'X' and left
+    // with no corners (a type the reader does not know has none).
     QByteArray unknown = mixedRecord;
     const qsizetype quad = unknown.indexOf(QByteArray("Q\0\0\0\0", 5));
-    if (quad > 0)
+    if (quad > 0) {
         unknown[quad] = 'X';
+        unknown.remove(quad + 5, 48);
+    }
     ok &= save(folder, "unknown-type", unknown);
 
     // A polygon record of two corners (an empty face).
