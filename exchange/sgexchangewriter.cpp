@@ -104,9 +104,14 @@ std::int64_t SgExchangeWriter::measure() const {
 }
 
 std::int32_t SgExchangeWriter::write(void *destination) const {
-    if (!m_node || !m_shape || !m_geometry || !destination || m_measuredSize == 0)
+    return write(destination, m_measuredSize);
+}
+
+std::int32_t SgExchangeWriter::write(void *destination, std::int64_t capacity) const {
+    if (!m_node || !m_shape || !m_geometry || !destination || m_measuredSize == 0 || capacity <= 0)
         return 0;
-    SgRecordOutput output(destination, static_cast<std::size_t>(m_measuredSize));
+    SgRecordOutput output(
+        destination, static_cast<std::size_t>(std::min<std::int64_t>(capacity, m_measuredSize)));
     if (writeMesh(output) == 0)
         return 0;
     try {

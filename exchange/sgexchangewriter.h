@@ -40,14 +40,17 @@ public:
     // mesh or 53 patches + 4 for a subdivision mesh, and never below the size that the real
     // image path strings need. 0 when the node has nothing to send or the record would exceed
     // 2 GiB.
-    std::int32_t getMeasuredSize() const { return m_measuredSize; }
+    std::int32_t getSize() const { return m_measuredSize; }
 
-    // Writes the record at `destination`, which must hold getMeasuredSize() bytes, and returns
-    // the bytes written. 0 (with "Error writting node to shared memory map." in the host log)
+    // Writes the record at `destination`, which must hold getSize() bytes, and returns the
+    // bytes written. 0 (with "Error writting node to shared memory map." in the host log)
     // when it fails; 0 without a message when the node, shape, geometry or destination is
     // missing. Cost: about two sweeps over the facets and one over the vertices, plus one JPEG
     // export per image not yet copied.
     std::int32_t write(void *destination) const;
+    // The same for a destination of `capacity` bytes (the segment's size): nothing is written
+    // past min(capacity, getSize()); a record that does not fit fails as above.
+    std::int32_t write(void *destination, std::int64_t capacity) const;
 
     // The shape and geometry that are sent (null when the node has nothing to send).
     SgShape *getShape() const { return m_shape; }

@@ -24,10 +24,7 @@ namespace {
 
 class ExchangeRobustnessTest : public ::testing::Test {
 protected:
-    void SetUp() override {
-        ensureApp();
-        clearLog();
-    }
+    void SetUp() override { clearLog(); }
 };
 
 // A record with every kind of field: UVs, two materials with images, 'T', 'Q' and 'P'.

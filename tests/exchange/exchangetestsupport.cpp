@@ -4,7 +4,6 @@
 #include "exchange/sgrecordinput.h"
 #include "exchange/sgrecordoutput.h"
 #include "sgcore/app/sgapp.h"
-#include "sgcore/app/sgappsettings.h"
 #include "sgcore/app/sgmessagesink.h"
 #include "sgcore/geometry/sgmap.h"
 #include "sgcore/geometry/sgobject.h"
@@ -12,27 +11,7 @@
 #include "sgcore/geometry/sgshape.h"
 #include "sgcore/scene/sgnode.h"
 
-#include <QApplication>
-#include <QTemporaryDir>
-
 namespace exchangetest {
-
-namespace {
-QTemporaryDir *folder = nullptr;
-}
-
-void ensureApp() {
-    if (sgApp)
-        return;
-    static int argc = 1;
-    static char name[] = "exchange-test";
-    static char *argv[] = {name, nullptr};
-    new QApplication(argc, argv);
-    folder = new QTemporaryDir;
-    SgAppSettings::setFileName(folder->filePath(QStringLiteral("scenara.ini")));
-    new SgApp;
-    sgApp->setTempPath(folder->filePath(QStringLiteral("temp")));
-}
 
 QStringList logLines() {
     return sgApp->getMessageSink()->logLines();
@@ -80,8 +59,8 @@ SgNode *makeNode(const QString &label, SgShape *shape) {
 QByteArray writeNode(SgNode *node, const QString &trailer, std::int32_t *measured) {
     SgExchangeWriter writer(node, trailer);
     if (measured)
-        *measured = writer.getMeasuredSize();
-    QByteArray bytes(writer.getMeasuredSize(), '\x7f');
+        *measured = writer.getSize();
+    QByteArray bytes(writer.getSize(), '\x7f');
     const std::int32_t written = writer.write(bytes.data());
     bytes.truncate(written);
     return bytes;

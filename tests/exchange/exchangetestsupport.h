@@ -19,13 +19,10 @@ struct SgVec3;
 // Helpers shared by the exchange tests.
 namespace exchangetest {
 
-// Makes the application (QApplication and SgApp) once per process, with settings and the
-// temporary folder pointed into a fresh folder of its own.
-void ensureApp();
 // The host log so far, and forgetting it.
 QStringList logLines();
 void clearLog();
-// The application's temporary folder for this test process.
+// The application's temporary folder (the test main makes a fresh one per program).
 QString tempPath();
 
 // A material with none of the standard properties.

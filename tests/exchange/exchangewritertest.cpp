@@ -30,10 +30,7 @@ namespace {
 
 class ExchangeWriterTest : public ::testing::Test {
 protected:
-    void SetUp() override {
-        ensureApp();
-        clearLog();
-    }
+    void SetUp() override { clearLog(); }
 };
 
 // A prop node with one polygon shape; the node owns everything.
@@ -267,10 +264,10 @@ TEST_F(ExchangeWriterTest, LongImagePathsStayInsideTheMeasuredSize) {
     auto node = prop("L", makeMesh({}), {material});
 
     SgExchangeWriter writer(node.get(), QString());
-    QByteArray buffer(writer.getMeasuredSize() + 16, '\x7f');
+    QByteArray buffer(writer.getSize() + 16, '\x7f');
     const std::int32_t written = writer.write(buffer.data());
     ASSERT_GT(written, 0);
-    EXPECT_LE(written, writer.getMeasuredSize());
+    EXPECT_LE(written, writer.getSize());
     EXPECT_TRUE(buffer.contains(deep.toLatin1()));
     EXPECT_EQ(buffer.right(16), QByteArray(16, '\x7f'));
 }
@@ -322,9 +319,29 @@ TEST_F(ExchangeWriterTest, SubdivisionPatchesAreWrittenAsQuads) {
 TEST_F(ExchangeWriterTest, NothingToSendMeasuresZeroAndWritesNothing) {
     SgNode bare("empty");
     SgExchangeWriter writer(&bare, QString());
-    EXPECT_EQ(writer.getMeasuredSize(), 0);
+    EXPECT_EQ(writer.getSize(), 0);
     char byte = 0;
     EXPECT_EQ(writer.write(&byte), 0);
     SgExchangeWriter none(nullptr, QString());
     EXPECT_EQ(none.write(&byte), 0);
+}
+
+TEST_F(ExchangeWriterTest, ADestinationTooSmallIsNeverOverrun) {
+    SgPolyMesh *mesh = makeMesh({{0, 0, 0}, {10, 0, 0}, {0, 10, 0}});
+    addFacet(*mesh, 0, {{0}, {1}, {2}});
+    auto node = prop("A", mesh, {new BareMaterial("a-long-material-name")});
+    SgExchangeWriter writer(node.get(), QString());
+    for (const int capacity : {3, 60, 130}) {
+        clearLog();
+        QByteArray buffer(200, '\x7f');
+        EXPECT_EQ(writer.write(buffer.data(), capacity), 0);
+        EXPECT_EQ(buffer.mid(capacity), QByteArray(200 - capacity, '\x7f'));
+        EXPECT_TRUE(logLines().contains("Error writting node to shared memory map."));
+    }
+    // A string that does not fit says so too.
+    clearLog();
+    QByteArray buffer(200, '\x7f');
+    EXPECT_EQ(writer.write(buffer.data(), 2), 0);
+    EXPECT_EQ(logLines(), (QStringList{"Error writting string to shared memory map.",
+                                       "Error writting node to shared memory map."}));
 }
