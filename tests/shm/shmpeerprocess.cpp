@@ -39,7 +39,7 @@ std::string peerProgram() {
 #ifdef _WIN32
 
 ShmPeerProcess::ShmPeerProcess() {
-    SECURITY_ATTRIBUTES inherit = {sizeof inherit, nullptr, TRUE};
+    SECURITY_ATTRIBUTES inherit = {static_cast<DWORD>(sizeof(SECURITY_ATTRIBUTES)), nullptr, TRUE};
     HANDLE childIn = nullptr;
     HANDLE childOut = nullptr;
     HANDLE toPeer = nullptr;
