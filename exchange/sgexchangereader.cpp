@@ -1,0 +1,178 @@
+#include "exchange/sgexchangereader.h"
+
+#include "exchange/sgfacetblockwriter.h"
+#include "exchange/sgmaterialblockreader.h"
+#include "exchange/sgrecordinput.h"
+#include "sgcore/app/sgapp.h"
+#include "sgcore/geometry/sgmap.h"
+#include "sgcore/geometry/sgpolymesh.h"
+#include "sgcore/geometry/sgpolyshape.h"
+
+#include <algorithm>
+#include <cstring>
+
+namespace {
+
+// Host coordinates are ten times the modeler's.
+constexpr double kToHostUnits = 10.0;
+
+// A mesh under construction; deleted unless handed on.
+struct MeshUnderConstruction {
+    SgPolyMesh *mesh = new SgPolyMesh;
+    ~MeshUnderConstruction() { delete mesh; }
+    SgPolyMesh *release() { return std::exchange(mesh, nullptr); }
+};
+
+void readVertices(SgRecordInput &input, SgPolyMesh &mesh) {
+    const std::int32_t count = input.count(12);
+    SgVec3 *vertices = mesh.setVertexArray(count);
+    const unsigned char *source = input.take(size_t(count) * 12);
+    for (std::int32_t i = 0; i < count; ++i) {
+        float xyz[3];
+        std::memcpy(xyz, source + size_t(i) * 12, 12);
+        vertices[i] = SgVec3(float(xyz[0] * kToHostUnits), float(xyz[1] * kToHostUnits),
+                             float(xyz[2] * kToHostUnits));
+    }
+}
+
+void readUVs(SgRecordInput &input, SgPolyMesh &mesh) {
+    const std::int32_t count = input.count(8);
+    if (count == 0)
+        return;
+    auto *uvList = new SgMap(SgMap::UVMap);
+    mesh.setUVList(uvList);
+    uvList->values().resize(size_t(count));
+    std::memcpy(uvList->values().data(), input.take(size_t(count) * 8), size_t(count) * 8);
+}
+
+// Reads facet records into the mesh's arrays, checking every index first.
+class FacetReader {
+public:
+    FacetReader(SgPolyMesh &mesh, int materialCount)
+        : m_mesh(mesh), m_vertexCount(std::uint32_t(mesh.getVertexCount())),
+          m_uvCount(std::uint32_t(mesh.getUVCount())), m_materialCount(materialCount) {}
+
+    void read(SgRecordInput &input) {
+        const std::int32_t count = input.count(5);
+        reserve(count, input.remaining());
+        for (std::int32_t i = 0; i < count; ++i)
+            readFacet(input);
+    }
+
+private:
+    void reserve(std::int32_t count, size_t bytes) {
+        const size_t triangles =
+            std::min(size_t(count), bytes / size_t(SgFacetBlockWriter::kTriangleBytes));
+        const size_t quads =
+            std::min(size_t(count), bytes / size_t(SgFacetBlockWriter::kQuadBytes));
+        m_mesh.triangleCorners().reserve(triangles * 3);
+        m_mesh.triangleMaterials().reserve(triangles);
+        m_mesh.triangleGroups().reserve(triangles);
+        m_mesh.quadCorners().reserve(quads * 4);
+        m_mesh.quadMaterials().reserve(quads);
+        m_mesh.quadGroups().reserve(quads);
+    }
+
+    void readFacet(SgRecordInput &input) {
+        const std::uint8_t type = input.byte();
+        const std::uint32_t material = input.uint32();
+        if (material >= std::uint32_t(m_materialCount))
+            throw SgRecordError("facet material out of range");
+        std::uint32_t corners = 0;
+        if (type == 'T')
+            corners = 3;
+        else if (type == 'Q')
+            corners = 4;
+        else if (type == 'P')
+            corners = input.uint32();
+        if (corners > std::uint32_t(SgPolyMesh::kMaxPolygonCorners))
+            throw SgRecordError("too many facet corners");
+        const unsigned char *source = input.take(corners * 12);
+        SgFaceCorner facet[SgPolyMesh::kMaxPolygonCorners];
+        for (std::uint32_t k = 0; k < corners; ++k)
+            facet[k] = readCorner(source + 12 * k);
+        store(facet, corners, std::uint8_t(material));
+    }
+
+    SgFaceCorner readCorner(const unsigned char *source) const {
+        std::int32_t indices[2];
+        std::memcpy(indices, source, 8);
+        if (std::uint32_t(indices[0]) >= m_vertexCount)
+            throw SgRecordError("vertex index out of range");
+        SgFaceCorner corner;
+        corner.vertex = indices[0];
+        // Without a UV list the UV indices mean nothing; -1 is the host's "no UV".
+        if (m_uvCount > 0 && indices[1] != -1) {
+            if (std::uint32_t(indices[1]) >= m_uvCount)
+                throw SgRecordError("UV index out of range");
+            corner.uv = indices[1];
+        }
+        return corner;
+    }
+
+    // A facet of fewer than three corners (an unknown type gives none) is an empty face: the
+    // host keeps nothing of it.
+    void store(const SgFaceCorner *facet, std::uint32_t corners, std::uint8_t material) {
+        if (corners == 3) {
+            append(m_mesh.triangleCorners(), facet, 3);
+            m_mesh.triangleMaterials().push_back(material);
+            m_mesh.triangleGroups().push_back(-1);
+        } else if (corners == 4) {
+            append(m_mesh.quadCorners(), facet, 4);
+            m_mesh.quadMaterials().push_back(material);
+            m_mesh.quadGroups().push_back(-1);
+        } else if (corners >= 5) {
+            append(m_mesh.polygonCorners(), facet, corners);
+            m_mesh.polygonStarts().push_back(std::uint32_t(m_mesh.polygonCorners().size()));
+            m_mesh.polygonMaterials().push_back(material);
+            m_mesh.polygonGroups().push_back(-1);
+        }
+    }
+
+    static void append(std::vector<SgFaceCorner> &to, const SgFaceCorner *from, size_t n) {
+        to.insert(to.end(), from, from + n);
+    }
+
+    SgPolyMesh &m_mesh;
+    std::uint32_t m_vertexCount;
+    std::uint32_t m_uvCount;
+    int m_materialCount;
+};
+
+} // namespace
+
+SgPolyShape *SgExchangeReader::readShape(QString &trailer) const {
+    if (!m_record)
+        return nullptr;
+    try {
+        return readRecord(trailer).release();
+    } catch (...) {
+        if (sgApp)
+            sgApp->log(QStringLiteral("Error reading memory map"));
+        return nullptr;
+    }
+}
+
+std::unique_ptr<SgPolyShape> SgExchangeReader::readRecord(QString &trailer) const {
+    SgRecordInput input(m_record, m_size);
+    const QString name = QString::fromLatin1(input.string());
+
+    MeshUnderConstruction building;
+    SgPolyMesh &mesh = *building.mesh;
+    mesh.beginEdit(true);
+    readVertices(input, mesh);
+    readUVs(input, mesh);
+    SgMaterialBlockReader materials;
+    materials.read(input);
+    FacetReader(mesh, materials.usableMaterialCount()).read(input);
+    mesh.finishEdit();
+    const QString trailerText = QString::fromLatin1(input.string());
+
+    // The whole record is sound: only now are host objects made.
+    auto shape = std::make_unique<SgPolyShape>();
+    shape->setName(name);
+    materials.applyTo(*shape);
+    shape->setPolyMesh(building.release());
+    trailer = trailerText;
+    return shape;
+}

@@ -1,0 +1,40 @@
+#pragma once
+
+#include "exchange/sgreturnmaterial.h"
+
+#include <vector>
+
+class SgRecordInput;
+class SgShape;
+
+// Reads the materials block of a record that the modeler returns (i32 count, then one entry of
+// 42 bytes and three strings per material) and turns it into host materials.
+//
+// Reading and applying are separate steps so that a record found bad later leaves nothing
+// behind: `read` only parses, `applyTo` creates materials and loads images.
+class SgMaterialBlockReader {
+public:
+    // Parses the block at the cursor. Throws SgRecordError (from the cursor) when the block is
+    // cut short or its count cannot fit in the bytes that remain. O(block bytes).
+    void read(SgRecordInput &input);
+
+    // The parsed materials, in record order.
+    const std::vector<SgReturnMaterial> &materials() const { return m_materials; }
+
+    // The number of materials the shape will have: the parsed count, or 1 ("default") when the
+    // block was empty. Facet material indices must stay below it.
+    int usableMaterialCount() const;
+
+    // Adds one SgDefaultMaterial per parsed entry to `shape` (or one named "default" when the
+    // block was empty): name, diffuse colour and colour map, specular colour, glossiness,
+    // opacity, bump strength and bump map. Image paths become textures of the application's
+    // image manager, which is refreshed afterwards. Needs `sgApp` for images.
+    void applyTo(SgShape &shape) const;
+
+    // A channel from 0 to 1 as an 8-bit value: the integer part of v * 255, held to 0..255
+    // (not-a-number gives 0).
+    static int channelFromFloat(float value);
+
+private:
+    std::vector<SgReturnMaterial> m_materials;
+};

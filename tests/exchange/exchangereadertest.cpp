@@ -1,0 +1,230 @@
+// The record the modeler returns: reading it into a host shape, and the round trip.
+
+#include "exchangetestsupport.h"
+
+#include "exchange/sgexchangereader.h"
+#include "exchange/sgexchangewriter.h"
+#include "exchange/sgreturnrecordwriter.h"
+#include "sgcore/app/sgappsettings.h"
+#include "sgcore/geometry/sgmap.h"
+#include "sgcore/geometry/sgobject.h"
+#include "sgcore/geometry/sgpolymesh.h"
+#include "sgcore/geometry/sgpolyshape.h"
+#include "sgcore/materials/sgdefaultmaterial.h"
+#include "sgcore/materials/sgtexture.h"
+#include "sgcore/properties/sgfloatproperty.h"
+#include "sgcore/scene/sgbone.h"
+#include "sgcore/scene/sgskeleton.h"
+
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <memory>
+
+using namespace exchangetest;
+
+namespace {
+
+class ExchangeReaderTest : public ::testing::Test {
+protected:
+    void SetUp() override {
+        ensureApp();
+        clearLog();
+    }
+};
+
+std::unique_ptr<SgPolyShape> read(const QByteArray &record, QString *trailer = nullptr) {
+    QString text;
+    SgExchangeReader reader(record.constData(), size_t(record.size()));
+    std::unique_ptr<SgPolyShape> shape(reader.readShape(text));
+    if (trailer)
+        *trailer = text;
+    return shape;
+}
+
+SgDefaultMaterial *materialAt(const SgShape &shape, int index) {
+    return dynamic_cast<SgDefaultMaterial *>(shape.getMaterial(index));
+}
+
+// A facet as (material, [vertex, uv] per corner), for comparing orders.
+using Facet = std::pair<int, std::vector<std::pair<int, int>>>;
+
+std::vector<Facet> facetsByKind(const SgPolyMesh &mesh, bool withUVs) {
+    std::vector<Facet> facets;
+    auto add = [&](int material, const SgFaceCorner *corners, int n) {
+        Facet facet{material, {}};
+        for (int k = 0; k < n; ++k)
+            facet.second.emplace_back(corners[k].vertex, withUVs ? corners[k].uv : -1);
+        facets.push_back(facet);
+    };
+    for (int i = 0; i < mesh.getTriangleCount(); ++i)
+        add(mesh.getTriangleMaterial(i), mesh.getTriangleCorners(i), 3);
+    for (int i = 0; i < mesh.getQuadCount(); ++i)
+        add(mesh.getQuadMaterial(i), mesh.getQuadCorners(i), 4);
+    for (int i = 0; i < mesh.getPolygonCount(); ++i)
+        add(mesh.getPolygonMaterial(i), mesh.getPolygonCorners(i), mesh.getPolygonCornerCount(i));
+    return facets;
+}
+
+} // namespace
+
+TEST_F(ExchangeReaderTest, ReturnedRecordBecomesAShape) {
+    SgPolyMesh *mesh =
+        makeMesh({{1, 2, 3}, {0, 0, 0}, {1, 0, 0}, {0, 1, 0}, {1, 1, 0}}, {{0.5f, 0.25f}, {1, 1}});
+    addFacet(*mesh, 1, {{0, 1}, {1, 0}, {2, -1}});
+    addFacet(*mesh, 0, {{1, 0}, {2, 0}, {4, 1}, {3, 1}});
+    std::unique_ptr<SgPolyMesh> owner(mesh);
+    SgReturnMaterial skin;
+    skin.name = "skin";
+    skin.diffuse[0] = 1.0f;
+    skin.diffuse[1] = 0.50196081f;
+    skin.diffuseImage = tempPath() + "/back/skin.jpg";
+    skin.glossiness = 0.25f;
+    skin.opacity = 0.75f;
+    skin.bumpStrength = 0.5f;
+    skin.bumpImage = tempPath() + "/back/bump.jpg";
+    SgReturnMaterial cloth;
+    cloth.name = "cloth";
+    cloth.specular[2] = 2.0f; // out of range: held to 255
+    const QByteArray record =
+        SgReturnRecordWriter("Prop", *mesh, {skin, cloth}, "tail").toByteArray();
+    ASSERT_FALSE(record.isEmpty());
+
+    QString trailer;
+    auto shape = read(record, &trailer);
+    ASSERT_TRUE(shape);
+    EXPECT_EQ(shape->getName(), "Prop");
+    EXPECT_EQ(trailer, "tail");
+    const SgPolyMesh *back = shape->getPolyMesh();
+    ASSERT_TRUE(back);
+    EXPECT_EQ(back->getVertex(0), SgVec3(10, 20, 30));
+    ASSERT_TRUE(back->getUVList());
+    EXPECT_EQ(back->getUVList()->getValue(0), SgVec2(0.5f, 0.25f));
+    // Material 0's quad comes first in the record, then material 1's triangle.
+    ASSERT_EQ(back->getQuadCount(), 1);
+    ASSERT_EQ(back->getTriangleCount(), 1);
+    EXPECT_EQ(back->getTriangleMaterial(0), 1);
+    EXPECT_EQ(back->getTriangleCorners(0)[0], (SgFaceCorner{0, 1, -1}));
+    EXPECT_EQ(back->getTriangleCorners(0)[2].uv, -1);
+
+    ASSERT_EQ(shape->getMaterialCount(), 2);
+    SgDefaultMaterial *m0 = materialAt(*shape, 0);
+    ASSERT_TRUE(m0);
+    EXPECT_EQ(m0->getName(), "skin");
+    EXPECT_EQ(m0->getDiffuseColor(), QColor(255, 128, 0));
+    EXPECT_FLOAT_EQ(m0->getGlossinessStrength(), 0.25f);
+    EXPECT_FLOAT_EQ(m0->getOpacityControl()->getValue(), 0.75f);
+    EXPECT_FLOAT_EQ(m0->getBumpStrength(), 0.5f);
+    ASSERT_TRUE(m0->getColorMap());
+    EXPECT_TRUE(m0->getColorMap()->getFileName().endsWith("skin.jpg"));
+    // The returned bump image maps the bump strength and leaves the colour map alone.
+    ASSERT_TRUE(m0->getBumpMap());
+    EXPECT_TRUE(m0->getBumpMap()->getFileName().endsWith("bump.jpg"));
+    EXPECT_EQ(materialAt(*shape, 1)->getSpecularColor(), QColor(0, 0, 255));
+    EXPECT_FALSE(materialAt(*shape, 1)->getColorMap());
+}
+
+TEST_F(ExchangeReaderTest, EmptyBlocksAndUnknownFacetTypes) {
+    // name "E", V = 3, U = 0, M = 0, F = 3: 'X' (no corners), 'T', a 'P' of 2 corners; trailer.
+    const QByteArray record = QByteArray::fromHex(
+        "01000000"
+        "45"
+        "03000000"
+        "0000803f000000400000404000000000000000000000000000000000000000000000803f"
+        "00000000"
+        "00000000"
+        "03000000"
+        "58"
+        "00000000"
+        "54"
+        "00000000"
+        "000000000700000009000000"
+        "010000000000000000000000"
+        "020000000000000000000000"
+        "50"
+        "00000000"
+        "02000000"
+        "000000000000000000000000"
+        "010000000000000000000000"
+        "00000000");
+    auto shape = read(record);
+    ASSERT_TRUE(shape);
+    const SgPolyMesh *mesh = shape->getPolyMesh();
+    EXPECT_EQ(mesh->getVertex(0), SgVec3(10, 20, 30));
+    EXPECT_FALSE(mesh->getUVList());
+    ASSERT_EQ(mesh->getFacetCount(), 1);
+    EXPECT_EQ(mesh->getTriangleCorners(0)[0], (SgFaceCorner{0, -1, -1})); // UV means nothing
+    ASSERT_EQ(shape->getMaterialCount(), 1);
+    EXPECT_EQ(shape->getMaterial(0)->getName(), "default");
+    EXPECT_TRUE(logLines().isEmpty());
+
+    // With M = 0 only material 0 can be honoured.
+    QByteArray badMaterial = record;
+    badMaterial[qsizetype(4 + 1 + 4 + 36 + 4 + 4 + 4 + 5 + 1)] = 1;
+    EXPECT_FALSE(read(badMaterial));
+    EXPECT_EQ(logLines(), QStringList{"Error reading memory map"});
+}
+
+TEST_F(ExchangeReaderTest, FigureRoundTripKeepsVerticesUVsAndFacetOrder) {
+    SgAppSettings().setInt("FacetorBridgeTools", 1); // weld the base geometry
+    auto figure = std::make_unique<SgSkeleton>("Body");
+    figure->setLabel("Body");
+    const std::vector<SgVec3> points = {{0, 0, 0}, {12.5f, 0, 0}, {0, 7.25f, 0}, {3, 3, -4}};
+    const std::vector<SgVec2> uvs = {{0, 0}, {1, 0}, {0, 1}, {0.5f, 0.5f}};
+    for (int b = 0; b < 2; ++b) {
+        auto *bone = new SgBone(QString("bone%1").arg(b));
+        figure->addBone(bone);
+        std::vector<SgVec3> moved = points;
+        for (SgVec3 &p : moved)
+            p += SgVec3(100.0f * float(b + 1), 0, 0);
+        SgPolyMesh *mesh = makeMesh(moved, uvs);
+        addFacet(*mesh, 1, {{0, 0}, {1, 1}, {2, 2}});
+        addFacet(*mesh, 0, {{0, 0}, {1, 1}, {3, 3}, {2, 2}});
+        addFacet(*mesh, 0, {{1, 1}, {3, 3}, {2, 2}});
+        auto *shape = new SgPolyShape(bone->getName());
+        shape->setPolyMesh(mesh);
+        shape->addMaterial(new SgDefaultMaterial(b == 0 ? "skin" : "nails"));
+        shape->addMaterial(new SgDefaultMaterial(b == 0 ? "nails" : "skin"));
+        auto *object = new SgObject(bone->getName());
+        object->addShape(shape);
+        bone->setObject(object);
+    }
+
+    SgExchangeWriter writer(figure.get(), QString());
+    ASSERT_GT(writer.getMeasuredSize(), 0);
+    QByteArray sent(writer.getMeasuredSize(), '\0');
+    sent.truncate(writer.write(sent.data()));
+    ASSERT_FALSE(sent.isEmpty());
+    auto shape = read(toReturnRecord(sent));
+    ASSERT_TRUE(shape);
+    EXPECT_EQ(shape->getName(), "Body");
+
+    const auto *welded = static_cast<const SgPolyMesh *>(writer.getGeometry());
+    const SgPolyMesh *back = shape->getPolyMesh();
+    ASSERT_EQ(back->getVertexCount(), welded->getVertexCount());
+    for (int i = 0; i < welded->getVertexCount(); ++i) {
+        const SgVec3 a = welded->getVertex(i), b = back->getVertex(i);
+        for (int k = 0; k < 3; ++k)
+            EXPECT_NEAR(b[k], a[k], 1e-5 * std::max(1.0f, std::abs(a[k])));
+    }
+    ASSERT_TRUE(back->getUVList());
+    EXPECT_EQ(back->getUVList()->values(), welded->getUVList()->values());
+
+    // Same facets; by material, triangles before quads, each kind in welded order.
+    const int materials = writer.getShape()->getMaterialCount();
+    std::vector<Facet> expected;
+    const std::vector<Facet> all = facetsByKind(*welded, true);
+    for (int m = 0; m < materials; ++m)
+        for (const Facet &f : all)
+            if (f.first == m)
+                expected.push_back(f);
+    std::vector<Facet> got;
+    // The record order interleaves kinds per material; the mesh keeps kinds apart.
+    for (int m = 0; m < materials; ++m)
+        for (const Facet &f : facetsByKind(*back, true))
+            if (f.first == m)
+                got.push_back(f);
+    EXPECT_EQ(got, expected);
+    EXPECT_EQ(back->getFacetCount(), welded->getFacetCount());
+    SgAppSettings().remove("FacetorBridgeTools");
+}

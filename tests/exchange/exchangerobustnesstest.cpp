@@ -1,0 +1,161 @@
+// Returned records with any bytes at all: cut short at every byte, and corrupted at random.
+// This file is also built with AddressSanitizer and UndefinedBehaviorSanitizer.
+
+#include "exchangetestsupport.h"
+
+#include "exchange/sgexchangereader.h"
+#include "exchange/sgreturnrecordwriter.h"
+#include "sgcore/geometry/sgpolymesh.h"
+#include "sgcore/geometry/sgpolyshape.h"
+
+#include <gtest/gtest.h>
+
+#include <memory>
+#include <random>
+#include <vector>
+
+using namespace exchangetest;
+
+namespace {
+
+class ExchangeRobustnessTest : public ::testing::Test {
+protected:
+    void SetUp() override {
+        ensureApp();
+        clearLog();
+    }
+};
+
+// A record with every kind of field: UVs, two materials with images, 'T', 'Q' and 'P'.
+QByteArray validRecord() {
+    std::vector<SgVec3> points;
+    for (int i = 0; i < 6; ++i)
+        points.emplace_back(float(i), float(i * i), -float(i));
+    std::unique_ptr<SgPolyMesh> mesh(makeMesh(points, {{0, 0}, {1, 0}, {0, 1}}));
+    addFacet(*mesh, 1, {{0, 0}, {1, 1}, {2, 2}});
+    addFacet(*mesh, 0, {{0, 0}, {1, 1}, {3, 2}, {2, -1}});
+    addFacet(*mesh, 1, {{0}, {1}, {2}, {3}, {4}, {5}});
+    SgReturnMaterial a, b;
+    a.name = "a";
+    a.diffuseImage = "/nowhere/a.jpg";
+    b.name = "bb";
+    b.bumpImage = "/nowhere/b.jpg";
+    return SgReturnRecordWriter("robust", *mesh, {a, b}, "t").toByteArray();
+}
+
+// Reads `bytes` from a heap block of exactly their size, so that a read past it is caught.
+std::unique_ptr<SgPolyShape> readExact(const QByteArray &bytes) {
+    std::vector<char> block(bytes.begin(), bytes.end());
+    QString trailer;
+    SgExchangeReader reader(block.empty() ? nullptr : block.data(), block.size());
+    return std::unique_ptr<SgPolyShape>(reader.readShape(trailer));
+}
+
+// Whatever was read stays within itself: indices in range, materials for every facet.
+void expectSound(const SgPolyShape &shape) {
+    const SgPolyMesh *mesh = shape.getPolyMesh();
+    ASSERT_TRUE(mesh);
+    QString why;
+    EXPECT_TRUE(mesh->validate(&why)) << why.toStdString();
+    const int materials = shape.getMaterialCount();
+    ASSERT_GE(materials, 1);
+    for (const auto *kind :
+         {&mesh->triangleMaterials(), &mesh->quadMaterials(), &mesh->polygonMaterials()})
+        for (const std::uint8_t m : *kind)
+            EXPECT_LT(m, materials);
+    const int uvs = mesh->getUVCount();
+    for (const auto *kind :
+         {&mesh->triangleCorners(), &mesh->quadCorners(), &mesh->polygonCorners()})
+        for (const SgFaceCorner &c : *kind)
+            EXPECT_TRUE(c.uv == -1 || (c.uv >= 0 && c.uv < uvs));
+}
+
+void putInt(QByteArray &bytes, qsizetype at, std::int32_t value) {
+    std::memcpy(bytes.data() + at, &value, 4);
+}
+
+} // namespace
+
+TEST_F(ExchangeRobustnessTest, EveryPrefixIsRejectedCleanly) {
+    const QByteArray record = validRecord();
+    ASSERT_GT(record.size(), 100);
+    auto whole = readExact(record);
+    ASSERT_TRUE(whole);
+    expectSound(*whole);
+    for (qsizetype n = 0; n < record.size(); ++n) {
+        clearLog();
+        EXPECT_FALSE(readExact(record.left(n))) << "prefix of " << n << " bytes";
+        EXPECT_EQ(logLines(), QStringList{"Error reading memory map"}) << n;
+    }
+    QString trailer = "kept";
+    EXPECT_EQ(SgExchangeReader(nullptr, 100).readShape(trailer), nullptr);
+    EXPECT_EQ(trailer, "kept");
+}
+
+TEST_F(ExchangeRobustnessTest, BadCountsAndIndicesAreRejected) {
+    const QByteArray record = validRecord();
+    const qsizetype v = 4 + 6;                                 // vertex count
+    const qsizetype u = v + 4 + 6 * 12;                        // UV count
+    const qsizetype m = u + 4 + 3 * 8;                         // material count
+    const qsizetype f = m + 4 + (54 + 1 + 14) + (54 + 2 + 14); // facet count
+    const qsizetype quad = f + 4;                              // material 0's quad comes first
+    ASSERT_EQ(record.at(quad), 'Q');
+    const qsizetype triangle = quad + 53;
+    ASSERT_EQ(record.at(triangle), 'T');
+    const qsizetype polygon = triangle + 41;
+    ASSERT_EQ(record.at(polygon), 'P');
+
+    const struct {
+        qsizetype at;
+        std::int32_t value;
+    } cases[] = {
+        {0, -1},         // negative name length
+        {0, 0x7fffffff}, // name longer than the record
+        {v, -3},         // negative vertex count
+        {v, 0x7fffffff}, // vertex bytes overflow 32 bits and exceed the record
+        {v, 0x15555556}, // 12 x count wraps to a small number in 32 bits
+        {u, 0x20000001}, // 8 x count wraps
+        {m, -1},           {m, 0x7fffffff},
+        {f, 0x7fffffff},   {quad + 1, 2},      // material index not below the count
+        {quad + 1, -1},    {quad + 5, 6},      // vertex index = vertex count
+        {quad + 5, -1},    {quad + 9, 3},      // UV index = UV count
+        {quad + 9, -2},    {polygon + 5, 256}, // more corners than a polygon can have
+        {polygon + 5, -1}, {polygon + 5, 7},   // more corners than the record holds
+    };
+    for (const auto &c : cases) {
+        QByteArray bad = record;
+        putInt(bad, c.at, c.value);
+        clearLog();
+        EXPECT_FALSE(readExact(bad)) << "at " << c.at << " value " << c.value;
+        EXPECT_EQ(logLines(), QStringList{"Error reading memory map"});
+    }
+}
+
+TEST_F(ExchangeRobustnessTest, RandomCorruptionIsRejectedOrReadWithinBounds) {
+    const QByteArray record = validRecord();
+    std::mt19937 random(20261206);
+    std::uniform_int_distribution<qsizetype> position(0, record.size() - 1);
+    std::uniform_int_distribution<int> byteValue(0, 255);
+    const std::int32_t counts[] = {
+        -1, 0, 1, 2, 3, 5, 6, 255, 256, 0x7fffffff, std::int32_t(0x80000000)};
+    int accepted = 0;
+    for (int round = 0; round < 3000; ++round) {
+        QByteArray bad = record;
+        const int edits = 1 + round % 4;
+        for (int e = 0; e < edits; ++e) {
+            const qsizetype at = position(random);
+            if (round % 2 == 0 && at + 4 <= bad.size())
+                putInt(bad, at, counts[size_t(byteValue(random)) % std::size(counts)]);
+            else
+                bad[at] = char(byteValue(random));
+        }
+        if (round % 7 == 0)
+            bad.truncate(position(random));
+        auto shape = readExact(bad);
+        if (shape) {
+            ++accepted;
+            expectSound(*shape);
+        }
+    }
+    EXPECT_GT(accepted, 0); // harmless edits (coordinates, colours) still read
+}
