@@ -266,12 +266,13 @@ void SgFacBridge::sendNext() {
     }
     {
         SgExchangeWriter writer(m_sendList[0], QString());
-        const int32_t size = writer.getSize();
-        if (m_data->create(size) && m_data->attach(SgSharedMemory::kReadWrite)) {
-            if (m_data->lock()) {
-                writer.write(m_data->data(), m_data->size());
-                m_data->unlock();
-            }
+        const int32_t size = writer.getMeasuredSize();
+        if (m_data->create(size) && m_data->attach(SgSharedMemory::kReadWrite) && m_data->lock()) {
+            // The writer fills exactly the measured size; a segment that came out smaller is
+            // left unwritten rather than overrun.
+            if (m_data->size() >= size)
+                writer.write(m_data->data());
+            m_data->unlock();
         }
     }
     queueOrPost(Data, 0);

@@ -88,10 +88,7 @@ private:
         if (corners > std::uint32_t(SgPolyMesh::kMaxPolygonCorners))
             throw SgRecordError("too many facet corners");
         const unsigned char *source = input.take(corners * 12);
-        SgFaceCorner facet[SgPolyMesh::kMaxPolygonCorners];
-        for (std::uint32_t k = 0; k < corners; ++k)
-            facet[k] = readCorner(source + 12 * k);
-        store(facet, corners, std::uint8_t(material));
+        store(source, corners, std::uint8_t(material));
     }
 
     SgFaceCorner readCorner(const unsigned char *source) const {
@@ -111,28 +108,28 @@ private:
     }
 
     // A facet of fewer than three corners (an unknown type gives none) is an empty face: the
-    // host keeps nothing of it.
-    void store(const SgFaceCorner *facet, std::uint32_t corners, std::uint8_t material) {
+    // host keeps nothing of it. A bad corner throws; the mesh is then discarded whole.
+    void store(const unsigned char *source, std::uint32_t corners, std::uint8_t material) {
         if (corners == 3) {
-            append(m_mesh.triangleCorners(), facet, 3);
+            append(m_mesh.triangleCorners(), source, 3);
             m_mesh.triangleMaterials().push_back(material);
             m_mesh.triangleGroups().push_back(-1);
         } else if (corners == 4) {
-            append(m_mesh.quadCorners(), facet, 4);
+            append(m_mesh.quadCorners(), source, 4);
             m_mesh.quadMaterials().push_back(material);
             m_mesh.quadGroups().push_back(-1);
         } else if (corners >= 5) {
-            append(m_mesh.polygonCorners(), facet, corners);
+            append(m_mesh.polygonCorners(), source, corners);
             m_mesh.polygonStarts().push_back(std::uint32_t(m_mesh.polygonCorners().size()));
             m_mesh.polygonMaterials().push_back(material);
             m_mesh.polygonGroups().push_back(-1);
         }
     }
 
-    static void append(std::vector<SgFaceCorner> &to, const SgFaceCorner *from, size_t n) {
-        to.insert(to.end(), from, from + n);
+    void append(std::vector<SgFaceCorner> &to, const unsigned char *source, std::uint32_t n) const {
+        for (std::uint32_t k = 0; k < n; ++k)
+            to.push_back(readCorner(source + 12 * k));
     }
-
     SgPolyMesh &m_mesh;
     std::uint32_t m_vertexCount;
     std::uint32_t m_uvCount;

@@ -23,6 +23,13 @@ QString readText(SgRecordInput &input) {
     return QString::fromLatin1(input.string());
 }
 
+// The texture for an image path, or null for no path or one that cannot name a file.
+SgTexture *imageFor(SgImageMgr *images, const QString &path) {
+    if (!images || path.isEmpty() || path.contains(QChar(0)))
+        return nullptr;
+    return images->getImage(path);
+}
+
 QColor colorFromFloats(const float (&color)[3]) {
     return QColor(SgMaterialBlockReader::channelFromFloat(color[0]),
                   SgMaterialBlockReader::channelFromFloat(color[1]),
@@ -77,16 +84,16 @@ void SgMaterialBlockReader::applyTo(SgShape &shape) const {
     for (const SgReturnMaterial &entry : m_materials) {
         auto *material = new SgDefaultMaterial(entry.name);
         material->setDiffuseColor(colorFromFloats(entry.diffuse));
-        if (!entry.diffuseImage.isEmpty() && images)
-            material->setColorMap(images->getImage(entry.diffuseImage));
+        if (SgTexture *image = imageFor(images, entry.diffuseImage))
+            material->setColorMap(image);
         material->setSpecularColor(colorFromFloats(entry.specular));
         material->setGlossinessStrength(entry.glossiness);
         if (SgFloatProperty *opacity = material->getOpacityControl())
             opacity->setValue(entry.opacity);
         material->setBumpStrength(entry.bumpStrength);
         // The returned bump image maps "Bump Strength"; the diffuse map stays as it was.
-        if (!entry.bumpImage.isEmpty() && images)
-            material->setBumpMap(images->getImage(entry.bumpImage));
+        if (SgTexture *image = imageFor(images, entry.bumpImage))
+            material->setBumpMap(image);
         shape.addMaterial(material);
     }
     if (images)

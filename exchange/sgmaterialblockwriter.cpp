@@ -60,7 +60,8 @@ QString suffixedCopyPath(const SgTexture *texture) {
 void rememberSource(const QString &target, const SgTexture *texture) {
     CopyRegistry &registry = copyRegistry();
     QMutexLocker locker(&registry.mutex);
-    registry.sourceOfCopy.tryEmplace(target, sourceKey(texture));
+    if (!registry.sourceOfCopy.contains(target))
+        registry.sourceOfCopy.insert(target, sourceKey(texture));
 }
 
 // A colour or float property of `material` named `name`, or null when missing or of another

@@ -8,6 +8,7 @@
 // entries), ready to be copied into the data segment.
 class SgFacetorReturn {
 public:
-    // The whole record for `node`; corners without a UV in a node with UVs use UV 0.
+    // The whole record for `node`, facets ordered by material; corners without a UV in a node
+    // with UVs use UV 0. Empty when the record cannot be written.
     static QByteArray encode(const SgExchangeNode &node);
 };

@@ -1,16 +1,14 @@
 #pragma once
 
-// Shared set-up of the bridge tests: one QApplication and one host application per process,
-// settings in a temporary file, and a fail-safe that closes modal boxes a test forgot.
+// Helpers of the bridge tests: answering modal boxes, waiting on the event loop, and small
+// scenes.
 
 #include "sgcore/app/sgapp.h"
-#include "sgcore/app/sgappsettings.h"
 #include "sgcore/scene/sgscene.h"
 
 #include <QApplication>
 #include <QDir>
 #include <QElapsedTimer>
-#include <QPointer>
 #include <QTemporaryDir>
 #include <QTimer>
 #include <QWidget>
@@ -19,24 +17,14 @@
 
 namespace bridgetest {
 
-// The process's QApplication and SgApp, made on first use.
+// The host application, made by the test main before any test runs.
 inline SgApp *app() {
-    static int argc = 1;
-    static char name[] = "bridge-test";
-    static char *argv[] = {name, nullptr};
-    static QApplication *qapp = new QApplication(argc, argv);
-    static QTemporaryDir settingsDir;
-    static SgApp *host = [] {
-        SgAppSettings::setFileName(settingsDir.filePath(QStringLiteral("scenara.ini")));
-        return new SgApp();
-    }();
-    (void)qapp;
-    return host;
+    return sgApp;
 }
 
-// Answers the next modal box with `answer` (called with the box) once it is up. A fail-safe
-// closes any modal still open after `failSafeMs`, so a broken test fails instead of hanging.
-inline void answerModal(std::function<void(QWidget *)> answer, int failSafeMs = 5000) {
+// Answers the next modal box with `answer` (called with the box) once it is up. The test
+// main's fail-safe closes a modal that nobody answers.
+inline void answerModal(std::function<void(QWidget *)> answer) {
     auto *timer = new QTimer;
     QObject::connect(timer, &QTimer::timeout, [timer, answer] {
         if (QWidget *modal = QApplication::activeModalWidget()) {
@@ -46,14 +34,6 @@ inline void answerModal(std::function<void(QWidget *)> answer, int failSafeMs = 
         }
     });
     timer->start(10);
-    QPointer<QTimer> watch(timer);
-    QTimer::singleShot(failSafeMs, [watch] {
-        if (watch)
-            watch->deleteLater();
-        for (int i = 0; i < 5; ++i)
-            if (QWidget *modal = QApplication::activeModalWidget())
-                modal->close();
-    });
 }
 
 // Runs the event loop until `done` holds or `timeoutMs` passes; returns `done()`.
@@ -63,6 +43,24 @@ inline bool waitUntil(const std::function<bool()> &done, int timeoutMs) {
     while (!done() && timer.elapsed() < timeoutMs)
         QApplication::processEvents(QEventLoop::AllEvents, 5);
     return done();
+}
+
+// The files of a segment key in the shared-memory folder (data, "-ref" and "-lock" objects).
+// Looking at the folder, rather than opening the segment, leaves no handle behind.
+inline QStringList segmentFiles(const char *key) {
+    const QString prefix =
+        QStringLiteral("sgsharedmemory-") + QString::fromLatin1(QByteArray(key).toHex());
+    return QDir(QStringLiteral("/dev/shm")).entryList({prefix + QLatin1Char('*')}, QDir::Files);
+}
+
+// Whether the data object of a segment key exists.
+inline bool segmentExists(const char *key) {
+    const QString prefix =
+        QStringLiteral("sgsharedmemory-") + QString::fromLatin1(QByteArray(key).toHex());
+    for (const QString &file : segmentFiles(key))
+        if (!file.contains(QLatin1String("-ref")) && !file.contains(QLatin1String("-lock")))
+            return true;
+    return false;
 }
 
 } // namespace bridgetest

@@ -9,6 +9,7 @@
 #include "exchange/shm/sgsharedmemory.h"
 #include "facetor/sgfacetorreturn.h"
 #include "sgcore/app/sgmessagesink.h"
+#include "sgcore/materials/sgtexture.h"
 #include "sgcore/properties/sgcolorproperty.h"
 #include "sgcore/scene/sgbone.h"
 #include "sgcore/scene/sgskeleton.h"
@@ -33,17 +34,27 @@ public:
     using SgFacBridge::executeAction;
 };
 
-// The modeler's view of the control record, from a second segment object.
+// The modeler's view of the control record: the segment's file mapped directly, so that the
+// test holds no segment handle that would keep the segment alive after the bridge has gone.
 class Peer {
 public:
-    Peer() : m_control(kSgControlSegmentKey) { m_control.attach(SgSharedMemory::kReadWrite); }
+    Peer() {
+        for (const QString &file : bridgetest::segmentFiles(kSgControlSegmentKey)) {
+            if (file.contains(QLatin1String("-ref")) || file.contains(QLatin1String("-lock")))
+                continue;
+            m_file.setFileName(QStringLiteral("/dev/shm/") + file);
+            if (m_file.open(QIODevice::ReadWrite))
+                m_record =
+                    reinterpret_cast<SgControlRecord *>(m_file.map(0, sizeof(SgControlRecord)));
+        }
+    }
     SgControlRecord record() const {
         SgControlRecord copy{};
-        if (m_control.data())
-            std::memcpy(&copy, m_control.data(), sizeof copy);
+        if (m_record)
+            std::memcpy(&copy, m_record, sizeof copy);
         return copy;
     }
-    SgControlRecord *live() { return reinterpret_cast<SgControlRecord *>(m_control.data()); }
+    SgControlRecord *live() { return m_record ? m_record : &m_scratch; }
     void post(int code) {
         live()->toHostCode = uint8_t(code);
         live()->toHostParameter = 0;
@@ -58,7 +69,9 @@ public:
     }
 
 private:
-    SgSharedMemory m_control;
+    QFile m_file;
+    SgControlRecord *m_record = nullptr;
+    SgControlRecord m_scratch{};
 };
 
 // A stand-in modeler program that exits at once, in a folder of its own.
@@ -270,11 +283,11 @@ TEST_F(BridgeAction, ThePollCountsIdlePollsAndRetriesBeforeNotices) {
     EXPECT_TRUE(bridge->isExchangeBusy());
     EXPECT_EQ(bridge->sendList().count(), 0);
     EXPECT_EQ(peer.take(), 1);
-    EXPECT_TRUE(SgSharedMemory(kSgDataSegmentKey).exists());
+    EXPECT_TRUE(bridgetest::segmentExists(kSgDataSegmentKey));
     peer.post(3);
     bridge->checkSharedMap();
     EXPECT_FALSE(bridge->isExchangeBusy());
-    EXPECT_FALSE(SgSharedMemory(kSgDataSegmentKey).exists());
+    EXPECT_FALSE(bridgetest::segmentExists(kSgDataSegmentKey));
 
     // The modeler quits: the poll stops and the link is dropped.
     peer.post(2);
@@ -285,19 +298,29 @@ TEST_F(BridgeAction, ThePollCountsIdlePollsAndRetriesBeforeNotices) {
 }
 
 TEST_F(BridgeAction, TheHostSwitchLinksWithoutRewritingTheRecord) {
+    // The modeler that started the host has set the record up and asks for the selection.
+    SgSharedMemory modeler(kSgControlSegmentKey);
+    ASSERT_TRUE(modeler.create(16));
+    ASSERT_TRUE(modeler.attach(SgSharedMemory::kReadWrite));
+    SgControlRecord asking = SgControlRecord::fresh();
+    asking.toHostFlag = 0;
+    asking.toModelerParameter = 77;
+    std::memcpy(modeler.data(), &asking, sizeof asking);
+
     sgApp->setCommandArguments({QStringLiteral("-x"), QStringLiteral("-facbridge")});
     TestBridge bridge;
     sgApp->setCommandArguments({});
     EXPECT_TRUE(bridge.isActive());
     EXPECT_TRUE(bridge.pollTimer()->isActive());
     EXPECT_EQ(bridge.modelerProcessId(), 0);
-    const SgControlRecord record = Peer().record();
-    EXPECT_EQ(record.toModelerFlag, 0);
-    EXPECT_EQ(record.toHostFlag, 0);
+    EXPECT_EQ(std::memcmp(modeler.data(), &asking, sizeof asking), 0);
+    int value = 0;
+    EXPECT_EQ(bridge.readMessage(value), 0);
     // The host's start-up restarts the poll of a linked bridge.
     bridge.pollTimer()->stop();
     sgApp->emitStarting();
     EXPECT_TRUE(bridge.pollTimer()->isActive());
+    modeler.detach();
 }
 
 TEST_F(BridgeAction, ReturnedGeometryWithoutANamesakeBecomesAProp) {
@@ -322,7 +345,7 @@ TEST_F(BridgeAction, ReturnedGeometryWithoutANamesakeBecomesAProp) {
     EXPECT_EQ(peer.take(), 3);
     data.detach();
     data.remove(SgSharedMemory::kRemoveUnlocked);
-    EXPECT_FALSE(SgSharedMemory(kSgDataSegmentKey).exists());
+    EXPECT_FALSE(bridgetest::segmentExists(kSgDataSegmentKey));
 
     SgNode *prop = scene()->findNodeByLabel(QStringLiteral("Gizmo"));
     ASSERT_NE(prop, nullptr);

@@ -29,8 +29,8 @@ void coreApp() {
     static int argc = 1;
     static char name[] = "host-plugin-test";
     static char *argv[] = {name, nullptr};
-    static QGuiApplication *app = new QGuiApplication(argc, argv);
-    (void)app;
+    if (!QCoreApplication::instance())
+        new QGuiApplication(argc, argv);
 }
 
 class ThingFactory : public SgTClassFactory<SgTestWidgetThing> {

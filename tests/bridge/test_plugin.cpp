@@ -2,6 +2,7 @@
 
 #include "bridgetestsupport.h"
 
+#include "sgcore/app/sghelpmgr.h"
 #include "sgcore/plugin/sgaction.h"
 #include "sgcore/plugin/sgclassfactory.h"
 #include "sgcore/plugin/sgplugin.h"

@@ -5,8 +5,8 @@
 #include "bridgetestsupport.h"
 
 #include "exchange/shm/sgcontrolrecord.h"
-#include "exchange/shm/sgsharedmemory.h"
 #include "facetor/sgfacetorworkspace.h"
+#include "sgcore/app/sgmessagesink.h"
 #include "sgcore/scene/sgbone.h"
 #include "sgcore/scene/sgskeleton.h"
 
@@ -82,12 +82,8 @@ bool processGone(qint64 pid) {
 
 // Files in the shared-memory folder that belong to one of the bridge's two keys.
 QStringList leftovers() {
-    QStringList found;
-    for (const char *key : {kSgControlSegmentKey, kSgDataSegmentKey}) {
-        const QString prefix = QString::fromStdString(SgSharedMemory(key).dataName());
-        found += QDir(QStringLiteral("/dev/shm")).entryList({prefix + "*"}, QDir::Files);
-    }
-    return found;
+    return bridgetest::segmentFiles(kSgControlSegmentKey) +
+           bridgetest::segmentFiles(kSgDataSegmentKey);
 }
 
 std::vector<Point> scaledPoints(const SgExchangeNode &node) {
@@ -166,13 +162,18 @@ TEST_F(BridgeRoundTrip, SelectedNodesArriveInOrderAndBothSidesCleanUp) {
         bridge.executeAction();
         ASSERT_TRUE(bridge.isActive())
             << sgApp->getMessageSink()->logLines().join('\n').toStdString();
+        QStringList sendOrder;
+        for (SgNode *node : bridge.sendList())
+            sendOrder << node->getLabel();
+        // Selected nodes are listed in scene order; the figure stands for its bone.
+        EXPECT_EQ(sendOrder, (QStringList{"Cup", "Body", "Plate"}));
         pid = bridge.modelerProcessId();
         // The modeler's goodbye stops the poll.
         ASSERT_TRUE(bridgetest::waitUntil([&] { return !bridge.isActive(); }, 20000))
             << run.log().toStdString();
         EXPECT_FALSE(bridge.pollTimer()->isActive());
         EXPECT_EQ(bridge.sendList().count(), 0);
-        EXPECT_EQ(run.received(), (QStringList{"Body", "Plate", "Cup"})) << run.log().toStdString();
+        EXPECT_EQ(run.received(), sendOrder) << run.log().toStdString();
     }
     ASSERT_TRUE(bridgetest::waitUntil([&] { return processGone(pid); }, 10000));
     EXPECT_TRUE(bridgetest::waitUntil([] { return leftovers().isEmpty(); }, 2000))

@@ -8,8 +8,12 @@
 #include "sgcore/geometry/sgpolymesh.h"
 #include "sgcore/geometry/sgpolyshape.h"
 
+#include <QDir>
+#include <QFile>
+
 #include <gtest/gtest.h>
 
+#include <cstring>
 #include <memory>
 #include <random>
 #include <vector>
@@ -45,9 +49,10 @@ QByteArray validRecord() {
 
 // Reads `bytes` from a heap block of exactly their size, so that a read past it is caught.
 std::unique_ptr<SgPolyShape> readExact(const QByteArray &bytes) {
-    std::vector<char> block(bytes.begin(), bytes.end());
+    const std::unique_ptr<char[]> block(new char[size_t(bytes.size())]);
+    std::memcpy(block.get(), bytes.constData(), size_t(bytes.size()));
     QString trailer;
-    SgExchangeReader reader(block.empty() ? nullptr : block.data(), block.size());
+    SgExchangeReader reader(block.get(), size_t(bytes.size()));
     return std::unique_ptr<SgPolyShape>(reader.readShape(trailer));
 }
 
@@ -128,6 +133,19 @@ TEST_F(ExchangeRobustnessTest, BadCountsAndIndicesAreRejected) {
         clearLog();
         EXPECT_FALSE(readExact(bad)) << "at " << c.at << " value " << c.value;
         EXPECT_EQ(logLines(), QStringList{"Error reading memory map"});
+    }
+}
+
+TEST_F(ExchangeRobustnessTest, FuzzSeedsAreValidRecords) {
+    const QDir corpus(QStringLiteral(SG_EXCHANGE_CORPUS));
+    const QStringList seeds = corpus.entryList(QDir::Files);
+    ASSERT_GE(seeds.size(), 5);
+    for (const QString &seed : seeds) {
+        QFile file(corpus.filePath(seed));
+        ASSERT_TRUE(file.open(QIODevice::ReadOnly));
+        auto shape = readExact(file.readAll());
+        ASSERT_TRUE(shape) << seed.toStdString();
+        expectSound(*shape);
     }
 }
 

@@ -11,11 +11,13 @@
 #include "sgcore/geometry/sgshape.h"
 #include "sgcore/geometry/sgsubdmesh.h"
 #include "sgcore/materials/sgdefaultmaterial.h"
+#include "sgcore/materials/sgtexture.h"
 #include "sgcore/properties/sgfloatproperty.h"
 #include "sgcore/scene/sgnode.h"
 
 #include <QDir>
 #include <QFile>
+#include <QFileInfo>
 #include <QImage>
 
 #include <gtest/gtest.h>
