@@ -14,7 +14,10 @@
 #include "sgcore/geometry/sgshape.h"
 #include "sgcore/geometry/sgvertexmesh.h"
 #include "sgcore/io/sgscenefile.h"
+#include "sgcore/morph/sgmorph.h"
+#include "sgcore/morph/sgmorphdeltas.h"
 #include "sgcore/plugin/sgaction.h"
+#include "sgcore/properties/sgfloatproperty.h"
 #include "sgcore/properties/sgnumericproperty.h"
 #include "sgcore/scene/sgbone.h"
 #include "sgcore/scene/sgscene.h"
@@ -100,8 +103,11 @@ void SgScriptApp::print(const QString &text) const {
 QObject *SgScriptApp::action(const QString &name) const {
     for (SgAction *action : m_plugins->actions()) {
         if (action->text() == name || action->objectName() == name ||
-            QString::fromLatin1(action->metaObject()->className()) == name)
+            QString::fromLatin1(action->metaObject()->className()) == name) {
+            // Returned without a parent, it would otherwise belong to the script's collector.
+            QJSEngine::setObjectOwnership(action, QJSEngine::CppOwnership);
             return action;
+        }
     }
     return nullptr;
 }
@@ -176,6 +182,10 @@ void SgScriptApp::exit(int status) const {
 }
 
 void SgScriptApp::adopt(QObject *object) {
+    // The plug-ins' own actions belong to their loaders.
+    for (SgAction *action : m_plugins->actions())
+        if (action == object)
+            return;
     if (object != nullptr && object->parent() == nullptr)
         object->setParent(m_runner);
 }
@@ -257,6 +267,16 @@ QJSValue SgScriptScene::node(const QString &label) const {
             entry.setProperty(QStringLiteral("name"), modifier->getName());
             entry.setProperty(QStringLiteral("label"), modifier->getLabel());
             entry.setProperty(QStringLiteral("morph"), modifier->isMorphModifier());
+            if (auto *morph = dynamic_cast<SgMorph *>(modifier)) {
+                const SgFloatProperty *channel = morph->getValueChannel();
+                entry.setProperty(QStringLiteral("deltas"),
+                                  morph->getDeltas() ? morph->getDeltas()->getNumEntries() : 0);
+                entry.setProperty(QStringLiteral("label"), channel->getLabel());
+                entry.setProperty(QStringLiteral("value"), double(channel->getValue()));
+                entry.setProperty(QStringLiteral("hidden"), channel->isHidden());
+                entry.setProperty(QStringLiteral("path"), channel->getPath());
+                entry.setProperty(QStringLiteral("controllers"), channel->getControllerCount());
+            }
             modifiers.setProperty(m++, entry);
         }
     }

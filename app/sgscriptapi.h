@@ -58,7 +58,8 @@ public:
     Q_INVOKABLE void fail(const QString &message) const;
     // Ends the run with `status` once the current callback returns.
     Q_INVOKABLE void exit(int status) const;
-    // Hands a script-made object to the host, which destroys it when the run ends.
+    // Hands a script-made object to the host, which destroys it when the run ends (the
+    // plug-ins' own actions stay with their loaders).
     Q_INVOKABLE void adopt(QObject *object);
 
 private:
@@ -85,7 +86,8 @@ public:
     // ("figure", "bone", "prop" or "node"), parent, hidden, vertexCount, origin, bones (for a
     // figure), properties (each numeric property of the node, its object and its modifiers:
     // name, label, owner, value, min, max, clamped, path, hidden, controllers) and modifiers
-    // (name, label, morph, deltas, value, hidden).
+    // (name, label, morph; for a morph also its value channel's label, value, hidden flag,
+    // path and controller count, and its delta count).
     Q_INVOKABLE QJSValue node(const QString &label) const;
     // Sets the numeric property named (or labelled) `property` on the node, its object or one
     // of its modifiers; false when there is none.
