@@ -9,6 +9,7 @@
 #include "app/sgscenetree.h"
 
 #include "sgcore/app/sgapp.h"
+#include "sgcore/app/sgmessagesink.h"
 #include "sgcore/plugin/sgaction.h"
 #include "sgcore/properties/sgfloatproperty.h"
 #include "sgcore/scene/sgscene.h"

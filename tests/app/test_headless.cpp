@@ -15,17 +15,17 @@
 
 namespace {
 
-struct Run {
+struct ScenaraRun {
     int status = -1;
     QString out;
     QString err;
 };
 
-Run runScenara(const QStringList &arguments, const QProcessEnvironment &environment) {
+ScenaraRun runScenara(const QStringList &arguments, const QProcessEnvironment &environment) {
     QProcess process;
     process.setProcessEnvironment(environment);
     process.start(QStringLiteral(SCENARA_BIN), arguments);
-    Run run;
+    ScenaraRun run;
     if (!process.waitForFinished(90000)) {
         process.kill();
         process.waitForFinished();
@@ -63,7 +63,7 @@ TEST(HeadlessDemo, RoundTripMakesMorphsAndExportsTheFigureAtValueOne) {
     QTemporaryDir dir;
     // The modeler scales what it receives by 1.25 about the origin (its units are the host's
     // times 0.1, so this is the same scale in the host's units).
-    const Run run = runScenara(
+    const ScenaraRun run = runScenara(
         {QStringLiteral("--script"), QStringLiteral(SG_EXAMPLES_DIR "/demo/send-figure.js"),
          QStringLiteral("--"), QStringLiteral(SG_EXAMPLES_DIR "/demo/scene.json"), dir.path()},
         environmentIn(dir, QStringLiteral("scale=1.25")));
@@ -108,7 +108,7 @@ TEST(HeadlessDemo, ScriptFailuresAndArguments) {
     QTemporaryDir dir;
     const QProcessEnvironment env = environmentIn(dir, QString());
     // A script that throws ends with a non-zero status and names its line.
-    const Run thrown = runScenara(
+    const ScenaraRun thrown = runScenara(
         {QStringLiteral("--script"),
          writeScript(dir, QStringLiteral("throw.js"), "var a = 1;\nthrow new Error('broken');\n")},
         env);
@@ -132,14 +132,15 @@ TEST(HeadlessDemo, ScriptFailuresAndArguments) {
             .status,
         0);
     // Host arguments reach the plug-ins' view of the command line; script arguments follow "--".
-    const Run args = runScenara({QStringLiteral("--script"),
-                                 writeScript(dir, QStringLiteral("args.js"),
-                                             "app.print('host=' + app.hostArguments.join(','));\n"
-                                             "app.print('script=' + app.arguments.join(','));\n"
-                                             "app.print('classes=' + (typeof SgFacBridge));\n"),
-                                 QStringLiteral("-facbridge"), QStringLiteral("--"),
-                                 QStringLiteral("one"), QStringLiteral("two")},
-                                env);
+    const ScenaraRun args =
+        runScenara({QStringLiteral("--script"),
+                    writeScript(dir, QStringLiteral("args.js"),
+                                "app.print('host=' + app.hostArguments.join(','));\n"
+                                "app.print('script=' + app.arguments.join(','));\n"
+                                "app.print('classes=' + (typeof SgFacBridge));\n"),
+                    QStringLiteral("-facbridge"), QStringLiteral("--"), QStringLiteral("one"),
+                    QStringLiteral("two")},
+                   env);
     EXPECT_EQ(args.status, 0) << args.err.toStdString();
     EXPECT_TRUE(args.out.contains(QStringLiteral("host=--script,"))) << args.out.toStdString();
     EXPECT_TRUE(args.out.contains(QStringLiteral(",-facbridge\n")));
