@@ -1,10 +1,214 @@
-// The import of returned geometry onto a scene node whose label matches its name.
+// The import of returned geometry onto a scene node whose label equals its name: a morph on the
+// node (for a figure, one morph per bone that moved, driven by a control property on the
+// figure), a prop, or a copy of the materials, as the user chooses.
 
+#include "bridge/sgbridgemorphdlg.h"
 #include "bridge/sgfacbridge.h"
 
+#include "sharedsource/engine/sgmorphloader.h"
+#include "sharedsource/engine/sgmorphloadlog.h"
+
+#include "sgcore/app/sgapp.h"
+#include "sgcore/app/sgappsettings.h"
+#include "sgcore/geometry/sgpolyshape.h"
+#include "sgcore/geometry/sgvertexmesh.h"
+#include "sgcore/properties/sgfloatproperty.h"
+#include "sgcore/scene/sgbone.h"
+#include "sgcore/scene/sgscene.h"
+#include "sgcore/scene/sgskeleton.h"
+
+#include <QMainWindow>
+#include <QMessageBox>
+#include <QTextDocumentFragment>
+
+#include <memory>
+#include <optional>
+
+namespace {
+
+// The figure's control property as it was before the import touched it, so that an import that
+// made no morph can leave the figure exactly as it found it.
+class ControlPropertyUndo {
+public:
+    // A property this import added to the node.
+    void added(SgNode *node, SgProperty *property) {
+        m_node = node;
+        m_added = property;
+    }
+    // A float property this import reuses; its settings are kept to be put back.
+    void reused(SgFloatProperty *property) {
+        m_reused = property;
+        m_saved =
+            Settings{property->getRawValue(), property->getDefaultValue(), property->getMin(),
+                     property->getMax(),      property->isClamped(),       property->isHidden(),
+                     property->canAnimate(),  property->getPath()};
+    }
+    // A property of another class that this import took off the node to make room.
+    void replaced(SgNode *node, SgProperty *property) {
+        m_node = node;
+        m_replaced.reset(property);
+    }
+
+    // The morph run succeeded: what was replaced is gone for good.
+    void commit() { m_replaced.reset(); }
+
+    // The morph run made nothing: put the node's properties back as they were.
+    void rollBack(SgMorphLoader &loader) {
+        // The loader must not refer to a property that is about to go.
+        loader.setControlProperty(nullptr);
+        if (m_added && m_node && m_node->findProperty(m_added->getName()) == m_added)
+            m_node->removeProperty(m_added->getName());
+        if (m_reused && m_saved) {
+            m_reused->setValue(m_saved->value);
+            m_reused->setDefaultValue(m_saved->defaultValue);
+            m_reused->setMin(m_saved->min);
+            m_reused->setMax(m_saved->max);
+            m_reused->setIsClamped(m_saved->clamped);
+            m_reused->setHidden(m_saved->hidden);
+            m_reused->setCanAnimate(m_saved->canAnimate);
+            m_reused->setPath(m_saved->path);
+        }
+        if (m_replaced && m_node && m_node->addProperty(m_replaced.get()) == 0)
+            (void)m_replaced.release();
+    }
+
+private:
+    struct Settings {
+        float value, defaultValue, min, max;
+        bool clamped, hidden, canAnimate;
+        QString path;
+    };
+    SgNode *m_node = nullptr;
+    SgProperty *m_added = nullptr;
+    SgFloatProperty *m_reused = nullptr;
+    std::optional<Settings> m_saved;
+    std::unique_ptr<SgProperty> m_replaced;
+};
+
+// Sets the loader up to drive the figure's morphs from one control property named as the morph
+// (value 1, range -1 to 1, clamped, in the morph group), and returns the targets: every bone.
+QList<SgNode *> setUpFigure(SgMorphLoader &loader, SgSkeleton *figure, ControlPropertyUndo &undo) {
+    loader.setControlNode(figure);
+    loader.setCreateControl(true);
+    // The returned mesh is the figure as the host exported it: one welded mesh.
+    loader.setScenaraExported(true);
+    loader.setIgnoredInvisibleNodes(false);
+    loader.setWeldedGeometry(true);
+    loader.setRemovedUnusedVertices(true);
+    loader.setFourthWeldFlag(true);
+
+    const QString name = loader.morphName();
+    SgProperty *existing = figure->findProperty(name);
+    auto *control = dynamic_cast<SgFloatProperty *>(existing);
+    const bool reuse = control != nullptr && loader.override() != 0;
+    if (reuse) {
+        undo.reused(control);
+    } else {
+        if (existing != nullptr && control == nullptr && loader.override() != 0)
+            undo.replaced(figure, figure->takeProperty(existing));
+        control = new SgFloatProperty(name);
+        control->setLabel(name);
+    }
+    loader.setControlProperty(control);
+    control->setDefaultValue(0.0f);
+    control->setPath(loader.morphGroup());
+    control->setValue(1.0f);
+    control->setHidden(false);
+    control->setCanAnimate(true);
+    control->setMin(-1.0f);
+    control->setMax(1.0f);
+    control->setIsClamped(true);
+    // When the name is taken the property stays with the loader, which places it (or uses the
+    // node's namesake) when the run starts.
+    if (!reuse && figure->addProperty(control) == 0)
+        undo.added(figure, control);
+
+    loader.setCustomLabel(QStringLiteral("p_") + name);
+    loader.setUseCustomLabel(true);
+    loader.setHideSecondary(true);
+
+    QList<SgNode *> targets;
+    for (SgBone *bone : figure->getAllBones())
+        targets.append(bone);
+    return targets;
+}
+
+// The load log as plain text lines, for the host log.
+QString plainReport(const SgMorphLoadLog &log) {
+    return QTextDocumentFragment::fromHtml(log.toHtml()).toPlainText().trimmed();
+}
+
+} // namespace
+
 bool SgFacBridge::importReturnedShape(SgPolyShape *shape, SgNode *node) {
-    // Turning a matched shape into a morph, a prop or a copy of materials is done by the morph
-    // import, which lives elsewhere; until it is built in here a matched shape is left alone
-    // and counts as dealt with, so it does not become a prop.
-    return shape && node;
+    if (node == nullptr || shape == nullptr)
+        return false;
+    SgMorphLoader loader;
+    SgMorphLoadLog log;
+    loader.setOverride(0);
+    loader.setApplyAfterJoint(false);
+    const int tools = SgAppSettings().getInt(QStringLiteral("FacetorBridgeTools"), 0);
+    // Every road that keeps the shape ends by telling the scene's views (and a script waiting
+    // for the import) that the import is over.
+    auto dealtWith = [] {
+        sgApp->getScene()->update();
+        return true;
+    };
+
+    QMainWindow *window = sgApp->getInterface();
+    if (window == nullptr) {
+        loader.setMorphName(QStringLiteral("MyMorph"));
+        loader.setMorphGroup(QStringLiteral("Morphs"));
+    } else if (tools != 0) {
+        // The morph loader dialog in its bridge mode takes this road over: it shows the returned
+        // geometry as its one source and runs the morph creation itself. Until that dialog is
+        // part of the plug-in the shape is left alone here and counts as dealt with.
+        return dealtWith();
+    } else {
+        SgBridgeMorphDlg dialog(node->getLabel(), window, node);
+        if (dialog.exec() != QDialog::Accepted)
+            return dealtWith();
+        loader.setMorphGroup(dialog.getGroupPath());
+        loader.setMorphName(dialog.getMorphName());
+        loader.setOverride(dialog.getOverride() ? 1 : 0);
+        const QString action = dialog.getActionText();
+        if (action.contains(QLatin1String("Material"))) {
+            copyMaterials(shape, node);
+            if (!action.contains(QLatin1String("Morph")))
+                return dealtWith();
+        } else if (action.contains(QLatin1String("Prop"))) {
+            createPropFromShape(shape);
+            return true;
+        } else if (!action.contains(QLatin1String("Morph"))) {
+            return dealtWith();
+        }
+    }
+
+    ControlPropertyUndo undo;
+    QList<SgNode *> targets;
+    if (auto *figure = dynamic_cast<SgSkeleton *>(node))
+        targets = setUpFigure(loader, figure, undo);
+    else
+        targets.append(node);
+
+    SgVertexMesh *geometry = shape->getGeometry();
+    if (geometry != nullptr)
+        geometry->ref();
+    loader.createMorphForNodes(geometry, targets, log);
+    if (geometry != nullptr)
+        geometry->unref();
+    sgApp->log(plainReport(log));
+
+    if (log.hasProblems()) {
+        // No morph was made: the figure keeps the control property it had, if any.
+        undo.rollBack(loader);
+        const QMessageBox::StandardButton answer = QMessageBox::question(
+            sgApp->getDialogParent(), SgFacBridge::tr("Changed Geometry"),
+            SgFacBridge::tr("The geometry has changed and cannot create a morph.\nWould you like "
+                            "to import it as a prop instead?"),
+            QMessageBox::Yes | QMessageBox::No, QMessageBox::Yes);
+        return answer == QMessageBox::Yes ? false : dealtWith();
+    }
+    undo.commit();
+    return dealtWith();
 }

@@ -1,0 +1,197 @@
+#include "app/sgappwindow.h"
+
+#include "app/sglogpane.h"
+#include "app/sgmeshview.h"
+#include "app/sgobjexport.h"
+#include "app/sgprogressview.h"
+#include "app/sgpropertypanel.h"
+#include "app/sgscenetree.h"
+
+#include "sgcore/app/sgapp.h"
+#include "sgcore/app/sgappsettings.h"
+#include "sgcore/app/sgmessagesink.h"
+#include "sgcore/io/sgscenefile.h"
+#include "sgcore/plugin/sgaction.h"
+#include "sgcore/scene/sgnode.h"
+#include "sgcore/scene/sgscene.h"
+
+#include <QDockWidget>
+#include <QFileDialog>
+#include <QFileInfo>
+#include <QMenuBar>
+#include <QMessageBox>
+#include <QStatusBar>
+#include <QToolBar>
+
+SgAppWindow::SgAppWindow(QWidget *parent) : QMainWindow(parent) {
+    setObjectName(QStringLiteral("SgAppWindow"));
+    setWindowTitle(QStringLiteral("Scenara"));
+    SgScene *scene = sgApp->getScene();
+
+    m_view = new SgMeshView(scene, this);
+    setCentralWidget(m_view);
+
+    m_tree = new SgSceneTree(scene, this);
+    auto *treeDock = new QDockWidget(tr("Scene"), this);
+    treeDock->setObjectName(QStringLiteral("SgSceneDock"));
+    treeDock->setWidget(m_tree);
+    addDockWidget(Qt::LeftDockWidgetArea, treeDock);
+
+    m_panel = new SgPropertyPanel(this);
+    auto *panelDock = new QDockWidget(tr("Properties"), this);
+    panelDock->setObjectName(QStringLiteral("SgPropertyDock"));
+    panelDock->setWidget(m_panel);
+    addDockWidget(Qt::RightDockWidgetArea, panelDock);
+
+    m_log = new SgLogPane(this);
+    auto *logDock = new QDockWidget(tr("Log"), this);
+    logDock->setObjectName(QStringLiteral("SgLogDock"));
+    logDock->setWidget(m_log);
+    addDockWidget(Qt::BottomDockWidgetArea, logDock);
+
+    SgMessageSink *sink = sgApp->getMessageSink();
+    for (const QString &line : sink->logLines())
+        m_log->appendLine(line);
+    connect(sink, &SgMessageSink::logged, m_log, &SgLogPane::appendLine);
+    connect(sink, &SgMessageSink::statusChanged, this, [this](const QString &text, bool now) {
+        statusBar()->showMessage(text);
+        if (now)
+            statusBar()->repaint();
+    });
+    m_progress = new SgProgressView(sink, this);
+
+    connect(scene, &SgScene::selectionChanged, this, &SgAppWindow::primaryChanged);
+    connect(scene, &SgScene::nodeRemoved, this, [this](SgNode *node) {
+        if (node == m_panelNode)
+            primaryChanged();
+    });
+    connect(scene, &SgScene::sceneUpdated, m_panel, &SgPropertyPanel::refresh);
+    connect(m_panel, &SgPropertyPanel::valueEdited, m_view, qOverload<>(&QWidget::update));
+
+    buildMenus();
+    statusBar()->showMessage(tr("Ready"));
+    resize(1100, 720);
+    sgApp->setInterface(this);
+}
+
+SgAppWindow::~SgAppWindow() {
+    m_panel->showNode(nullptr);
+    if (sgApp && sgApp->getInterface() == this)
+        sgApp->setInterface(nullptr);
+}
+
+void SgAppWindow::buildMenus() {
+    QMenu *file = menuAt(tr("&File"));
+    QAction *open = file->addAction(tr("Open Scene..."), this, &SgAppWindow::openSceneDialog);
+    open->setObjectName(QStringLiteral("SgOpenSceneAction"));
+    open->setShortcut(QKeySequence::Open);
+    QAction *exportObj = file->addAction(tr("Export OBJ..."), this, &SgAppWindow::exportObjDialog);
+    exportObj->setObjectName(QStringLiteral("SgExportObjAction"));
+    exportObj->setShortcut(QKeySequence(Qt::CTRL | Qt::Key_E));
+    file->addSeparator();
+    QAction *quit = file->addAction(tr("Quit"), this, &QWidget::close);
+    quit->setShortcut(QKeySequence::Quit);
+}
+
+QMenu *SgAppWindow::menuAt(const QString &path) {
+    QMenu *menu = nullptr;
+    for (const QString &title : path.split(QLatin1Char('/'), Qt::SkipEmptyParts)) {
+        const QList<QAction *> siblings = menu ? menu->actions() : menuBar()->actions();
+        QMenu *found = nullptr;
+        for (QAction *action : siblings)
+            if (action->menu() && action->text() == title)
+                found = action->menu();
+        if (found == nullptr)
+            found = menu ? menu->addMenu(title) : menuBar()->addMenu(title);
+        menu = found;
+    }
+    return menu;
+}
+
+void SgAppWindow::addPluginAction(SgAction *action) {
+    const QString category = action->getActionGroup();
+    QString menuPath = action->getDefaultMenuPath();
+    if (menuPath.isEmpty())
+        menuPath = QStringLiteral("&Scripts/Plug-ins");
+    QMenu *menu = menuAt(menuPath + QLatin1Char('/') + category);
+    menu->addAction(action);
+
+    const QString barName =
+        action->getDefaultToolBar().isEmpty() ? category : action->getDefaultToolBar();
+    auto *bar = findChild<QToolBar *>(QStringLiteral("SgToolBar_") + barName);
+    if (bar == nullptr) {
+        bar = addToolBar(barName);
+        bar->setObjectName(QStringLiteral("SgToolBar_") + barName);
+    }
+    bar->addAction(action);
+    if (!action->getDefaultAccel().isEmpty())
+        action->setShortcut(QKeySequence(action->getDefaultAccel()));
+    action->init();
+}
+
+bool SgAppWindow::openScene(const QString &path, bool quiet) {
+    SgScene *scene = sgApp->getScene();
+    m_panel->showNode(nullptr);
+    m_panelNode = nullptr;
+    scene->clear();
+    SgSceneFile file;
+    if (!file.load(path, scene)) {
+        sgApp->log(QStringLiteral("Could not open the scene: %1").arg(file.getErrorString()));
+        if (!quiet)
+            QMessageBox::warning(this, tr("Open Scene"), file.getErrorString(), QMessageBox::Ok);
+        return false;
+    }
+    sgApp->log(QStringLiteral("Opened %1 (%2 nodes).")
+                   .arg(QFileInfo(path).fileName())
+                   .arg(file.getAddedNodeCount()));
+    sgApp->statusLine(tr("Opened %1").arg(QFileInfo(path).fileName()));
+    setWindowTitle(QStringLiteral("Scenara - %1").arg(QFileInfo(path).fileName()));
+    scene->update();
+    return true;
+}
+
+bool SgAppWindow::exportSelection(const QString &path, bool quiet) {
+    QString error;
+    SgNode *node = sgApp->getScene()->getPrimarySelection();
+    if (!SgObjExport::exportNode(node, path, &error)) {
+        sgApp->log(error);
+        if (!quiet)
+            QMessageBox::warning(this, tr("Export OBJ"), error, QMessageBox::Ok);
+        return false;
+    }
+    sgApp->log(QStringLiteral("Exported %1 to %2.").arg(node->getLabel(), path));
+    return true;
+}
+
+void SgAppWindow::openSceneDialog() {
+    SgAppSettings settings(QStringLiteral("Scenara"));
+    const QString path = QFileDialog::getOpenFileName(
+        this, tr("Open Scene"), settings.getString(QStringLiteral("SceneDirectory")),
+        tr("Scenes (*.json);;All files (*)"));
+    if (path.isEmpty())
+        return;
+    settings.setString(QStringLiteral("SceneDirectory"), QFileInfo(path).absolutePath());
+    openScene(path);
+}
+
+void SgAppWindow::exportObjDialog() {
+    SgNode *node = sgApp->getScene()->getPrimarySelection();
+    if (node == nullptr) {
+        QMessageBox::warning(this, tr("Export OBJ"), tr("Select a node to export first."),
+                             QMessageBox::Ok);
+        return;
+    }
+    const QString path = QFileDialog::getSaveFileName(this, tr("Export OBJ"),
+                                                      node->getLabel() + QStringLiteral(".obj"),
+                                                      tr("Wavefront OBJ (*.obj)"));
+    if (!path.isEmpty())
+        exportSelection(path);
+}
+
+void SgAppWindow::primaryChanged() {
+    SgNode *primary = sgApp->getScene()->getPrimarySelection();
+    if (primary == m_panelNode)
+        return;
+    m_panelNode = primary;
+    m_panel->showNode(primary);
+}

@@ -1,0 +1,60 @@
+#pragma once
+
+#include <QMainWindow>
+
+class QMenu;
+class SgAction;
+class SgLogPane;
+class SgMeshView;
+class SgNode;
+class SgProgressView;
+class SgPropertyPanel;
+class SgSceneTree;
+
+// The application's main window: the scene as a tree (left), a front view of the scene's
+// current geometry (centre), the property panel of the primary selection (right), the log pane
+// fed by the host log (bottom), the status line, and a progress dialog for the host's progress
+// runs. "File > Open Scene..." loads a scene file, "File > Export OBJ..." writes the primary
+// selection's current geometry. Plug-in actions are placed with `addPluginAction`.
+// It registers itself as the host's main window (`sgApp->getInterface()`); `sgApp` must exist.
+class SgAppWindow : public QMainWindow {
+    Q_OBJECT
+public:
+    explicit SgAppWindow(QWidget *parent = nullptr);
+    ~SgAppWindow() override;
+
+    // Puts a plug-in action in the menu given by its default menu path ("&Scripts/Plug-ins"),
+    // in a sub-menu named after its category (`getActionGroup`), and on the tool bar of that
+    // category (or its default tool bar when it names one); then calls its `init`.
+    void addPluginAction(SgAction *action);
+
+    // Loads a scene file into the scene (replacing it); false with a warning box and a log line
+    // when the file cannot be loaded. With `quiet` no box is shown.
+    bool openScene(const QString &path, bool quiet = false);
+    // Writes the primary selection's current geometry to `path`; false with a log line when
+    // there is nothing selected or the file cannot be written.
+    bool exportSelection(const QString &path, bool quiet = false);
+
+    SgSceneTree *sceneTree() const { return m_tree; }
+    SgPropertyPanel *propertyPanel() const { return m_panel; }
+    SgLogPane *logPane() const { return m_log; }
+    SgMeshView *meshView() const { return m_view; }
+    SgProgressView *progressView() const { return m_progress; }
+    // The menu at a "/"-separated path of titles, created on demand.
+    QMenu *menuAt(const QString &path);
+
+private slots:
+    void openSceneDialog();
+    void exportObjDialog();
+    void primaryChanged();
+
+private:
+    void buildMenus();
+
+    SgSceneTree *m_tree = nullptr;
+    SgPropertyPanel *m_panel = nullptr;
+    SgLogPane *m_log = nullptr;
+    SgMeshView *m_view = nullptr;
+    SgProgressView *m_progress = nullptr;
+    SgNode *m_panelNode = nullptr;
+};

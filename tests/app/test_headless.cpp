@@ -1,0 +1,149 @@
+// The scenara executable in headless mode, with the reference modeler as a second process: the
+// demonstration's round trip makes one morph per moved bone and exports the figure at morph
+// value 1; a failing script ends with a non-zero status; command-line switches reach the host.
+
+#include "sgcore/geometry/sgpolymesh.h"
+#include "sgcore/io/sgobjreader.h"
+
+#include <QDir>
+#include <QFile>
+#include <QProcess>
+#include <QProcessEnvironment>
+#include <QTemporaryDir>
+
+#include <gtest/gtest.h>
+
+namespace {
+
+struct ScenaraRun {
+    int status = -1;
+    QString out;
+    QString err;
+};
+
+ScenaraRun runScenara(const QStringList &arguments, const QProcessEnvironment &environment) {
+    QProcess process;
+    process.setProcessEnvironment(environment);
+    process.start(QStringLiteral(SCENARA_BIN), arguments);
+    ScenaraRun run;
+    if (!process.waitForFinished(90000)) {
+        process.kill();
+        process.waitForFinished();
+    }
+    run.status = process.exitStatus() == QProcess::NormalExit ? process.exitCode() : -1;
+    run.out = QString::fromUtf8(process.readAllStandardOutput());
+    run.err = QString::fromUtf8(process.readAllStandardError());
+    return run;
+}
+
+QProcessEnvironment environmentIn(const QTemporaryDir &dir, const QString &edit) {
+    QProcessEnvironment env = QProcessEnvironment::systemEnvironment();
+    env.insert(QStringLiteral("QT_QPA_PLATFORM"), QStringLiteral("offscreen"));
+    env.insert(QStringLiteral("SCENARA_SETTINGS"), dir.filePath(QStringLiteral("scenara.ini")));
+    env.insert(QStringLiteral("FACETOR_INSTALL_PATH"), QStringLiteral(FACETOR_BIN_DIR));
+    env.insert(QStringLiteral("FACETOR_WORKSPACE"), dir.filePath(QStringLiteral("workspace")));
+    env.insert(QStringLiteral("FACETOR_LOG"), dir.filePath(QStringLiteral("facetor.log")));
+    env.insert(QStringLiteral("FACETOR_EXPECT"), QStringLiteral("1"));
+    env.insert(QStringLiteral("FACETOR_QUIT_WHEN_DONE"), QStringLiteral("1"));
+    env.insert(QStringLiteral("FACETOR_EDIT"), edit);
+    return env;
+}
+
+QString writeScript(const QTemporaryDir &dir, const QString &name, const QByteArray &text) {
+    const QString path = dir.filePath(name);
+    QFile file(path);
+    file.open(QIODevice::WriteOnly);
+    file.write(text);
+    return path;
+}
+
+} // namespace
+
+TEST(HeadlessDemo, RoundTripMakesMorphsAndExportsTheFigureAtValueOne) {
+    QTemporaryDir dir;
+    // The modeler scales what it receives by 1.25 about the origin (its units are the host's
+    // times 0.1, so this is the same scale in the host's units).
+    const ScenaraRun run = runScenara(
+        {QStringLiteral("--script"), QStringLiteral(SG_EXAMPLES_DIR "/demo/send-figure.js"),
+         QStringLiteral("--"), QStringLiteral(SG_EXAMPLES_DIR "/demo/scene.json"), dir.path()},
+        environmentIn(dir, QStringLiteral("scale=1.25")));
+    ASSERT_EQ(run.status, 0) << run.out.toStdString() << run.err.toStdString();
+    EXPECT_TRUE(run.out.contains(QStringLiteral("morphs created: 3"))) << run.out.toStdString();
+    EXPECT_TRUE(run.out.contains(QStringLiteral("Created morph successfully.")));
+    EXPECT_TRUE(run.out.contains(QStringLiteral(
+        "control property MyMorph on Blobby: value 1, range -1 to 1 (clamped), group \"Morphs\"")))
+        << run.out.toStdString();
+
+    SgObjReader original;
+    ASSERT_TRUE(original.readFile(QStringLiteral(SG_EXAMPLES_DIR "/demo/figure.obj")));
+    SgObjReader exported;
+    ASSERT_TRUE(exported.readFile(dir.filePath(QStringLiteral("Blobby-morphed.obj"))))
+        << exported.getErrorString().toStdString();
+    // Bone by bone, each bone's vertices are the figure file's group vertices, scaled.
+    const SgPolyMesh *source = original.getMesh();
+    const SgPolyMesh *result = exported.getMesh();
+    int offset = 0;
+    for (const char *bone : {"hip", "chest", "head"}) {
+        const std::vector<int32_t> vertices =
+            source->getFaceGroupVertices(source->findFaceGroup(QString::fromLatin1(bone)));
+        ASSERT_GE(result->findFaceGroup(QString::fromLatin1(bone)), 0) << bone;
+        for (size_t i = 0; i < vertices.size(); ++i) {
+            const SgVec3 expected = source->getVertex(vertices[i]) * 1.25f;
+            const SgVec3 actual = result->getVertex(offset + int(i));
+            EXPECT_NEAR(actual.x, expected.x, 1e-4) << bone << " " << i;
+            EXPECT_NEAR(actual.y, expected.y, 1e-4) << bone << " " << i;
+            EXPECT_NEAR(actual.z, expected.z, 1e-4) << bone << " " << i;
+        }
+        offset += int(vertices.size());
+    }
+    EXPECT_EQ(offset, result->getVertexCount());
+    // Nothing of the bridge's segments is left behind.
+    EXPECT_TRUE(QDir(QStringLiteral("/dev/shm"))
+                    .entryList({QStringLiteral("sgsharedmemory-*")}, QDir::Files)
+                    .filter(QStringLiteral("464143")) // "FAC" in hexadecimal
+                    .isEmpty());
+}
+
+TEST(HeadlessDemo, ScriptFailuresAndArguments) {
+    QTemporaryDir dir;
+    const QProcessEnvironment env = environmentIn(dir, QString());
+    // A script that throws ends with a non-zero status and names its line.
+    const ScenaraRun thrown = runScenara(
+        {QStringLiteral("--script"),
+         writeScript(dir, QStringLiteral("throw.js"), "var a = 1;\nthrow new Error('broken');\n")},
+        env);
+    EXPECT_NE(thrown.status, 0);
+    EXPECT_TRUE(thrown.err.contains(QStringLiteral(":2: Error: broken")))
+        << thrown.err.toStdString();
+    // So does a syntax error, a missing file, and an exception inside a waited-for callback.
+    EXPECT_NE(runScenara({QStringLiteral("--script"),
+                          writeScript(dir, QStringLiteral("syntax.js"), "var = ;\n")},
+                         env)
+                  .status,
+              0);
+    EXPECT_NE(runScenara({QStringLiteral("--script"), dir.filePath(QStringLiteral("none.js"))}, env)
+                  .status,
+              0);
+    EXPECT_NE(
+        runScenara({QStringLiteral("--script"),
+                    writeScript(dir, QStringLiteral("later.js"),
+                                "app.later(10, function () { throw new Error('late'); });\n")},
+                   env)
+            .status,
+        0);
+    // Host arguments reach the plug-ins' view of the command line; script arguments follow "--".
+    const ScenaraRun args =
+        runScenara({QStringLiteral("--script"),
+                    writeScript(dir, QStringLiteral("args.js"),
+                                "app.print('host=' + app.hostArguments.join(','));\n"
+                                "app.print('script=' + app.arguments.join(','));\n"
+                                "app.print('classes=' + (typeof SgFacBridge));\n"),
+                    QStringLiteral("-facbridge"), QStringLiteral("--"), QStringLiteral("one"),
+                    QStringLiteral("two")},
+                   env);
+    EXPECT_EQ(args.status, 0) << args.err.toStdString();
+    EXPECT_TRUE(args.out.contains(QStringLiteral("host=--script,"))) << args.out.toStdString();
+    EXPECT_TRUE(args.out.contains(QStringLiteral(",-facbridge\n")));
+    EXPECT_TRUE(args.out.contains(QStringLiteral("script=one,two\n")));
+    EXPECT_TRUE(args.out.contains(QStringLiteral("classes=function\n")));
+}
