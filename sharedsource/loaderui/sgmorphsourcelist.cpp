@@ -12,6 +12,7 @@
 #include "sharedsource/loaderui/sgmorphmeshitem.h"
 #include "sharedsource/loaderui/sgmorphsourceitem.h"
 
+#include <QContextMenuEvent>
 #include <QDragEnterEvent>
 #include <QDropEvent>
 #include <QHeaderView>
@@ -80,10 +81,6 @@ SgMorphSourceList::SgMorphSourceList(QWidget *parent, const QString &name) : QTr
     setSelectionMode(QAbstractItemView::ExtendedSelection);
     setEditTriggers(QAbstractItemView::NoEditTriggers);
     setItemDelegate(new RenameDelegate(this));
-    setContextMenuPolicy(Qt::CustomContextMenu);
-    connect(this, &QWidget::customContextMenuRequested, this, [this](const QPoint &pos) {
-        showContextMenu(itemAt(pos), viewport()->mapToGlobal(pos), columnAt(pos.x()));
-    });
     setMinimumSize(400, 400);
 }
 
@@ -208,6 +205,20 @@ void SgMorphSourceList::dropEvent(QDropEvent *event) {
     sgLoaderWarning(tr("Error loading files"), text);
 }
 
+void SgMorphSourceList::contextMenuEvent(QContextMenuEvent *event) {
+    // From the keyboard the request is about the current row's value; from the mouse about
+    // the row and column under the pointer (the position is the viewport's).
+    event->accept();
+    if (event->reason() == QContextMenuEvent::Keyboard) {
+        if (QTreeWidgetItem *current = currentItem()) {
+            const QPoint at = visualItemRect(current).center();
+            showContextMenu(current, viewport()->mapToGlobal(at), 1);
+        }
+        return;
+    }
+    showContextMenu(itemAt(event->pos()), event->globalPos(), columnAt(event->pos().x()));
+}
+
 void SgMorphSourceList::mousePressEvent(QMouseEvent *event) {
     QTreeWidgetItem *before = currentItem();
     QTreeWidget::mousePressEvent(event);
@@ -288,8 +299,12 @@ void SgMorphSourceList::createMorphs(SgFileIOSettings &importOptions, int mode,
             } else if (source->node()) {
                 own.append(source->node());
             }
-            if (source->loader().applyPose())
-                source->loader().createMorphForNodes(source->mesh(), own, log);
+            if (source->loader().applyPose() && source->mesh()) {
+                SgVertexMesh *mesh = source->mesh();
+                mesh->ref(); // the geometry stays alive for the whole call
+                source->loader().createMorphForNodes(mesh, own, log);
+                mesh->unref();
+            }
         } else {
             break;
         }

@@ -62,6 +62,9 @@ protected:
     // Files dropped onto an enabled "Pose:" row become its pose; otherwise geometry files are
     // added and the others are listed in one "Error loading files" warning.
     void dropEvent(QDropEvent *event) override;
+    // A right click asks for the row and column under the pointer, the context-menu key for
+    // the current row's value; both go to `showContextMenu`.
+    void contextMenuEvent(QContextMenuEvent *event) override;
     // A press on the current row (or Space on it) starts its in-place edit.
     void mousePressEvent(QMouseEvent *event) override;
     void keyPressEvent(QKeyEvent *event) override;

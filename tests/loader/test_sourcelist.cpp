@@ -185,6 +185,16 @@ TEST_F(SourceList, ContextMenusForwardToRowsAndOfferSavingOnFileRows) {
         EXPECT_TRUE(answer.answered());
     }
     EXPECT_TRUE(static_cast<SgMorphFileItem *>(file)->loader().reverseModifiers());
+
+    // The context-menu key opens the editor of the current row.
+    list.setCurrentItem(findLabel(file, "Apply After Joint Binding:"));
+    {
+        ModalAnswer answer(chooseMenuEntry("yes"));
+        QContextMenuEvent event(QContextMenuEvent::Keyboard, QPoint(1, 1));
+        QCoreApplication::sendEvent(list.viewport(), &event);
+        EXPECT_TRUE(answer.answered());
+    }
+    EXPECT_TRUE(static_cast<SgMorphFileItem *>(file)->loader().applyAfterJoint());
 }
 
 TEST_F(SourceList, DropsAddGeometryFilesAndSetPoses) {
