@@ -190,7 +190,8 @@ TEST_F(SourceList, ContextMenusForwardToRowsAndOfferSavingOnFileRows) {
     list.setCurrentItem(findLabel(file, "Apply After Joint Binding:"));
     {
         ModalAnswer answer(chooseMenuEntry("yes"));
-        QContextMenuEvent event(QContextMenuEvent::Keyboard, QPoint(1, 1));
+        QContextMenuEvent event(QContextMenuEvent::Keyboard, QPoint(1, 1),
+                                list.viewport()->mapToGlobal(QPoint(1, 1)));
         QCoreApplication::sendEvent(list.viewport(), &event);
         EXPECT_TRUE(answer.answered());
     }
