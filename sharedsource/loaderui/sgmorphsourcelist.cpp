@@ -1,8 +1,9 @@
 #include "sharedsource/loaderui/sgmorphsourcelist.h"
 
 #include "sgcore/app/sgapp.h"
+#include "sgcore/app/sgimportmgr.h"
 #include "sgcore/geometry/sgvertexmesh.h"
-#include "sgcore/io/sgimportmgr.h"
+#include "sgcore/importer/sggeometryimporter.h"
 #include "sgcore/scene/sgbone.h"
 #include "sgcore/scene/sgscene.h"
 #include "sgcore/scene/sgskeleton.h"
@@ -22,8 +23,6 @@
 #include <QMouseEvent>
 #include <QStyledItemDelegate>
 #include <QUrl>
-
-#include <memory>
 
 // The line editor of the in-place rows. It commits when the editor loses focus as well as on
 // Enter, and then tells the row that its text was accepted.
@@ -61,9 +60,10 @@ QStringList localFiles(const QMimeData *data) {
     return files;
 }
 
+// Whether a geometry importer takes `file` (the manager keeps its importers).
 bool isGeometryFile(const QString &file) {
-    const std::unique_ptr<SgImporter> importer(sgApp->getImportMgr()->findImporter(file));
-    return dynamic_cast<SgGeometryImporter *>(importer.get()) != nullptr;
+    SgImportMgr *manager = sgApp->getImportMgr();
+    return manager && dynamic_cast<SgGeometryImporter *>(manager->findImporter(file)) != nullptr;
 }
 } // namespace
 
