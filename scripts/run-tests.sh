@@ -22,6 +22,13 @@ if [ "${SG_SKIP_FUZZ:-0}" != 1 ]; then
     bash scripts/run-fuzz.sh || status=1
 fi
 
+# The segment's Win32 back-end: cross build and two-process tests under Wine (skipped with
+# SG_SKIP_WINE=1); ctest's own wine test then skips.
+if [ "${SG_SKIP_WINE:-0}" != 1 ]; then
+    SG_WIN32_BUILD_DIR="$BUILD-win32" bash scripts/run-wine-tests.sh || status=1
+    export SG_WINE_TESTS_DONE=1
+fi
+
 # The test suites last, so that their summary closes the output.
 (cd "$BUILD" && ctest --output-on-failure -j "$JOBS" "$@") || status=1
 exit $status

@@ -1,0 +1,124 @@
+#include "facetor/sgfacetorlink.h"
+
+#include "exchange/sgexchangenodereader.h"
+#include "exchange/shm/sgcontrolrecord.h"
+#include "exchange/shm/sgsharedmemory.h"
+
+#include <cstring>
+
+namespace {
+// Control accesses never hold up the modeler for longer than this.
+constexpr int kControlLockMs = 25;
+} // namespace
+
+SgFacetorLink::SgFacetorLink()
+    : m_control(std::make_unique<SgSharedMemory>(kSgControlSegmentKey)),
+      m_data(std::make_unique<SgSharedMemory>(kSgDataSegmentKey)) {}
+
+SgFacetorLink::~SgFacetorLink() = default;
+
+bool SgFacetorLink::tryLink() {
+    if (m_linked)
+        return true;
+    if (!m_control->exists() || !m_control->attach(SgSharedMemory::kReadWrite))
+        return false;
+    if (m_control->size() < int(sizeof(SgControlRecord)) || !m_control->tryLock(kControlLockMs)) {
+        m_control->detach();
+        return false;
+    }
+    // The host writes a fresh record (both flags "free") right after creating the segment; a
+    // record of zeros is one the host has not set up yet.
+    const auto *record = reinterpret_cast<const SgControlRecord *>(m_control->data());
+    const bool ready = record->toHostFlag == 1;
+    m_control->unlock();
+    if (!ready) {
+        m_control->detach();
+        return false;
+    }
+    m_linked = true;
+    return true;
+}
+
+bool SgFacetorLink::post(int code, int value) {
+    if (!m_linked || !m_control->isAttached() || !m_control->tryLock(kControlLockMs))
+        return false;
+    auto *record = reinterpret_cast<SgControlRecord *>(m_control->data());
+    bool posted = false;
+    if (record->toHostFlag == 1) {
+        record->toHostCode = uint8_t(code);
+        record->toHostParameter = value;
+        record->toHostFlag = 0;
+        posted = true;
+    }
+    m_control->unlock();
+    return posted;
+}
+
+int SgFacetorLink::take(int &value) {
+    if (!m_linked || !m_control->isAttached() || !m_control->tryLock(kControlLockMs))
+        return -1;
+    auto *record = reinterpret_cast<SgControlRecord *>(m_control->data());
+    int code = -1;
+    if (record->toModelerFlag == 0) {
+        code = record->toModelerCode;
+        value = record->toModelerParameter;
+        record->toModelerFlag = 1;
+    }
+    m_control->unlock();
+    return code;
+}
+
+bool SgFacetorLink::readNode(SgExchangeNode &node, QString &error) {
+    node = SgExchangeNode();
+    if (!m_data->exists() || !m_data->attach(SgSharedMemory::kReadWrite)) {
+        error = QStringLiteral("There is no data segment.");
+        return false;
+    }
+    bool ok = false;
+    if (m_data->lock()) {
+        SgExchangeNodeReader reader(m_data->data(), std::size_t(std::max(0, m_data->size())));
+        ok = reader.read(node);
+        if (!ok)
+            error = reader.errorString();
+        m_data->unlock();
+    } else {
+        error = QStringLiteral("The data segment's lock cannot be had.");
+    }
+    m_data->detach();
+    m_data->remove(SgSharedMemory::kRemoveUnlocked);
+    return ok;
+}
+
+bool SgFacetorLink::writeRecord(const QByteArray &record) {
+    if (record.isEmpty() || !m_data->create(int32_t(record.size())))
+        return false;
+    if (!m_data->attach(SgSharedMemory::kReadWrite)) {
+        m_data->remove(SgSharedMemory::kRemoveUnlocked);
+        return false;
+    }
+    if (!m_data->lock() || m_data->size() < record.size()) {
+        m_data->unlock();
+        releaseData();
+        return false;
+    }
+    std::memcpy(m_data->data(), record.constData(), size_t(record.size()));
+    m_data->unlock();
+    return true;
+}
+
+bool SgFacetorLink::dataSegmentExists() {
+    return m_data->exists();
+}
+
+void SgFacetorLink::releaseData() {
+    if (m_data->isAttached())
+        m_data->detach();
+    m_data->remove(SgSharedMemory::kRemoveUnlocked);
+}
+
+void SgFacetorLink::unlink() {
+    if (m_control->isAttached())
+        m_control->detach();
+    m_control->remove(SgSharedMemory::kRemoveUnlocked);
+    m_linked = false;
+}

@@ -1,0 +1,266 @@
+#include "facetor/sgfacetormodeler.h"
+
+#include "facetor/sgfacetorreturn.h"
+
+#include <QCoreApplication>
+#include <QElapsedTimer>
+#include <QFile>
+#include <QFileInfo>
+#include <QFileSystemWatcher>
+#include <QTextStream>
+#include <QThread>
+#include <QTimer>
+
+#include <atomic>
+
+namespace {
+
+// Codes of the control record, the same in both directions' tables.
+enum Code { Idle = 0, Data = 1, Quit = 2, Acknowledge = 3, Release = 4 };
+
+std::atomic<bool> s_quitRequested{false};
+
+// How long quitting keeps trying to post its goodbye while the host has not taken the last
+// message (the host takes one message per 50 ms poll).
+constexpr int kGoodbyeMs = 1000;
+
+// An idle notice means the host has nothing more to send unless a node follows it at once (the
+// notice can cross the host's answer to a request).
+constexpr int kIdleGraceMs = 250;
+
+} // namespace
+
+SgFacetorModeler::SgFacetorModeler(const SgFacetorOptions &options, QObject *parent)
+    : QObject(parent), m_options(options) {
+    m_timer = new QTimer(this);
+    connect(m_timer, &QTimer::timeout, this, &SgFacetorModeler::poll);
+}
+
+SgFacetorModeler::~SgFacetorModeler() = default;
+
+void SgFacetorModeler::requestQuit() {
+    s_quitRequested = true;
+}
+
+void SgFacetorModeler::log(const QString &line) {
+    const QString stamped = QStringLiteral("%1 %2\n").arg(
+        QDateTime::currentDateTime().toString(Qt::ISODateWithMs), line);
+    if (m_logFile) {
+        m_logFile->write(stamped.toUtf8());
+        m_logFile->flush();
+    } else {
+        QTextStream(stderr) << stamped;
+    }
+}
+
+bool SgFacetorModeler::start() {
+    if (!m_options.logFile.isEmpty()) {
+        m_logFile = std::make_unique<QFile>(m_options.logFile);
+        if (!m_logFile->open(QIODevice::WriteOnly | QIODevice::Append | QIODevice::Text)) {
+            m_logFile.reset();
+            log(QStringLiteral("error cannot open the log file %1").arg(m_options.logFile));
+            return false;
+        }
+    }
+    QString error;
+    if (!m_edit.parse(m_options.editScript, error)) {
+        log(QStringLiteral("error %1").arg(error));
+        return false;
+    }
+    m_workspace = std::make_unique<SgFacetorWorkspace>(m_options.workspace);
+    if (!m_workspace->folder().exists()) {
+        log(QStringLiteral("error cannot create the workspace %1").arg(m_options.workspace));
+        return false;
+    }
+    for (const QString &path : m_options.returnFiles) {
+        SgExchangeNode node;
+        if (!SgFacetorWorkspace::readObj(path, QString(), node, error)) {
+            log(QStringLiteral("error %1").arg(error));
+            return false;
+        }
+        m_returns.enqueue(node);
+    }
+    if (m_options.watch) {
+        auto *watcher = new QFileSystemWatcher(this);
+        watcher->setObjectName(QStringLiteral("workspaceWatcher"));
+        connect(watcher, &QFileSystemWatcher::fileChanged, this,
+                &SgFacetorModeler::workspaceFileChanged);
+    }
+    log(QStringLiteral("workspace %1").arg(m_workspace->folder().absolutePath()));
+    m_linkDeadline = QDateTime::currentDateTimeUtc().addMSecs(m_options.linkTimeoutMs);
+    m_timer->start(m_options.pollMs);
+    return true;
+}
+
+void SgFacetorModeler::quit(int exitCode) {
+    if (m_quitting)
+        return;
+    m_quitting = true;
+    m_timer->stop();
+    if (m_link.isLinked()) {
+        QElapsedTimer waited;
+        waited.start();
+        bool posted = false;
+        while (!(posted = m_link.post(Quit)) && waited.elapsed() < kGoodbyeMs)
+            QThread::msleep(2);
+        log(posted ? QStringLiteral("goodbye posted") : QStringLiteral("goodbye not taken"));
+    }
+    m_link.releaseData();
+    m_link.unlink();
+    log(QStringLiteral("quit %1").arg(exitCode));
+    QCoreApplication::exit(exitCode);
+}
+
+void SgFacetorModeler::poll() {
+    if (s_quitRequested) {
+        quit(0);
+        return;
+    }
+    if (m_link.isLinked()) {
+        pollLinked();
+        return;
+    }
+    if (m_link.tryLink()) {
+        log(QStringLiteral("linked"));
+        postOrQueue(Idle); // ask for the pending selection
+    } else if (QDateTime::currentDateTimeUtc() > m_linkDeadline) {
+        log(QStringLiteral("error the host never set the control segment up"));
+        quit(1);
+    }
+}
+
+void SgFacetorModeler::pollLinked() {
+    if (!m_outbox.isEmpty() && m_link.post(m_outbox.head()))
+        m_outbox.dequeue();
+    int value = 0;
+    const int code = m_link.take(value);
+    if (code >= 0)
+        react(code);
+    if (!m_selectionArrived && m_options.expect <= 0 && m_idleSince.isValid() &&
+        m_idleSince.elapsed() >= kIdleGraceMs)
+        selectionComplete();
+    startNextReturn();
+    maybeFinish();
+}
+
+void SgFacetorModeler::react(int code) {
+    switch (code) {
+    case Data:
+        receiveNode();
+        break;
+    case Idle:
+        if (!m_selectionArrived && m_options.expect <= 0 && !m_idleSince.isValid())
+            m_idleSince.start();
+        break;
+    case Quit:
+        log(QStringLiteral("host closing"));
+        quit(0);
+        break;
+    case Acknowledge:
+        log(QStringLiteral("host read the returned geometry"));
+        m_link.releaseData();
+        m_returnInFlight = false;
+        ++m_returned;
+        startNextReturn();
+        break;
+    case Release:
+        log(QStringLiteral("host asks to release the data segment"));
+        m_link.releaseData();
+        m_returnInFlight = false;
+        postOrQueue(Idle);
+        break;
+    default:
+        log(QStringLiteral("unknown host message %1").arg(code));
+        break;
+    }
+}
+
+void SgFacetorModeler::selectionComplete() {
+    m_selectionArrived = true;
+    log(QStringLiteral("selection arrived"));
+    startNextReturn();
+}
+
+void SgFacetorModeler::receiveNode() {
+    m_idleSince.invalidate();
+    SgExchangeNode node;
+    QString error;
+    if (m_link.readNode(node, error)) {
+        const QString path = m_workspace->writeNode(node);
+        ++m_received;
+        log(QStringLiteral("received %1 vertices=%2 facets=%3 materials=%4 file=%5")
+                .arg(node.name)
+                .arg(node.vertexCount())
+                .arg(node.facets.size())
+                .arg(node.materials.size())
+                .arg(path));
+        if (!path.isEmpty()) {
+            m_writtenAt.insert(path, QFileInfo(path).lastModified());
+            if (auto *watcher = findChild<QFileSystemWatcher *>(QStringLiteral("workspaceWatcher")))
+                watcher->addPath(path);
+        }
+        if (!m_edit.isEmpty()) {
+            m_edit.apply(node);
+            queueReturn(node);
+        }
+    } else {
+        log(QStringLiteral("error the node record cannot be read: %1").arg(error));
+    }
+    postOrQueue(Acknowledge);
+    if (!m_selectionArrived && m_options.expect > 0 && m_received >= m_options.expect)
+        selectionComplete();
+}
+
+void SgFacetorModeler::workspaceFileChanged(const QString &path) {
+    auto *watcher = findChild<QFileSystemWatcher *>(QStringLiteral("workspaceWatcher"));
+    // Editors often save by replacing the file, which ends the watch: watch the new file.
+    if (watcher && QFileInfo::exists(path) && !watcher->files().contains(path))
+        watcher->addPath(path);
+    const QDateTime modified = QFileInfo(path).lastModified();
+    if (!QFileInfo::exists(path) || m_writtenAt.value(path) == modified)
+        return;
+    m_writtenAt.insert(path, modified);
+    SgExchangeNode node;
+    QString error;
+    if (!SgFacetorWorkspace::readObj(path, m_workspace->nodeNameOf(path), node, error)) {
+        log(QStringLiteral("error %1").arg(error));
+        return;
+    }
+    log(QStringLiteral("saved %1").arg(path));
+    queueReturn(node);
+}
+
+void SgFacetorModeler::queueReturn(const SgExchangeNode &node) {
+    m_returns.enqueue(node);
+    startNextReturn();
+}
+
+void SgFacetorModeler::startNextReturn() {
+    // Returns wait until the host has nothing more to send, so the data segment is free.
+    if (!m_selectionArrived || m_returnInFlight || m_returns.isEmpty() || !m_link.isLinked())
+        return;
+    // The host still holds the segment of the last node it sent until it has read our
+    // acknowledgement; a return waits for it to go.
+    if (m_link.dataSegmentExists())
+        return;
+    const SgExchangeNode node = m_returns.dequeue();
+    if (!m_link.writeRecord(SgFacetorReturn::encode(node))) {
+        log(QStringLiteral("error cannot write the returned geometry of %1").arg(node.name));
+        return;
+    }
+    m_returnInFlight = true;
+    log(QStringLiteral("returned %1 vertices=%2").arg(node.name).arg(node.vertexCount()));
+    postOrQueue(Data);
+}
+
+void SgFacetorModeler::postOrQueue(int code) {
+    if (m_outbox.isEmpty() && m_link.post(code))
+        return;
+    m_outbox.enqueue(code);
+}
+
+void SgFacetorModeler::maybeFinish() {
+    if (m_options.quitWhenDone && !m_quitting && m_selectionArrived && !m_returnInFlight &&
+        m_returns.isEmpty() && m_outbox.isEmpty())
+        quit(0);
+}

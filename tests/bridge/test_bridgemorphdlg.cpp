@@ -1,0 +1,137 @@
+// The bridge morph dialog, driven through its widgets as a user would.
+
+#include "bridge/sgbridgemorphdlg.h"
+#include "bridgetestsupport.h"
+
+#include "sgcore/app/sghelpmgr.h"
+#include "sgcore/properties/sgfloatproperty.h"
+#include "sgcore/scene/sgnode.h"
+
+#include <QCheckBox>
+#include <QComboBox>
+#include <QDialogButtonBox>
+#include <QLineEdit>
+#include <QPushButton>
+#include <QTest>
+
+#include <gtest/gtest.h>
+
+namespace {
+
+QComboBox *actionCombo(SgBridgeMorphDlg &dlg) {
+    return dlg.findChild<QComboBox *>(QStringLiteral("FcBridgehAction"));
+}
+QComboBox *groupCombo(SgBridgeMorphDlg &dlg) {
+    return dlg.findChild<QComboBox *>(QStringLiteral("FcBridgeMorphGroup"));
+}
+QLineEdit *nameEdit(SgBridgeMorphDlg &dlg) {
+    return dlg.findChild<QLineEdit *>(QStringLiteral("FcBridgeMorphName"));
+}
+QCheckBox *overrideBox(SgBridgeMorphDlg &dlg) {
+    return dlg.findChild<QCheckBox *>(QStringLiteral("FcOverrideExistingCheck"));
+}
+
+void clickOk(QWidget *modal) {
+    auto *buttons = modal->findChild<QDialogButtonBox *>();
+    QTest::mouseClick(buttons->button(QDialogButtonBox::Ok), Qt::LeftButton);
+}
+
+// Picks the action at `index` with the keyboard, as a user would on a closed combo.
+void pickAction(SgBridgeMorphDlg &dlg, int index) {
+    QComboBox *combo = actionCombo(dlg);
+    combo->setFocus();
+    while (combo->currentIndex() < index)
+        QTest::keyClick(combo, Qt::Key_Down);
+    while (combo->currentIndex() > index)
+        QTest::keyClick(combo, Qt::Key_Up);
+}
+
+} // namespace
+
+TEST(BridgeMorphDlg, AcceptingAtOnceGivesTheDefaultsAndTheTitleNamesTheNode) {
+    bridgetest::app();
+    SgNode body(QStringLiteral("Body"));
+    SgBridgeMorphDlg dlg(body.getLabel(), nullptr, &body);
+    EXPECT_EQ(dlg.windowTitle(), QStringLiteral("Action for Body"));
+    EXPECT_EQ(dlg.objectName(), QStringLiteral("Create Morph"));
+    ASSERT_TRUE(actionCombo(dlg) && groupCombo(dlg) && nameEdit(dlg) && overrideBox(dlg));
+    EXPECT_FALSE(actionCombo(dlg)->isEditable());
+    EXPECT_TRUE(groupCombo(dlg)->isEditable());
+    QStringList actions;
+    for (int i = 0; i < actionCombo(dlg)->count(); ++i)
+        actions << actionCombo(dlg)->itemText(i);
+    EXPECT_EQ(actions, (QStringList{"Create Morph", "Create Prop",
+                                    "Create Morph And Copy Materials", "Copy Materials"}));
+    // A node without property groups offers only the bridge's own group.
+    EXPECT_EQ(groupCombo(dlg)->count(), 1);
+    EXPECT_GE(dlg.width(), 300);
+    EXPECT_GE(dlg.height(), 100);
+    SgHelpMgr *help = sgApp->getHelpMgr();
+    EXPECT_TRUE(help->isRegistered(nameEdit(dlg)) && help->isRegistered(groupCombo(dlg)) &&
+                help->isRegistered(overrideBox(dlg)) && help->isRegistered(actionCombo(dlg)));
+
+    bridgetest::answerModal(clickOk);
+    ASSERT_EQ(dlg.exec(), QDialog::Accepted);
+    EXPECT_EQ(dlg.getActionText(), QStringLiteral("Create Morph"));
+    EXPECT_EQ(dlg.getMorphName(), QStringLiteral("My Morph"));
+    EXPECT_EQ(dlg.getGroupPath(), QStringLiteral("Morphs/FacetorBridge"));
+    EXPECT_FALSE(dlg.getOverride());
+}
+
+TEST(BridgeMorphDlg, OnlyMorphActionsEnableTheMorphSettings) {
+    bridgetest::app();
+    SgBridgeMorphDlg dlg(QStringLiteral("Hat"), nullptr, nullptr);
+    dlg.show();
+    const auto morphControlsEnabled = [&] {
+        return groupCombo(dlg)->isEnabled() + nameEdit(dlg)->isEnabled() +
+               overrideBox(dlg)->isEnabled();
+    };
+    EXPECT_EQ(morphControlsEnabled(), 3);
+    const int expected[] = {3, 0, 3, 0};
+    for (int index : {1, 2, 3, 0, 3, 2}) {
+        pickAction(dlg, index);
+        EXPECT_EQ(morphControlsEnabled(), expected[index]) << index;
+        EXPECT_EQ(dlg.getActionText(), actionCombo(dlg)->itemText(index));
+    }
+}
+
+TEST(BridgeMorphDlg, TypedValuesComeBackWithForwardSlashes) {
+    bridgetest::app();
+    SgNode body(QStringLiteral("Body"));
+    auto *smile = new SgFloatProperty(QStringLiteral("Smile"));
+    smile->setPath(QStringLiteral("Morphs/Face"));
+    ASSERT_EQ(body.addProperty(smile), 0);
+    SgBridgeMorphDlg dlg(body.getLabel(), nullptr, &body);
+    // The node's groups follow the bridge's own, which stays current.
+    EXPECT_EQ(groupCombo(dlg)->itemText(0), QStringLiteral("Morphs/FacetorBridge"));
+    EXPECT_EQ(groupCombo(dlg)->count(), 3);
+    EXPECT_EQ(groupCombo(dlg)->itemText(2), QStringLiteral("Morphs/Face"));
+    EXPECT_EQ(groupCombo(dlg)->currentIndex(), 0);
+
+    bridgetest::answerModal([&](QWidget *modal) {
+        pickAction(dlg, 2);
+        groupCombo(dlg)->lineEdit()->selectAll();
+        QTest::keyClicks(groupCombo(dlg)->lineEdit(), QStringLiteral("Morphs\\Mine\\Deep"));
+        nameEdit(dlg)->selectAll();
+        QTest::keyClicks(nameEdit(dlg), QStringLiteral("Grin"));
+        QTest::mouseClick(overrideBox(dlg), Qt::LeftButton);
+        clickOk(modal);
+    });
+    ASSERT_EQ(dlg.exec(), QDialog::Accepted);
+    EXPECT_EQ(dlg.getGroupPath(), QStringLiteral("Morphs/Mine/Deep"));
+    EXPECT_EQ(dlg.getMorphName(), QStringLiteral("Grin"));
+    EXPECT_TRUE(dlg.getOverride());
+    EXPECT_EQ(dlg.getActionText(), QStringLiteral("Create Morph And Copy Materials"));
+}
+
+TEST(BridgeMorphDlg, CancellingLeavesTheValuesUntaken) {
+    bridgetest::app();
+    SgBridgeMorphDlg dlg(QStringLiteral("Hat"), nullptr, nullptr);
+    bridgetest::answerModal([](QWidget *modal) {
+        QTest::mouseClick(modal->findChild<QDialogButtonBox *>()->button(QDialogButtonBox::Cancel),
+                          Qt::LeftButton);
+    });
+    EXPECT_EQ(dlg.exec(), QDialog::Rejected);
+    EXPECT_TRUE(dlg.getMorphName().isEmpty());
+    EXPECT_TRUE(dlg.getGroupPath().isEmpty());
+}

@@ -1,0 +1,396 @@
+// The bridge action on its own: collecting the selection, launching, the control messages and
+// the poll's counting, and placing returned geometry. The modeler is played by this test
+// through a second view of the control segment, or by a stand-in program that exits at once.
+
+#include "bridge/sgfacbridge.h"
+#include "bridgetestsupport.h"
+
+#include "exchange/shm/sgcontrolrecord.h"
+#include "exchange/shm/sgsharedmemory.h"
+#include "facetor/sgfacetorreturn.h"
+#include "sgcore/app/sgmessagesink.h"
+#include "sgcore/properties/sgcolorproperty.h"
+#include "sgcore/scene/sgbone.h"
+#include "sgcore/scene/sgskeleton.h"
+
+#include <QFile>
+#include <QMessageBox>
+#include <QTest>
+#include <QTimer>
+
+#include <cstring>
+
+#include <gtest/gtest.h>
+
+namespace {
+
+class TestBridge : public SgFacBridge {
+public:
+    using SgFacBridge::closing;
+    using SgFacBridge::collectNode;
+    using SgFacBridge::copyMaterials;
+    using SgFacBridge::createPropFromShape;
+    using SgFacBridge::executeAction;
+};
+
+// The modeler's view of the control record, from a second segment object.
+class Peer {
+public:
+    Peer() : m_control(kSgControlSegmentKey) { m_control.attach(SgSharedMemory::kReadWrite); }
+    SgControlRecord record() const {
+        SgControlRecord copy{};
+        if (m_control.data())
+            std::memcpy(&copy, m_control.data(), sizeof copy);
+        return copy;
+    }
+    SgControlRecord *live() { return reinterpret_cast<SgControlRecord *>(m_control.data()); }
+    void post(int code) {
+        live()->toHostCode = uint8_t(code);
+        live()->toHostParameter = 0;
+        live()->toHostFlag = 0;
+    }
+    // Takes the host's message: its code, or -1 when none waits.
+    int take() {
+        if (live()->toModelerFlag != 0)
+            return -1;
+        live()->toModelerFlag = 1;
+        return live()->toModelerCode;
+    }
+
+private:
+    SgSharedMemory m_control;
+};
+
+// A stand-in modeler program that exits at once, in a folder of its own.
+class StandInModeler {
+public:
+    StandInModeler() {
+        QFile program(m_dir.filePath(QStringLiteral("Facetor")));
+        program.open(QIODevice::WriteOnly);
+        program.write("#!/bin/sh\nexit 0\n");
+        program.close();
+        program.setPermissions(QFile::ReadOwner | QFile::WriteOwner | QFile::ExeOwner);
+        qputenv("FACETOR_INSTALL_PATH", m_dir.path().toUtf8());
+    }
+    ~StandInModeler() { qunsetenv("FACETOR_INSTALL_PATH"); }
+
+private:
+    QTemporaryDir m_dir;
+};
+
+class BridgeAction : public ::testing::Test {
+protected:
+    void SetUp() override {
+        bridgetest::app();
+        scene()->clear();
+        sgApp->getMessageSink()->clear();
+    }
+    void TearDown() override { scene()->clear(); }
+    static SgScene *scene() { return sgApp->getScene(); }
+
+    static QStringList labels(const SgTArray<SgNode *> &list) {
+        QStringList out;
+        for (SgNode *node : list)
+            out << node->getLabel();
+        return out;
+    }
+
+    // An active bridge linked through the stand-in modeler.
+    static std::unique_ptr<TestBridge> linkedBridge() {
+        StandInModeler modeler;
+        auto bridge = std::make_unique<TestBridge>();
+        scene()->selectNode(scene()->findNodeByLabel(QStringLiteral("Cup")));
+        bridge->executeAction();
+        return bridge;
+    }
+};
+
+} // namespace
+
+TEST_F(BridgeAction, CollectingSendsEachFigureOnceWithFollowersAndDescendants) {
+    auto *body = new SgSkeleton(QStringLiteral("Body"));
+    auto *hip = new SgBone(QStringLiteral("hip"));
+    auto *chest = new SgBone(QStringLiteral("chest"));
+    body->addBone(hip);
+    body->addBone(chest, hip);
+    bridgetest::makeProp(QStringLiteral("Hat"))->setParent(chest);
+    auto *shirt = new SgSkeleton(QStringLiteral("Shirt"));
+    auto *sleeve = new SgBone(QStringLiteral("sleeve"));
+    shirt->addBone(sleeve);
+    shirt->setFollowTarget(body);
+    bridgetest::makeProp(QStringLiteral("Ring"))->setParent(sleeve);
+    auto *empty = new SgNode(QStringLiteral("Empty"));
+    bridgetest::makeProp(QStringLiteral("Spoon"))->setParent(empty);
+    for (SgNode *node : {static_cast<SgNode *>(body), static_cast<SgNode *>(shirt),
+                         bridgetest::makeProp(QStringLiteral("Cup")), empty})
+        scene()->addNode(node);
+
+    TestBridge bridge;
+    // A bone and its figure selected together, a node without an object (whose child is not
+    // visited) and a plain prop.
+    for (const char *label : {"chest", "Body", "Empty", "Cup", "hip"})
+        scene()->selectNode(scene()->findNodeByLabel(QString::fromLatin1(label)), true);
+    StandInModeler modeler;
+    bridge.executeAction();
+    EXPECT_EQ(labels(bridge.sendList()), (QStringList{"Body", "Shirt", "Ring", "Hat", "Cup"}));
+
+    TestBridge single;
+    single.collectNode(nullptr);
+    single.collectNode(sleeve);
+    single.collectNode(empty);
+    EXPECT_EQ(labels(single.sendList()), (QStringList{"Shirt", "Ring"}));
+}
+
+TEST_F(BridgeAction, NothingSelectedAsksBeforeLaunching) {
+    StandInModeler modeler;
+    {
+        TestBridge bridge;
+        QString asked;
+        bridgetest::answerModal([&](QWidget *box) {
+            asked = box->windowTitle() + "|" + static_cast<QMessageBox *>(box)->text();
+            QTest::keyClick(box, Qt::Key_Escape);
+        });
+        bridge.executeAction();
+        EXPECT_EQ(asked, QStringLiteral("Launch Facetor|You have nothing selected to send to "
+                                        "Facetor.\nDo you still wish to open Facetor?"));
+        EXPECT_FALSE(bridge.isActive());
+        EXPECT_EQ(bridge.modelerProcessId(), 0);
+    }
+    TestBridge bridge;
+    bridgetest::answerModal([](QWidget *box) { QTest::keyClick(box, Qt::Key_Return); });
+    bridge.executeAction();
+    EXPECT_TRUE(bridge.isActive());
+    EXPECT_TRUE(bridge.pollTimer()->isActive());
+    EXPECT_EQ(bridge.pollTimer()->interval(), 50);
+    EXPECT_NE(bridge.modelerProcessId(), 0);
+    EXPECT_EQ(bridge.sendList().count(), 0);
+    // The control record was written fresh: both slots free, nothing else.
+    const SgControlRecord record = Peer().record();
+    EXPECT_EQ(record.toModelerFlag, 1);
+    EXPECT_EQ(record.toHostFlag, 1);
+    EXPECT_EQ(record.toModelerCode, 0);
+    EXPECT_EQ(record.toHostParameter, 0);
+}
+
+TEST_F(BridgeAction, TriggeringWhileActiveAppendsWithoutALaunch) {
+    scene()->addNode(bridgetest::makeProp(QStringLiteral("Cup")));
+    scene()->addNode(bridgetest::makeProp(QStringLiteral("Plate")));
+    auto bridge = linkedBridge();
+    ASSERT_TRUE(bridge->isActive());
+    const qint64 pid = bridge->modelerProcessId();
+    scene()->selectNode(scene()->findNodeByLabel(QStringLiteral("Plate")));
+    bridge->executeAction(); // no question, no launch: nothing may stay modal
+    EXPECT_EQ(QApplication::activeModalWidget(), nullptr);
+    EXPECT_EQ(bridge->modelerProcessId(), pid);
+    EXPECT_EQ(labels(bridge->sendList()), (QStringList{"Cup", "Plate"}));
+}
+
+TEST_F(BridgeAction, AMissingModelerIsLoggedAndTheBridgeStaysIdle) {
+    scene()->addNode(bridgetest::makeProp(QStringLiteral("Cup")));
+    qputenv("FACETOR_INSTALL_PATH", "/nonexistent/facetor");
+    TestBridge bridge;
+    scene()->selectNode(scene()->findNodeByLabel(QStringLiteral("Cup")));
+    bridge.executeAction();
+    qunsetenv("FACETOR_INSTALL_PATH");
+    EXPECT_TRUE(
+        sgApp->getMessageSink()->logLines().contains(QStringLiteral("Failed to launch Facetor.")));
+    EXPECT_FALSE(bridge.isActive());
+    EXPECT_FALSE(bridge.pollTimer()->isActive());
+    EXPECT_EQ(labels(bridge.sendList()), QStringList{"Cup"});
+}
+
+TEST_F(BridgeAction, MessagesWaitForTheirSlot) {
+    scene()->addNode(bridgetest::makeProp(QStringLiteral("Cup")));
+    TestBridge idle;
+    int value = 42;
+    EXPECT_FALSE(idle.postMessage(1, 0)); // not attached
+    EXPECT_EQ(idle.readMessage(value), 0);
+    EXPECT_EQ(value, 42);
+
+    auto bridge = linkedBridge();
+    Peer peer;
+    EXPECT_EQ(bridge->readMessage(value), 5); // nothing waits
+    EXPECT_TRUE(bridge->postMessage(4, 7));
+    const SgControlRecord before = peer.record();
+    EXPECT_EQ(before.toModelerFlag, 0);
+    EXPECT_EQ(before.toModelerCode, 4);
+    EXPECT_EQ(before.toModelerParameter, 7);
+    EXPECT_FALSE(bridge->postMessage(1, 9));
+    EXPECT_EQ(std::memcmp(&before, peer.live(), sizeof before), 0);
+
+    peer.live()->toHostParameter = -3;
+    peer.live()->toHostCode = 200;
+    peer.live()->toHostFlag = 0;
+    EXPECT_EQ(bridge->readMessage(value), 200);
+    EXPECT_EQ(value, -3);
+    EXPECT_EQ(peer.record().toHostFlag, 1);
+
+    // Closing says goodbye once the slot is free, and gives up quietly while it is taken.
+    bridge->closing();
+    EXPECT_EQ(peer.take(), 4);
+    bridge->closing();
+    EXPECT_EQ(peer.take(), 2);
+}
+
+TEST_F(BridgeAction, ThePollCountsIdlePollsAndRetriesBeforeNotices) {
+    scene()->addNode(bridgetest::makeProp(QStringLiteral("Cup")));
+    auto bridge = linkedBridge();
+    bridge->pollTimer()->stop(); // the test steps the poll itself
+    Peer peer;
+    for (int i = 1; i <= 10; ++i) {
+        bridge->checkSharedMap();
+        EXPECT_EQ(bridge->idlePolls(), i);
+    }
+    EXPECT_EQ(peer.take(), -1);
+    bridge->checkSharedMap(); // the eleventh poll sends the idle notice
+    EXPECT_EQ(bridge->idlePolls(), 1);
+    EXPECT_EQ(peer.record().toModelerCode, 0);
+    EXPECT_EQ(peer.record().toModelerFlag, 0);
+
+    // Geometry announced without a readable segment is still acknowledged; with the slot
+    // taken the acknowledgement waits in the retry queue.
+    peer.post(1);
+    bridge->checkSharedMap();
+    EXPECT_EQ(bridge->idlePolls(), 0);
+    ASSERT_EQ(bridge->retryQueue().size(), 1);
+    EXPECT_EQ(bridge->retryQueue().head(), std::make_pair(3, 0));
+    for (int i = 0; i < 12; ++i)
+        bridge->checkSharedMap(); // retries leave the count alone, and no notice goes out
+    EXPECT_EQ(bridge->idlePolls(), 0);
+    EXPECT_EQ(bridge->retryQueue().size(), 1);
+    EXPECT_EQ(peer.take(), 0);
+    bridge->checkSharedMap();
+    EXPECT_TRUE(bridge->retryQueue().isEmpty());
+    EXPECT_EQ(peer.take(), 3);
+    EXPECT_EQ(bridge->idlePolls(), 0);
+
+    // The modeler asks: the first node goes out in a data segment of its own.
+    peer.post(0);
+    bridge->checkSharedMap();
+    EXPECT_TRUE(bridge->isExchangeBusy());
+    EXPECT_EQ(bridge->sendList().count(), 0);
+    EXPECT_EQ(peer.take(), 1);
+    EXPECT_TRUE(SgSharedMemory(kSgDataSegmentKey).exists());
+    peer.post(3);
+    bridge->checkSharedMap();
+    EXPECT_FALSE(bridge->isExchangeBusy());
+    EXPECT_FALSE(SgSharedMemory(kSgDataSegmentKey).exists());
+
+    // The modeler quits: the poll stops and the link is dropped.
+    peer.post(2);
+    bridge->pollTimer()->start();
+    bridge->checkSharedMap();
+    EXPECT_FALSE(bridge->isActive());
+    EXPECT_FALSE(bridge->pollTimer()->isActive());
+}
+
+TEST_F(BridgeAction, TheHostSwitchLinksWithoutRewritingTheRecord) {
+    sgApp->setCommandArguments({QStringLiteral("-x"), QStringLiteral("-facbridge")});
+    TestBridge bridge;
+    sgApp->setCommandArguments({});
+    EXPECT_TRUE(bridge.isActive());
+    EXPECT_TRUE(bridge.pollTimer()->isActive());
+    EXPECT_EQ(bridge.modelerProcessId(), 0);
+    const SgControlRecord record = Peer().record();
+    EXPECT_EQ(record.toModelerFlag, 0);
+    EXPECT_EQ(record.toHostFlag, 0);
+    // The host's start-up restarts the poll of a linked bridge.
+    bridge.pollTimer()->stop();
+    sgApp->emitStarting();
+    EXPECT_TRUE(bridge.pollTimer()->isActive());
+}
+
+TEST_F(BridgeAction, ReturnedGeometryWithoutANamesakeBecomesAProp) {
+    scene()->addNode(bridgetest::makeProp(QStringLiteral("Cup")));
+    auto bridge = linkedBridge();
+    bridge->pollTimer()->stop();
+    Peer peer;
+
+    SgExchangeNode returned;
+    returned.name = QStringLiteral("Gizmo");
+    returned.vertices = {0, 0, 0, 2, 0, 0, 0, 4, 0};
+    returned.materials.append(SgExchangeNode::Material{});
+    returned.facets.push_back({'T', 0, 0, 3});
+    returned.corners = {{0, -1, -1}, {1, -1, -1}, {2, -1, -1}};
+    const QByteArray record = SgFacetorReturn::encode(returned);
+    SgSharedMemory data(kSgDataSegmentKey);
+    ASSERT_TRUE(data.create(int32_t(record.size())));
+    ASSERT_TRUE(data.attach(SgSharedMemory::kReadWrite));
+    std::memcpy(data.data(), record.constData(), size_t(record.size()));
+    peer.post(1);
+    bridge->checkSharedMap();
+    EXPECT_EQ(peer.take(), 3);
+    data.detach();
+    data.remove(SgSharedMemory::kRemoveUnlocked);
+    EXPECT_FALSE(SgSharedMemory(kSgDataSegmentKey).exists());
+
+    SgNode *prop = scene()->findNodeByLabel(QStringLiteral("Gizmo"));
+    ASSERT_NE(prop, nullptr);
+    // Host units are ten times the modeler's; the origin is the centre of the bounding box.
+    EXPECT_FLOAT_EQ(prop->getOrigin().x, 10.0f);
+    EXPECT_FLOAT_EQ(prop->getOrigin().y, 20.0f);
+    EXPECT_EQ(prop->getObject()->getCurrentShape()->getGeometry()->getVertexCount(), 3);
+}
+
+TEST_F(BridgeAction, PropLabelsAreMadeUnique) {
+    scene()->addNode(bridgetest::makeProp(QStringLiteral("Body")));
+    scene()->addNode(bridgetest::makeProp(QStringLiteral("Body (1)")));
+    TestBridge bridge;
+    bridge.createPropFromShape(bridgetest::makeShape(
+        QStringLiteral("Body"), bridgetest::makeMesh({{-4, 0, 0}, {4, 2, 0}, {0, 6, 8}})));
+    bridge.createPropFromShape(bridgetest::makeShape(
+        QStringLiteral("Body"), bridgetest::makeMesh({{0, 0, 0}, {1, 0, 0}, {0, 1, 0}})));
+    bridge.createPropFromShape(bridgetest::makeShape(
+        QStringLiteral("Lamp"), bridgetest::makeMesh({{0, 0, 0}, {1, 0, 0}, {0, 1, 0}})));
+    ASSERT_EQ(scene()->getNodeCount(), 5);
+    SgNode *second = scene()->getNode(2);
+    EXPECT_EQ(second->getLabel(), QStringLiteral("Body (2)"));
+    EXPECT_EQ(second->getName(), QStringLiteral("Body (2)"));
+    EXPECT_EQ(second->getObject()->getName(), QStringLiteral("Body"));
+    EXPECT_FLOAT_EQ(second->getOrigin().x, 0.0f);
+    EXPECT_FLOAT_EQ(second->getOrigin().y, 3.0f);
+    EXPECT_FLOAT_EQ(second->getOrigin().z, 4.0f);
+    EXPECT_EQ(scene()->getNode(3)->getLabel(), QStringLiteral("Body (3)"));
+    EXPECT_EQ(scene()->getNode(4)->getLabel(), QStringLiteral("Lamp"));
+}
+
+TEST_F(BridgeAction, CopyingMaterialsTouchesOnlyNamesakesDiffuse) {
+    auto *figure = new SgSkeleton(QStringLiteral("Body"));
+    auto *arm = new SgBone(QStringLiteral("arm"));
+    auto *leg = new SgBone(QStringLiteral("leg"));
+    figure->addBone(arm);
+    figure->addBone(leg);
+    for (SgBone *bone : {arm, leg}) {
+        auto *object = new SgObject;
+        auto *shape = bridgetest::makeShape(bone->getName(), bridgetest::makeMesh({{0, 0, 0}}));
+        shape->addMaterial(new SgDefaultMaterial(QStringLiteral("Eyes")));
+        object->addShape(shape);
+        bone->setObject(object);
+    }
+    scene()->addNode(figure);
+
+    auto *returned =
+        bridgetest::makeShape(QStringLiteral("Body"), bridgetest::makeMesh({{0, 0, 0}}));
+    auto *skin = static_cast<SgDefaultMaterial *>(returned->getMaterial(0));
+    skin->setDiffuseColor(QColor(255, 128, 0));
+    skin->setSpecularColor(QColor(1, 2, 3));
+    SgTexture texture(QStringLiteral("skin.png"));
+    skin->setColorMap(&texture);
+    returned->addMaterial(new SgDefaultMaterial(QStringLiteral("Nails")));
+
+    TestBridge bridge;
+    bridge.copyMaterials(returned, figure);
+    bridge.copyMaterials(nullptr, figure);
+    bridge.copyMaterials(returned, nullptr);
+    for (SgBone *bone : {arm, leg}) {
+        SgShape *shape = bone->getObject()->getCurrentShape();
+        auto *target = static_cast<SgDefaultMaterial *>(shape->findMaterial("Skin"));
+        EXPECT_EQ(target->getDiffuseColor(), QColor(255, 128, 0));
+        EXPECT_EQ(target->getColorMap(), &texture);
+        EXPECT_NE(target->getSpecularColor(), QColor(1, 2, 3));
+        auto *eyes = static_cast<SgDefaultMaterial *>(shape->findMaterial("Eyes"));
+        EXPECT_EQ(eyes->getDiffuseColor(), QColor(255, 255, 255));
+        EXPECT_EQ(shape->findMaterial("Nails"), nullptr);
+    }
+    delete returned;
+}

@@ -1,0 +1,228 @@
+// The bridge and the reference modeler in two processes: nodes go out in send-list order,
+// geometry comes back, and both sides leave nothing behind in the shared-memory folder.
+
+#include "bridge/sgfacbridge.h"
+#include "bridgetestsupport.h"
+
+#include "exchange/shm/sgcontrolrecord.h"
+#include "exchange/shm/sgsharedmemory.h"
+#include "facetor/sgfacetorworkspace.h"
+#include "sgcore/scene/sgbone.h"
+#include "sgcore/scene/sgskeleton.h"
+
+#include <QDir>
+#include <QFile>
+#include <QRegularExpression>
+
+#include <algorithm>
+#include <cerrno>
+#include <csignal>
+#include <tuple>
+#include <vector>
+
+#include <gtest/gtest.h>
+
+namespace {
+
+using Point = std::tuple<float, float, float>;
+
+class TestBridge : public SgFacBridge {
+public:
+    using SgFacBridge::executeAction;
+};
+
+// The modeler's settings for one run, through its environment (the bridge passes only -sgl).
+class ModelerRun {
+public:
+    explicit ModelerRun(const QByteArray &edit = QByteArray(), int expect = 0) {
+        qputenv("FACETOR_INSTALL_PATH", FACETOR_BIN_DIR);
+        qputenv("FACETOR_WORKSPACE", m_dir.filePath("workspace").toUtf8());
+        qputenv("FACETOR_LOG", logPath().toUtf8());
+        qputenv("FACETOR_EXPECT", QByteArray::number(expect));
+        qputenv("FACETOR_QUIT_WHEN_DONE", "1");
+        qputenv("FACETOR_EDIT", edit);
+    }
+    ~ModelerRun() {
+        for (const char *name : {"FACETOR_INSTALL_PATH", "FACETOR_WORKSPACE", "FACETOR_LOG",
+                                 "FACETOR_EXPECT", "FACETOR_QUIT_WHEN_DONE", "FACETOR_EDIT"})
+            qunsetenv(name);
+    }
+    QString logPath() const { return m_dir.filePath("facetor.log"); }
+    QString workspace() const { return m_dir.filePath("workspace"); }
+    QString log() const {
+        QFile file(logPath());
+        file.open(QIODevice::ReadOnly);
+        return QString::fromUtf8(file.readAll());
+    }
+    // The node names in the order the modeler received them.
+    QStringList received() const {
+        QStringList names;
+        static const QRegularExpression line(QStringLiteral(" received (.*) vertices="));
+        auto it = line.globalMatch(log());
+        while (it.hasNext())
+            names << it.next().captured(1);
+        return names;
+    }
+
+private:
+    QTemporaryDir m_dir;
+};
+
+// Whether the process has ended (a zombie that nobody has reaped yet counts as ended).
+bool processGone(qint64 pid) {
+    if (pid <= 0 || (::kill(pid_t(pid), 0) != 0 && errno == ESRCH))
+        return true;
+    QFile stat(QStringLiteral("/proc/%1/stat").arg(pid));
+    if (!stat.open(QIODevice::ReadOnly))
+        return true;
+    const QByteArray line = stat.readAll();
+    const qsizetype close = line.lastIndexOf(')');
+    return close > 0 && line.size() > close + 2 && line[close + 2] == 'Z';
+}
+
+// Files in the shared-memory folder that belong to one of the bridge's two keys.
+QStringList leftovers() {
+    QStringList found;
+    for (const char *key : {kSgControlSegmentKey, kSgDataSegmentKey}) {
+        const QString prefix = QString::fromStdString(SgSharedMemory(key).dataName());
+        found += QDir(QStringLiteral("/dev/shm")).entryList({prefix + "*"}, QDir::Files);
+    }
+    return found;
+}
+
+std::vector<Point> scaledPoints(const SgExchangeNode &node) {
+    std::vector<Point> points;
+    for (size_t i = 0; i + 2 < node.vertices.size(); i += 3)
+        points.emplace_back(node.vertices[i] * 10, node.vertices[i + 1] * 10,
+                            node.vertices[i + 2] * 10);
+    return points;
+}
+
+std::vector<Point> scenePoints(const SgNode *node) {
+    std::vector<Point> points;
+    const SgVertexMesh *mesh = node->getObject()->getCurrentShape()->getGeometry();
+    for (int i = 0; i < mesh->getVertexCount(); ++i)
+        points.emplace_back(mesh->getVertex(i).x, mesh->getVertex(i).y, mesh->getVertex(i).z);
+    return points;
+}
+
+void expectSamePoints(std::vector<Point> actual, std::vector<Point> expected, bool anyOrder) {
+    if (anyOrder) {
+        std::sort(actual.begin(), actual.end());
+        std::sort(expected.begin(), expected.end());
+    }
+    ASSERT_EQ(actual.size(), expected.size());
+    for (size_t i = 0; i < actual.size(); ++i) {
+        EXPECT_NEAR(std::get<0>(actual[i]), std::get<0>(expected[i]), 1e-4f) << i;
+        EXPECT_NEAR(std::get<1>(actual[i]), std::get<1>(expected[i]), 1e-4f) << i;
+        EXPECT_NEAR(std::get<2>(actual[i]), std::get<2>(expected[i]), 1e-4f) << i;
+    }
+}
+
+// A figure whose two bones show separate triangles.
+SgSkeleton *makeFigure(const QString &name) {
+    auto *figure = new SgSkeleton(name);
+    auto *hip = new SgBone(QStringLiteral("hip"));
+    auto *thigh = new SgBone(QStringLiteral("thigh"));
+    figure->addBone(hip);
+    figure->addBone(thigh, hip);
+    float offset = 0;
+    for (SgBone *bone : {hip, thigh}) {
+        auto *object = new SgObject(bone->getName());
+        object->addShape(bridgetest::makeShape(
+            bone->getName(),
+            bridgetest::makeMesh(
+                {{offset, 100, 3.25f}, {offset + 7, 100, 0}, {offset, 112.5f, 0}})));
+        bone->setObject(object);
+        offset += 20;
+    }
+    return figure;
+}
+
+class BridgeRoundTrip : public ::testing::Test {
+protected:
+    void SetUp() override {
+        bridgetest::app();
+        sgApp->getScene()->clear();
+        ASSERT_TRUE(leftovers().isEmpty()) << leftovers().join(' ').toStdString();
+    }
+    void TearDown() override { sgApp->getScene()->clear(); }
+};
+
+} // namespace
+
+TEST_F(BridgeRoundTrip, SelectedNodesArriveInOrderAndBothSidesCleanUp) {
+    SgScene *scene = sgApp->getScene();
+    scene->addNode(bridgetest::makeProp(QStringLiteral("Cup"), {1.5f, -2, 300}));
+    scene->addNode(makeFigure(QStringLiteral("Body")));
+    scene->addNode(bridgetest::makeProp(QStringLiteral("Plate"), {-40, 0.125f, 9}));
+    for (const char *label : {"thigh", "Plate", "Cup"})
+        scene->selectNode(scene->findNodeByLabel(QString::fromLatin1(label)), true);
+
+    ModelerRun run(QByteArray(), 3);
+    qint64 pid = 0;
+    {
+        TestBridge bridge;
+        bridge.executeAction();
+        ASSERT_TRUE(bridge.isActive())
+            << sgApp->getMessageSink()->logLines().join('\n').toStdString();
+        pid = bridge.modelerProcessId();
+        // The modeler's goodbye stops the poll.
+        ASSERT_TRUE(bridgetest::waitUntil([&] { return !bridge.isActive(); }, 20000))
+            << run.log().toStdString();
+        EXPECT_FALSE(bridge.pollTimer()->isActive());
+        EXPECT_EQ(bridge.sendList().count(), 0);
+        EXPECT_EQ(run.received(), (QStringList{"Body", "Plate", "Cup"})) << run.log().toStdString();
+    }
+    ASSERT_TRUE(bridgetest::waitUntil([&] { return processGone(pid); }, 10000));
+    EXPECT_TRUE(bridgetest::waitUntil([] { return leftovers().isEmpty(); }, 2000))
+        << leftovers().join(' ').toStdString();
+
+    // Each node's workspace copy holds the scene's geometry at a tenth of its size.
+    QString error;
+    for (const char *label : {"Cup", "Plate"}) {
+        SgExchangeNode copy;
+        ASSERT_TRUE(SgFacetorWorkspace::readObj(
+            QDir(run.workspace()).filePath(QString::fromLatin1(label) + ".obj"), QString(), copy,
+            error))
+            << error.toStdString();
+        EXPECT_EQ(copy.name, QString::fromLatin1(label));
+        expectSamePoints(scaledPoints(copy), scenePoints(scene->findNodeByLabel(label)), false);
+        EXPECT_EQ(copy.facets.size(), 1u);
+    }
+    SgExchangeNode figure;
+    ASSERT_TRUE(SgFacetorWorkspace::readObj(QDir(run.workspace()).filePath("Body.obj"), QString(),
+                                            figure, error));
+    std::vector<Point> bones = scenePoints(scene->findNodeByLabel("hip"));
+    const std::vector<Point> thigh = scenePoints(scene->findNodeByLabel("thigh"));
+    bones.insert(bones.end(), thigh.begin(), thigh.end());
+    expectSamePoints(scaledPoints(figure), bones, true);
+}
+
+TEST_F(BridgeRoundTrip, ReturnedGeometryWithAnUnknownNameBecomesAProp) {
+    SgScene *scene = sgApp->getScene();
+    scene->addNode(bridgetest::makeProp(QStringLiteral("Cup"), {10, 20, 30}));
+    scene->selectNode(scene->findNodeByLabel(QStringLiteral("Cup")));
+
+    ModelerRun run("name=Gizmo;move=1,0,0", 1);
+    qint64 pid = 0;
+    {
+        TestBridge bridge;
+        bridge.executeAction();
+        pid = bridge.modelerProcessId();
+        ASSERT_TRUE(bridgetest::waitUntil([&] { return !bridge.isActive(); }, 20000))
+            << run.log().toStdString();
+    }
+    EXPECT_TRUE(run.log().contains("host read the returned geometry")) << run.log().toStdString();
+    SgNode *gizmo = scene->findNodeByLabel(QStringLiteral("Gizmo"));
+    ASSERT_NE(gizmo, nullptr);
+    std::vector<Point> expected = scenePoints(scene->findNodeByLabel("Cup"));
+    for (Point &p : expected)
+        std::get<0>(p) += 10; // one modeler unit is ten host units
+    expectSamePoints(scenePoints(gizmo), expected, false);
+    EXPECT_NEAR(gizmo->getOrigin().x, 25.0f, 1e-4f);
+    EXPECT_NEAR(gizmo->getOrigin().y, 25.0f, 1e-4f);
+    ASSERT_TRUE(bridgetest::waitUntil([&] { return processGone(pid); }, 10000));
+    EXPECT_TRUE(bridgetest::waitUntil([] { return leftovers().isEmpty(); }, 2000))
+        << leftovers().join(' ').toStdString();
+}

@@ -1,0 +1,197 @@
+// POSIX back-end: robustness against killed peers, privacy of the objects, and many processes
+// creating, attaching and removing one key at once.
+#include "exchange/shm/sgsharedmemory.h"
+#include "exchange/shm/sgshmplatform.h"
+#include "shmpeerprocess.h"
+#include "shmtestsupport.h"
+
+#include <gtest/gtest.h>
+
+#include <chrono>
+#include <cstdio>
+#include <cstring>
+#include <dirent.h>
+#include <fcntl.h>
+#include <memory>
+#include <sys/mman.h>
+#include <sys/stat.h>
+#include <thread>
+#include <unistd.h>
+#include <vector>
+
+using Clock = std::chrono::steady_clock;
+
+namespace {
+
+// The entries of /dev/shm that belong to the segment of `key` (data, "-ref" and "-lock").
+std::vector<std::string> objectsOf(const std::string &key) {
+    const std::string prefix = SgSharedMemory(key).dataName() + "-";
+    std::vector<std::string> found;
+    if (DIR *dir = opendir("/dev/shm")) {
+        while (const dirent *entry = readdir(dir)) {
+            if (std::strncmp(entry->d_name, prefix.c_str(), prefix.size()) == 0)
+                found.emplace_back(entry->d_name);
+        }
+        closedir(dir);
+    }
+    return found;
+}
+
+std::uint32_t readWord(const SgSharedMemory &memory, int offset) {
+    std::uint32_t value = 0;
+    std::memcpy(&value, memory.data() + offset, sizeof value);
+    return value;
+}
+
+} // namespace
+
+TEST(SgSharedMemoryPosix, KilledLockHolderReleasesTheLock) {
+    const std::string key = uniqueKey("killlock");
+    ShmPeerProcess peer;
+    ASSERT_TRUE(peer.ok("open " + key));
+    ASSERT_TRUE(peer.ok("create 16"));
+    ASSERT_TRUE(peer.ok("attach 1"));
+    SgSharedMemory memory(key);
+    ASSERT_TRUE(memory.attach(SgSharedMemory::kReadWrite));
+    ASSERT_TRUE(peer.ok("lock"));
+
+    const auto start = Clock::now();
+    EXPECT_FALSE(memory.tryLock(25));
+    EXPECT_LT(msSince(start), 250);
+
+    peer.kill();
+    const auto afterKill = Clock::now();
+    ASSERT_TRUE(memory.lock());
+    EXPECT_LT(msSince(afterKill), 1000);
+    memory.unlock();
+    EXPECT_TRUE(memory.remove(SgSharedMemory::kRemoveLocked));
+    EXPECT_TRUE(objectsOf(key).empty());
+}
+
+TEST(SgSharedMemoryPosix, KilledHoldersLeaveNothingOnceTheSurvivorRemoves) {
+    // A peer killed while attached: the survivor's remove takes every name with it.
+    const std::string key = uniqueKey("killattached");
+    {
+        ShmPeerProcess peer;
+        ASSERT_TRUE(peer.ok("open " + key));
+        ASSERT_TRUE(peer.ok("create 16"));
+        ASSERT_TRUE(peer.ok("attach 1"));
+        SgSharedMemory memory(key);
+        ASSERT_TRUE(memory.attach(SgSharedMemory::kReadWrite));
+        EXPECT_EQ(memory.attachCount(), 2);
+        peer.kill();
+        EXPECT_TRUE(memory.exists());
+        EXPECT_TRUE(memory.detach());
+        EXPECT_TRUE(memory.remove(SgSharedMemory::kRemoveLocked));
+        EXPECT_TRUE(objectsOf(key).empty());
+        EXPECT_FALSE(memory.exists());
+    }
+
+    // The only holder killed: its names stay as leftovers that the next open cleans up, and
+    // a fresh create starts from a fresh reference record.
+    const std::string lone = uniqueKey("killlone");
+    ShmPeerProcess peer;
+    ASSERT_TRUE(peer.ok("open " + lone));
+    ASSERT_TRUE(peer.ok("create 16"));
+    ASSERT_TRUE(peer.ok("attach 1"));
+    ASSERT_TRUE(peer.ok("lock"));
+    peer.kill();
+    EXPECT_FALSE(objectsOf(lone).empty());
+    SgSharedMemory memory(lone);
+    EXPECT_FALSE(memory.exists());
+    ASSERT_TRUE(memory.create(16));
+    ASSERT_TRUE(memory.attach(SgSharedMemory::kReadWrite));
+    EXPECT_EQ(memory.attachCount(), 1);
+    EXPECT_TRUE(memory.tryLock(0));
+    memory.unlock();
+    EXPECT_TRUE(memory.remove(SgSharedMemory::kRemoveLocked));
+    EXPECT_TRUE(objectsOf(lone).empty());
+}
+
+TEST(SgSharedMemoryPosix, ObjectsArePrivateToTheUser) {
+    const std::string key = uniqueKey("mode");
+    SgSharedMemory memory(key);
+    EXPECT_FALSE(memory.lock()); // a lock on a missing segment creates nothing
+    EXPECT_TRUE(objectsOf(key).empty());
+    ASSERT_TRUE(memory.create(16));
+    ASSERT_TRUE(memory.lock());
+    const std::vector<std::string> objects = objectsOf(key);
+    EXPECT_EQ(objects.size(), 3u);
+    for (const std::string &name : objects) {
+        struct stat info = {};
+        ASSERT_EQ(stat(("/dev/shm/" + name).c_str(), &info), 0) << name;
+        EXPECT_EQ(info.st_mode & 0777, 0600u) << name;
+        EXPECT_EQ(info.st_uid, geteuid()) << name;
+        EXPECT_NE(name.find("-u" + std::to_string(geteuid())), std::string::npos) << name;
+    }
+    memory.unlock();
+    EXPECT_TRUE(memory.remove(SgSharedMemory::kRemoveLocked));
+
+    // An object that others could read is refused, and left as it is.
+    const std::string exposed = uniqueKey("exposed");
+    const std::string name = SgShmPlatform::nativeName(SgSharedMemory(exposed).dataName());
+    const int fd = shm_open(name.c_str(), O_RDWR | O_CREAT | O_EXCL, 0600);
+    ASSERT_GE(fd, 0);
+    ASSERT_EQ(fchmod(fd, 0644), 0);
+    SgSharedMemory intruded(exposed);
+    EXPECT_FALSE(intruded.exists());
+    EXPECT_FALSE(intruded.create(16));
+    EXPECT_EQ(intruded.status(), SgSharedMemory::StatusFailed);
+    struct stat info = {};
+    EXPECT_EQ(fstat(fd, &info), 0);
+    EXPECT_EQ(info.st_size, 0);
+    close(fd);
+    shm_unlink(name.c_str());
+    EXPECT_TRUE(objectsOf(exposed).empty());
+}
+
+TEST(SgSharedMemoryPosix, ManyProcessesChurningOneKeyLoseNoUpdate) {
+    const std::string anchored = uniqueKey("anchored");
+    const std::string loose = uniqueKey("loose");
+    SgSharedMemory memory(anchored);
+    ASSERT_TRUE(memory.create(64));
+    ASSERT_TRUE(memory.attach(SgSharedMemory::kReadWrite));
+
+    constexpr int kPeers = 3;
+    std::vector<std::unique_ptr<ShmPeerProcess>> peers;
+    for (int i = 0; i < kPeers; ++i) {
+        peers.push_back(std::make_unique<ShmPeerProcess>());
+        ASSERT_TRUE(peers.back()->isRunning());
+    }
+    std::vector<std::vector<long long>> results(kPeers);
+    std::vector<std::thread> runners;
+    for (int i = 0; i < kPeers; ++i) {
+        runners.emplace_back(
+            [&, i] { results[i] = peers[i]->call("churn " + anchored + " " + loose + " 2000"); });
+    }
+    long long ownIncrements = 0;
+    const auto start = Clock::now();
+    while (msSince(start) < 2000) {
+        ASSERT_TRUE(memory.lock());
+        std::uint32_t value = readWord(memory, 0) + 1;
+        std::memcpy(memory.data(), &value, sizeof value);
+        memory.unlock();
+        ++ownIncrements;
+        std::this_thread::sleep_for(std::chrono::microseconds(200));
+    }
+    for (std::thread &runner : runners)
+        runner.join();
+
+    long long total = ownIncrements;
+    for (const auto &result : results) {
+        ASSERT_EQ(result.size(), 5u);
+        EXPECT_GT(result[2], 0); // increments
+        EXPECT_EQ(result[3], 0); // failures on the anchored key
+        EXPECT_GT(result[4], 0); // cycles on the loose key
+        total += result[2];
+        std::printf("peer: %lld increments, %lld loose cycles\n", result[2], result[4]);
+    }
+    EXPECT_EQ(readWord(memory, 0), static_cast<std::uint32_t>(total));
+    EXPECT_EQ(memory.attachCount(), 1);
+    for (auto &peer : peers)
+        peer->quit();
+    EXPECT_TRUE(memory.detach());
+    EXPECT_TRUE(memory.remove(SgSharedMemory::kRemoveLocked));
+    EXPECT_TRUE(objectsOf(anchored).empty());
+    EXPECT_TRUE(objectsOf(loose).empty());
+}

@@ -1,0 +1,220 @@
+// Segment behaviour that holds on every back-end: one process against a real second one.
+#include "exchange/shm/sgcontrolrecord.h"
+#include "exchange/shm/sgsharedmemory.h"
+#include "shmpeerprocess.h"
+#include "shmtestsupport.h"
+
+#include <gtest/gtest.h>
+
+#include <chrono>
+#include <cstring>
+#include <memory>
+#include <thread>
+
+using Clock = std::chrono::steady_clock;
+
+namespace {
+
+std::uint32_t readWord(const SgSharedMemory &memory, int offset) {
+    std::uint32_t value = 0;
+    std::memcpy(&value, memory.data() + offset, sizeof value);
+    return value;
+}
+
+void writeWord(SgSharedMemory &memory, int offset, std::uint32_t value) {
+    std::memcpy(memory.data() + offset, &value, sizeof value);
+}
+
+} // namespace
+
+TEST(SgSharedMemory, DerivesNamesFromKeyBytes) {
+    SgSharedMemory abc("abc");
+    EXPECT_EQ(abc.dataName(), "sgsharedmemory-616263");
+    EXPECT_EQ(abc.lockName(), "sgsharedmemory-616263-lock");
+    EXPECT_EQ(abc.referenceName(), "sgsharedmemory-616263-ref");
+    EXPECT_EQ(abc.status(), SgSharedMemory::StatusFailed);
+
+    SgSharedMemory bytes(std::string("\xff\x01 \x80", 4));
+    EXPECT_EQ(bytes.dataName(), "sgsharedmemory-ff012080");
+
+    SgSharedMemory control(kSgControlSegmentKey);
+    EXPECT_EQ(control.dataName(),
+              "sgsharedmemory-46414345544f525f4252494447455f5354415449435f4d4150");
+}
+
+TEST(SgSharedMemory, RejectsBadSizeAndEmptyKeyLeavingNothingOpen) {
+    SgSharedMemory memory(uniqueKey("size"));
+    EXPECT_FALSE(memory.create(0));
+    EXPECT_EQ(memory.status(), SgSharedMemory::StatusBadSize);
+    EXPECT_FALSE(memory.create(-5));
+    EXPECT_EQ(memory.status(), SgSharedMemory::StatusBadSize);
+    EXPECT_FALSE(memory.exists());
+    EXPECT_FALSE(memory.lock());
+
+    SgSharedMemory empty("");
+    EXPECT_FALSE(empty.create(16));
+    EXPECT_EQ(empty.status(), SgSharedMemory::StatusEmptyKey);
+    EXPECT_FALSE(empty.exists());
+}
+
+TEST(SgSharedMemory, MissingSegmentFailsLockAttachAndDetach) {
+    SgSharedMemory memory(uniqueKey("missing"));
+    const auto start = Clock::now();
+    EXPECT_FALSE(memory.lock());
+    EXPECT_FALSE(memory.tryLock(25));
+    EXPECT_LT(msSince(start), 20);
+    EXPECT_EQ(memory.status(), SgSharedMemory::StatusFailed); // no lock-failure status here
+    EXPECT_EQ(memory.lockDepth(), 0);
+
+    EXPECT_FALSE(memory.attach(SgSharedMemory::kReadWrite));
+    EXPECT_EQ(memory.status(), SgSharedMemory::StatusLockFailed);
+    EXPECT_FALSE(memory.isAttached());
+    EXPECT_EQ(memory.data(), nullptr);
+
+    EXPECT_FALSE(memory.detach());
+    EXPECT_EQ(memory.status(), SgSharedMemory::StatusNotFound);
+    EXPECT_FALSE(memory.exists());
+}
+
+TEST(SgSharedMemory, TwoProcessesShareDataCountAndRefuseSecondCreate) {
+    const std::string key = uniqueKey("share");
+    SgSharedMemory memory(key);
+    ASSERT_TRUE(memory.create(64));
+    EXPECT_TRUE(memory.exists());
+    EXPECT_FALSE(memory.isAttached());
+    ASSERT_TRUE(memory.attach(SgSharedMemory::kReadWrite));
+    EXPECT_EQ(memory.size(), 64);
+    EXPECT_EQ(memory.attachCount(), 1);
+    writeWord(memory, 60, 0xC0FFEEu);
+
+    ShmPeerProcess peer;
+    ASSERT_TRUE(peer.isRunning());
+    ASSERT_TRUE(peer.ok("open " + key));
+    EXPECT_TRUE(peer.ok("exists"));
+    // A second create finds the segment and leaves it as it is.
+    EXPECT_EQ(peer.call("create 128"),
+              (std::vector<long long>{0, SgSharedMemory::StatusAlreadyExists}));
+    ASSERT_TRUE(peer.ok("attach 1"));
+    EXPECT_EQ(peer.call("size").at(2), 64);
+    EXPECT_EQ(peer.call("count").at(2), 2);
+    EXPECT_EQ(memory.attachCount(), 2);
+    EXPECT_EQ(peer.call("read 60").at(2), 0xC0FFEE);
+    EXPECT_TRUE(peer.ok("write 0 4242"));
+    EXPECT_EQ(readWord(memory, 0), 4242u);
+
+    EXPECT_TRUE(peer.ok("detach"));
+    EXPECT_TRUE(memory.detach());
+    EXPECT_FALSE(memory.detach());
+    EXPECT_EQ(memory.status(), SgSharedMemory::StatusNotFound);
+    ASSERT_TRUE(memory.attach(SgSharedMemory::kReadOnly));
+    EXPECT_EQ(memory.attachCount(), 1); // both earlier attachments were uncounted
+    EXPECT_EQ(readWord(memory, 0), 4242u);
+    peer.quit();
+}
+
+TEST(SgSharedMemory, LockIsExclusiveNestedAndTimed) {
+    const std::string key = uniqueKey("lock");
+    SgSharedMemory memory(key);
+    ASSERT_TRUE(memory.create(16));
+    ShmPeerProcess peer;
+    ASSERT_TRUE(peer.ok("open " + key));
+    ASSERT_TRUE(peer.ok("attach 1"));
+
+    ASSERT_TRUE(memory.lock());
+    ASSERT_TRUE(memory.lock());
+    EXPECT_EQ(memory.lockDepth(), 2);
+    memory.unlock();
+    EXPECT_EQ(memory.lockDepth(), 1);
+    EXPECT_EQ(peer.call("trylock 0").at(0), 0);
+    memory.unlock();
+    EXPECT_EQ(memory.lockDepth(), 0);
+    EXPECT_EQ(peer.call("trylock 0").at(0), 1);
+
+    // The peer holds the lock: a timed try gives up after about the time asked for.
+    const auto start = Clock::now();
+    EXPECT_FALSE(memory.tryLock(25));
+    const long long waited = msSince(start);
+    EXPECT_GE(waited, 24);
+    EXPECT_LT(waited, 250);
+    EXPECT_EQ(memory.status(), SgSharedMemory::StatusLockFailed);
+    EXPECT_TRUE(peer.ok("unlock"));
+    EXPECT_TRUE(memory.tryLock(25));
+    const auto peerTry = peer.call("trylock 25");
+    EXPECT_EQ(peerTry.at(0), 0);
+    EXPECT_GE(peerTry.at(2), 24);
+    memory.unlock();
+    peer.quit();
+}
+
+TEST(SgSharedMemory, SegmentOutlivesDestroyedCreatorAndVanishesWithTheLastHolder) {
+    const std::string key = uniqueKey("lifetime");
+    {
+        ShmPeerProcess peer;
+        ASSERT_TRUE(peer.ok("open " + key));
+        ASSERT_TRUE(peer.ok("create 32"));
+        ASSERT_TRUE(peer.ok("attach 1"));
+        ASSERT_TRUE(peer.ok("write 4 777"));
+
+        SgSharedMemory memory(key);
+        ASSERT_TRUE(memory.attach(SgSharedMemory::kReadWrite));
+        EXPECT_EQ(memory.size(), 32);
+        ASSERT_TRUE(peer.ok("destroy")); // the creator's object goes while we are attached
+        EXPECT_EQ(readWord(memory, 4), 777u);
+        EXPECT_EQ(memory.attachCount(), 1);
+        peer.quit(); // and then its process
+        EXPECT_TRUE(memory.isAttached());
+        EXPECT_TRUE(SgSharedMemory(key).exists());
+        EXPECT_EQ(readWord(memory, 4), 777u);
+    }
+    EXPECT_FALSE(SgSharedMemory(key).exists());
+}
+
+TEST(SgSharedMemory, RemoveUncountsAndWaitsForTheOthers) {
+    const std::string key = uniqueKey("remove");
+    SgSharedMemory memory(key);
+    ASSERT_TRUE(memory.create(16));
+    ASSERT_TRUE(memory.attach(SgSharedMemory::kReadWrite));
+    ShmPeerProcess peer;
+    ASSERT_TRUE(peer.ok("open " + key));
+    ASSERT_TRUE(peer.ok("attach 1"));
+
+    // Alone-wait: returns once the peer has detached.
+    std::thread detacher([&peer] {
+        std::this_thread::sleep_for(std::chrono::milliseconds(100));
+        peer.call("detach");
+    });
+    const auto start = Clock::now();
+    EXPECT_TRUE(memory.remove(SgSharedMemory::kRemoveWhenAlone));
+    detacher.join();
+    EXPECT_GE(msSince(start), 90);
+    EXPECT_FALSE(memory.isAttached());
+    EXPECT_EQ(memory.lockDepth(), 0);
+
+    // A removed object can attach again; remove under the lock uncounts its attachment.
+    ASSERT_TRUE(memory.attach(SgSharedMemory::kReadWrite));
+    ASSERT_TRUE(peer.ok("attach 0"));
+    EXPECT_EQ(memory.attachCount(), 2);
+    ASSERT_TRUE(memory.lock()); // an outer level that remove gives back as well
+    EXPECT_TRUE(memory.remove(SgSharedMemory::kRemoveLocked));
+    EXPECT_EQ(peer.call("count").at(2), 1);
+    EXPECT_EQ(peer.call("trylock 0").at(0), 1);
+    EXPECT_TRUE(peer.ok("unlock"));
+
+    // Alone already: returns at once, also while attached itself.
+    EXPECT_TRUE(peer.ok("detach"));
+    ASSERT_TRUE(memory.attach(SgSharedMemory::kReadOnly));
+    const auto alone = Clock::now();
+    EXPECT_TRUE(memory.remove(SgSharedMemory::kRemoveWhenAlone));
+    EXPECT_LT(msSince(alone), 1000);
+    peer.quit();
+    EXPECT_FALSE(SgSharedMemory(key).exists());
+}
+
+TEST(SgControlRecord, FreshRecordHasBothSlotsFree) {
+    const SgControlRecord fresh = SgControlRecord::fresh();
+    unsigned char bytes[16];
+    std::memcpy(bytes, &fresh, sizeof bytes);
+    const unsigned char expected[16] = {1, 0, 0, 0, 0, 0, 0, 0, 1, 0, 0, 0, 0, 0, 0, 0};
+    EXPECT_EQ(std::memcmp(bytes, expected, sizeof bytes), 0);
+    EXPECT_STREQ(kSgDataSegmentKey, "FACETOR_BRIDGE_DYNAMIC_MAP");
+}

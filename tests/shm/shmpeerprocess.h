@@ -1,0 +1,49 @@
+#pragma once
+
+#include <string>
+#include <vector>
+
+// Runs the test helper program shm_peer (next to the running test program) as a real second
+// process, started with exec, and talks to it over pipes: one command line in, one answer out.
+class ShmPeerProcess {
+public:
+    ShmPeerProcess();
+    ~ShmPeerProcess(); // kills the peer if it still runs
+
+    ShmPeerProcess(const ShmPeerProcess &) = delete;
+    ShmPeerProcess &operator=(const ShmPeerProcess &) = delete;
+
+    bool isRunning() const { return m_running; }
+
+    // Sends `command` and returns the answer's fields as numbers ("<result> <status> ...");
+    // empty when the peer did not answer within `timeoutMs`.
+    std::vector<long long> call(const std::string &command, int timeoutMs = 20000);
+
+    // Shorthand: the first field of the answer is 1.
+    bool ok(const std::string &command) {
+        const std::vector<long long> fields = call(command);
+        return !fields.empty() && fields.front() == 1;
+    }
+
+    // Kills the peer at once (SIGKILL, TerminateProcess) and reaps it.
+    void kill();
+
+    // Asks the peer to quit and waits for it to end.
+    void quit();
+
+private:
+    bool writeLine(const std::string &line);
+    bool readLine(std::string *line, int timeoutMs);
+
+    bool m_running = false;
+    std::string m_buffer;
+#ifdef _WIN32
+    void *m_process = nullptr;
+    void *m_toPeer = nullptr;
+    void *m_fromPeer = nullptr;
+#else
+    int m_pid = -1;
+    int m_toPeer = -1;
+    int m_fromPeer = -1;
+#endif
+};

@@ -1,0 +1,25 @@
+#pragma once
+
+#include <chrono>
+#include <string>
+
+#ifdef _WIN32
+#include <process.h>
+#define SG_TEST_PID _getpid()
+#else
+#include <unistd.h>
+#define SG_TEST_PID getpid()
+#endif
+
+// A key that no other test or test run uses: "shmtest-<what>-<pid>-<n>".
+inline std::string uniqueKey(const std::string &what) {
+    static int serial = 0;
+    return "shmtest-" + what + "-" + std::to_string(SG_TEST_PID) + "-" + std::to_string(++serial);
+}
+
+// Milliseconds since `start`.
+inline long long msSince(std::chrono::steady_clock::time_point start) {
+    return std::chrono::duration_cast<std::chrono::milliseconds>(std::chrono::steady_clock::now() -
+                                                                 start)
+        .count();
+}
