@@ -11,7 +11,14 @@ endfunction()
 function(sg_add_gtest)
     cmake_parse_arguments(T "" "NAME;TIMEOUT;RESOURCE_LOCK" "LABELS;SOURCES;LIBS;ENV" ${ARGN})
     add_executable(${T_NAME} ${T_SOURCES})
-    target_link_libraries(${T_NAME} PRIVATE ${T_LIBS} GTest::gtest GTest::gtest_main)
+    if(SG_ONLY_SHM_WIN32)
+        # The Qt-free cross build has no host stand-in: plain GoogleTest main.
+        target_link_libraries(${T_NAME} PRIVATE ${T_LIBS} GTest::gtest GTest::gtest_main)
+    else()
+        # sgtestmain (tests/support) provides main(): QApplication, sgApp in a temporary
+        # folder and the stray-modal fail-safe. A test that defines its own main keeps it.
+        target_link_libraries(${T_NAME} PRIVATE ${T_LIBS} sgtestmain GTest::gtest)
+    endif()
     sg_warnings(${T_NAME})
     add_test(NAME ${T_NAME} COMMAND ${T_NAME})
     if(NOT T_TIMEOUT)

@@ -1,0 +1,434 @@
+#include "sgcore/scene/sgfigurewelder.h"
+
+#include "sgcore/geometry/sgmodifier.h"
+#include "sgcore/geometry/sgobject.h"
+#include "sgcore/geometry/sgpolymesh.h"
+#include "sgcore/geometry/sgpolyshape.h"
+#include "sgcore/materials/sgmaterial.h"
+#include "sgcore/scene/sgbone.h"
+#include "sgcore/scene/sgskeleton.h"
+
+#include <QHash>
+
+#include <bit>
+#include <cstring>
+#include <unordered_set>
+
+// What the welder remembers of one bone.
+struct SgFigureWelder::BoneSlice {
+    SgBone *bone = nullptr;
+    SgPolyMesh *base = nullptr;       // the bone's base geometry (one reference held)
+    std::vector<SgVec3> source;       // the positions welded (base, or with morphs)
+    std::vector<int32_t> weldIndex;   // per bone vertex: welded vertex, or -1 when left out
+    std::vector<int32_t> unused;      // bone vertices that none of its facets use
+    std::vector<uint8_t> materialMap; // bone material index -> figure material index
+    int32_t uvOffset = 0;             // where the bone's UVs start in the welded UV list
+    int32_t outStart = 0;             // where the bone's vertices start in unWeld's result
+    bool hasMorphs = false;
+};
+
+namespace {
+
+SgPolyMesh *polyMeshOf(SgNode *node) {
+    SgObject *object = node ? node->getObject() : nullptr;
+    SgShape *shape = object ? object->getCurrentShape() : nullptr;
+    return shape ? dynamic_cast<SgPolyMesh *>(shape->getGeometry()) : nullptr;
+}
+
+SgShape *shapeOf(SgNode *node) {
+    SgObject *object = node ? node->getObject() : nullptr;
+    return object ? object->getCurrentShape() : nullptr;
+}
+
+bool hasMorphModifiers(const SgNode *node) {
+    const SgObject *object = node ? node->getObject() : nullptr;
+    if (!object) {
+        return false;
+    }
+    for (const SgModifier *m : object->getModifiers()) {
+        if (m->isMorphModifier()) {
+            return true;
+        }
+    }
+    return false;
+}
+
+// Open-addressing table from exact positions to welded vertices.
+class PositionTable {
+public:
+    explicit PositionTable(size_t expected) {
+        size_t cap = 16;
+        while (cap < expected * 2) {
+            cap <<= 1;
+        }
+        m_slots.assign(cap, -1);
+        m_mask = cap - 1;
+    }
+
+    // The slot for `p`: either holding a welded vertex at exactly `p`, or empty (-1).
+    int32_t &slot(const SgVec3 &p, const std::vector<SgVec3> &welded) {
+        size_t i = hash(p) & m_mask;
+        while (true) {
+            int32_t &s = m_slots[i];
+            if (s < 0 || welded[size_t(s)] == p) {
+                return s;
+            }
+            i = (i + 1) & m_mask;
+        }
+    }
+
+private:
+    static size_t hash(const SgVec3 &p) {
+        // Adding 0 turns -0 into +0, so both zeros hash alike (they compare equal).
+        const uint32_t x = std::bit_cast<uint32_t>(p.x + 0.0f);
+        const uint32_t y = std::bit_cast<uint32_t>(p.y + 0.0f);
+        const uint32_t z = std::bit_cast<uint32_t>(p.z + 0.0f);
+        uint64_t h = x * 0x9E3779B97F4A7C15ull;
+        h ^= (y + 0x7F4A7C15ull) * 0xC2B2AE3D27D4EB4Full;
+        h ^= (z + 0x165667B1ull) * 0x94D049BB133111EBull;
+        return size_t(h ^ (h >> 29));
+    }
+
+    std::vector<int32_t> m_slots;
+    size_t m_mask = 0;
+};
+
+template <typename F> void forEachCorner(const SgPolyMesh &m, F &&f) {
+    for (const SgFaceCorner &c : m.triangleCorners()) {
+        f(c);
+    }
+    for (const SgFaceCorner &c : m.quadCorners()) {
+        f(c);
+    }
+    for (const SgFaceCorner &c : m.polygonCorners()) {
+        f(c);
+    }
+}
+
+SgFaceCorner remapCorner(const SgFaceCorner &c, int32_t vertex, int32_t uvCount, int32_t uvOffset) {
+    SgFaceCorner out = c;
+    out.vertex = vertex;
+    out.uv = c.uv >= 0 && c.uv < uvCount ? c.uv + uvOffset : -1;
+    return out;
+}
+
+// Appends `bone`'s facets to `out` with vertex indices mapped by `vertexOf`.
+template <typename V>
+void appendFacets(SgPolyMesh &out, const SgPolyMesh &bone, const std::vector<uint8_t> &materialMap,
+                  int32_t group, int32_t uvOffset, V &&vertexOf) {
+    const int32_t uvCount = bone.getUVCount();
+    auto material = [&](uint8_t local) -> uint8_t {
+        return local < materialMap.size() ? materialMap[local] : uint8_t(255);
+    };
+    for (const SgFaceCorner &c : bone.triangleCorners()) {
+        out.triangleCorners().push_back(remapCorner(c, vertexOf(c.vertex), uvCount, uvOffset));
+    }
+    for (uint8_t m : bone.triangleMaterials()) {
+        out.triangleMaterials().push_back(material(m));
+        out.triangleGroups().push_back(group);
+    }
+    for (const SgFaceCorner &c : bone.quadCorners()) {
+        out.quadCorners().push_back(remapCorner(c, vertexOf(c.vertex), uvCount, uvOffset));
+    }
+    for (uint8_t m : bone.quadMaterials()) {
+        out.quadMaterials().push_back(material(m));
+        out.quadGroups().push_back(group);
+    }
+    const uint32_t polyBase = static_cast<uint32_t>(out.polygonCorners().size());
+    for (const SgFaceCorner &c : bone.polygonCorners()) {
+        out.polygonCorners().push_back(remapCorner(c, vertexOf(c.vertex), uvCount, uvOffset));
+    }
+    for (size_t i = 1; i < bone.polygonStarts().size(); ++i) {
+        out.polygonStarts().push_back(polyBase + bone.polygonStarts()[i]);
+    }
+    for (uint8_t m : bone.polygonMaterials()) {
+        out.polygonMaterials().push_back(material(m));
+        out.polygonGroups().push_back(group);
+    }
+}
+
+// Adds degenerate facets of `group` that use each of `vertices` (for the group extraction).
+void appendCarriers(SgPolyMesh &out, const std::vector<int32_t> &vertices, int32_t offset,
+                    int32_t group) {
+    const size_t chunk = size_t(SgPolyMesh::kMaxPolygonCorners);
+    for (size_t start = 0; start < vertices.size(); start += chunk) {
+        const size_t n = std::min(chunk, vertices.size() - start);
+        std::vector<SgFaceCorner> corners;
+        for (size_t k = 0; k < n; ++k) {
+            corners.push_back({vertices[start + k] + offset, -1, -1});
+        }
+        while (corners.size() < 3) {
+            corners.push_back(corners.back());
+        }
+        if (corners.size() == 3) {
+            out.triangleCorners().insert(out.triangleCorners().end(), corners.begin(),
+                                         corners.end());
+            out.triangleMaterials().push_back(0);
+            out.triangleGroups().push_back(group);
+        } else if (corners.size() == 4) {
+            out.quadCorners().insert(out.quadCorners().end(), corners.begin(), corners.end());
+            out.quadMaterials().push_back(0);
+            out.quadGroups().push_back(group);
+        } else {
+            out.polygonCorners().insert(out.polygonCorners().end(), corners.begin(), corners.end());
+            out.polygonStarts().push_back(static_cast<uint32_t>(out.polygonCorners().size()));
+            out.polygonMaterials().push_back(0);
+            out.polygonGroups().push_back(group);
+        }
+    }
+}
+
+} // namespace
+
+SgFigureWelder::SgFigureWelder(SgSkeleton *figure, bool ignoreInvisible, bool weldGeometry,
+                               bool removeUnused, bool morphedGeometry)
+    : m_morphed(morphedGeometry) {
+    if (figure) {
+        m_bones = figure->getAllBones();
+    }
+    build(figure, ignoreInvisible, weldGeometry, removeUnused);
+}
+
+SgFigureWelder::SgFigureWelder(const SgBoneList &bones, bool ignoreInvisible, bool weldGeometry,
+                               bool removeUnused, bool morphedGeometry, int /*flags*/)
+    : m_morphed(morphedGeometry) {
+    std::unordered_set<SgBone *> seen;
+    for (SgBone *b : bones) {
+        if (b && seen.insert(b).second) {
+            m_bones.append(b);
+        }
+    }
+    build(m_bones.isEmpty() ? nullptr : m_bones.first()->getSkeleton(), ignoreInvisible,
+          weldGeometry, removeUnused);
+}
+
+SgFigureWelder::~SgFigureWelder() {
+    delete m_shape;
+    for (BoneSlice &s : m_slices) {
+        if (s.base) {
+            s.base->unref();
+        }
+    }
+}
+
+SgPolyMesh *SgFigureWelder::getGeometry() const {
+    return m_shape->getPolyMesh();
+}
+
+void SgFigureWelder::build(SgSkeleton *figure, bool ignoreInvisible, bool weldGeometry,
+                           bool removeUnused) {
+    m_shape = new SgPolyShape(figure ? figure->getLabel() : QString());
+    auto *welded = new SgPolyMesh;
+    m_shape->setPolyMesh(welded);
+
+    // Bones that take part, with their geometry and figure material indices.
+    SgBoneList kept;
+    QHash<QString, int> figureMaterials;
+    size_t totalVertices = 0;
+    for (SgBone *bone : m_bones) {
+        SgPolyMesh *mesh = polyMeshOf(bone);
+        if (!mesh || (ignoreInvisible && bone->isHidden())) {
+            continue;
+        }
+        kept.append(bone);
+        BoneSlice slice;
+        slice.bone = bone;
+        slice.base = mesh;
+        mesh->ref();
+        slice.hasMorphs = m_morphed && hasMorphModifiers(bone);
+        for (SgMaterial *m : shapeOf(bone)->getAllMaterials()) {
+            auto it = figureMaterials.constFind(m->getName());
+            int index = it == figureMaterials.constEnd() ? -1 : it.value();
+            if (index < 0) {
+                index = m_shape->addMaterial(m->clone());
+                figureMaterials.insert(m->getName(), index);
+            }
+            slice.materialMap.push_back(static_cast<uint8_t>(std::min(index, 255)));
+        }
+        totalVertices += size_t(mesh->getVertexCount());
+        m_slices.push_back(std::move(slice));
+    }
+    m_bones = kept;
+    for (int i = 0; i < m_shape->getMaterialCount(); ++i) {
+        m_subdMap.push_back(i);
+    }
+
+    // Welded vertices.
+    std::vector<SgVec3> &wv = welded->vertices();
+    wv.reserve(totalVertices);
+    std::vector<int32_t> lastBone; // per welded vertex: the last bone slice that joined it
+    lastBone.reserve(totalVertices);
+    PositionTable table(weldGeometry ? totalVertices : 0);
+    int32_t outStart = 0;
+    int32_t uvOffset = 0;
+    auto *uvList = new SgMap(SgMap::UVMap);
+    for (size_t b = 0; b < m_slices.size(); ++b) {
+        BoneSlice &s = m_slices[b];
+        const int32_t n = s.base->getVertexCount();
+        if (s.hasMorphs) {
+            SgVertexMesh *morphed = getMorphOnlyGeom(s.bone);
+            s.source = morphed->vertices();
+            if (morphed != s.base) {
+                delete morphed;
+            }
+        } else {
+            s.source = s.base->vertices();
+        }
+        std::vector<uint8_t> used(size_t(n), 0);
+        forEachCorner(*s.base, [&](const SgFaceCorner &c) { used[size_t(c.vertex)] = 1; });
+        s.weldIndex.assign(size_t(n), -1);
+        for (int32_t i = 0; i < n; ++i) {
+            if (!used[size_t(i)]) {
+                s.unused.push_back(i);
+                if (removeUnused) {
+                    continue;
+                }
+            }
+            const SgVec3 &p = s.source[size_t(i)];
+            int32_t w = -1;
+            if (weldGeometry) {
+                int32_t &slot = table.slot(p, wv);
+                if (slot >= 0 && lastBone[size_t(slot)] != int32_t(b)) {
+                    w = slot;
+                    lastBone[size_t(w)] = int32_t(b);
+                } else if (slot < 0) {
+                    slot = static_cast<int32_t>(wv.size());
+                }
+            }
+            if (w < 0) {
+                w = static_cast<int32_t>(wv.size());
+                wv.push_back(p);
+                lastBone.push_back(int32_t(b));
+            }
+            s.weldIndex[size_t(i)] = w;
+        }
+        s.outStart = outStart;
+        outStart += n;
+        s.uvOffset = uvOffset;
+        if (const SgMap *uvs = s.base->getUVList()) {
+            uvList->values().insert(uvList->values().end(), uvs->values().begin(),
+                                    uvs->values().end());
+            uvOffset += uvs->getValueCount();
+        }
+    }
+    if (uvOffset > 0) {
+        welded->setUVList(uvList);
+    } else {
+        delete uvList;
+    }
+
+    // Facets, one face group per bone.
+    for (const BoneSlice &s : m_slices) {
+        const int32_t group = welded->addFaceGroup(s.bone->getName());
+        appendFacets(*welded, *s.base, s.materialMap, group, s.uvOffset,
+                     [&](int32_t v) { return s.weldIndex[size_t(v)]; });
+    }
+}
+
+std::vector<int32_t> SgFigureWelder::getWeldCounts() const {
+    std::vector<int32_t> counts(size_t(getGeometry()->getVertexCount()), 0);
+    for (const BoneSlice &s : m_slices) {
+        for (int32_t w : s.weldIndex) {
+            if (w >= 0) {
+                ++counts[size_t(w)];
+            }
+        }
+    }
+    return counts;
+}
+
+SgVertexMesh *SgFigureWelder::unWeld(const SgVertexMesh *edited) const {
+    const SgPolyMesh *welded = getGeometry();
+    if (!edited || edited->getVertexCount() != welded->getVertexCount()) {
+        return nullptr;
+    }
+    auto *out = new SgPolyMesh;
+    int32_t total = 0;
+    for (const BoneSlice &s : m_slices) {
+        total += static_cast<int32_t>(s.weldIndex.size());
+    }
+    SgVec3 *dst = out->setVertexArray(total);
+    const SgVec3 *src = edited->getVertices();
+    for (const BoneSlice &s : m_slices) {
+        SgVec3 *block = dst + s.outStart;
+        for (size_t i = 0; i < s.weldIndex.size(); ++i) {
+            const int32_t w = s.weldIndex[i];
+            block[i] = w >= 0 ? src[w] : s.source[i];
+        }
+        if (s.hasMorphs) {
+            // Take the bone's morphs back out, last modifier first.
+            SgVertexMesh temp;
+            temp.vertices().assign(block, block + s.weldIndex.size());
+            const auto &mods = s.bone->getObject()->getModifiers();
+            for (auto it = mods.rbegin(); it != mods.rend(); ++it) {
+                if ((*it)->isMorphModifier()) {
+                    (*it)->applyInverse(&temp, s.bone);
+                }
+            }
+            std::copy(temp.vertices().begin(), temp.vertices().end(), block);
+        }
+    }
+    if (const SgMap *uvs = welded->getUVList()) {
+        out->setUVList(new SgMap(*uvs));
+    }
+    for (const BoneSlice &s : m_slices) {
+        const int32_t group = out->addFaceGroup(s.bone->getName());
+        appendFacets(*out, *s.base, s.materialMap, group, s.uvOffset,
+                     [&](int32_t v) { return v + s.outStart; });
+        appendCarriers(*out, s.unused, s.outStart, group);
+    }
+    return out;
+}
+
+SgVertexMesh *SgFigureWelder::getMorphOnlyGeom(SgNode *node) {
+    SgShape *shape = shapeOf(node);
+    SgVertexMesh *base = shape ? shape->getGeometry() : nullptr;
+    if (!base || !hasMorphModifiers(node)) {
+        return base;
+    }
+    SgVertexMesh *copy = base->clone();
+    for (const SgModifier *m : node->getObject()->getModifiers()) {
+        if (m->isMorphModifier()) {
+            m->apply(copy, node);
+        }
+    }
+    return copy;
+}
+
+SgBoneList SgFigureWelder::getOrderedBones(const SgNodeList &nodes) {
+    QList<SgSkeleton *> figures;
+    QHash<SgSkeleton *, bool> wholeFigure;
+    std::unordered_set<SgBone *> wanted;
+    SgBoneList loose;
+    for (SgNode *n : nodes) {
+        if (auto *bone = dynamic_cast<SgBone *>(n)) {
+            SgSkeleton *fig = bone->getSkeleton();
+            if (!fig) {
+                if (!loose.contains(bone)) {
+                    loose.append(bone);
+                }
+                continue;
+            }
+            if (!figures.contains(fig)) {
+                figures.append(fig);
+            }
+            wanted.insert(bone);
+        } else if (auto *fig = dynamic_cast<SgSkeleton *>(n)) {
+            if (!figures.contains(fig)) {
+                figures.append(fig);
+            }
+            wholeFigure.insert(fig, true);
+        }
+    }
+    SgBoneList out;
+    for (SgSkeleton *fig : figures) {
+        const bool all = wholeFigure.value(fig, false);
+        for (SgBone *b : fig->getAllBones()) {
+            if (all || wanted.count(b)) {
+                out.append(b);
+            }
+        }
+    }
+    out.append(loose);
+    return out;
+}

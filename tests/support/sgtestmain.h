@@ -1,0 +1,33 @@
+#pragma once
+
+// Support for the project's GoogleTest programs (library `sgtestmain`, linked by sg_add_gtest).
+//
+// The library provides main(). Before any test runs it:
+//   - makes a QApplication (platform "offscreen" unless QT_QPA_PLATFORM says otherwise);
+//   - makes a fresh temporary folder (removed at exit) and points the application settings
+//     file (SgAppSettings::setFileName) at "<folder>/settings.ini";
+//   - makes the application object `sgApp` (SgApp) with its temporary path "<folder>/temp"
+//     and its documents path "<folder>/documents" (both created);
+//   - starts a fail-safe: a modal dialog or popup that stays open for more than a few seconds
+//     (5 s; SG_TEST_MODAL_TIMEOUT_MS overrides) is closed, and the running test fails with its
+//     window title, so a broken test fails instead of hanging.
+//
+// Reading back what the code under test reported:
+//   sgApp->getMessageSink()->logLines()       every SgApp::log line, oldest first
+//   sgApp->getMessageSink()->statusLines()    every SgApp::statusLine text
+//   sgApp->getMessageSink()->currentStatus()  the last status line
+//   sgApp->getMessageSink()->progressRuns()   every progress run (text, total, steps, flags)
+//   sgApp->getMessageSink()->clear()          forget them (for example in a fixture's SetUp)
+// The scene is sgApp->getScene(); tests that fill it should clear it when done
+// (sgApp->getScene()->clear()).
+
+#include <QString>
+
+// The fresh temporary folder of this test program (no trailing slash).
+QString sgTestFolder();
+
+// A path inside that folder ("<folder>/<name>").
+QString sgTestPath(const QString &name);
+
+// Changes the fail-safe's time-out for stray modal dialogs and popups (milliseconds).
+void sgTestSetModalTimeout(int milliseconds);
