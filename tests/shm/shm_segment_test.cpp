@@ -6,6 +6,7 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <chrono>
 #include <cstring>
 #include <memory>
@@ -59,10 +60,14 @@ TEST(SgSharedMemory, RejectsBadSizeAndEmptyKeyLeavingNothingOpen) {
 
 TEST(SgSharedMemory, MissingSegmentFailsLockAttachAndDetach) {
     SgSharedMemory memory(uniqueKey("missing"));
-    const auto start = Clock::now();
-    EXPECT_FALSE(memory.lock());
-    EXPECT_FALSE(memory.tryLock(25));
-    EXPECT_LT(msSince(start), 20);
+    long long fastest = 1000;
+    for (int attempt = 0; attempt < 3; ++attempt) { // the fastest of three, against load spikes
+        const auto start = Clock::now();
+        EXPECT_FALSE(memory.lock());
+        EXPECT_FALSE(memory.tryLock(25));
+        fastest = std::min(fastest, msSince(start));
+    }
+    EXPECT_LT(fastest, 20);
     EXPECT_EQ(memory.status(), SgSharedMemory::StatusFailed); // no lock-failure status here
     EXPECT_EQ(memory.lockDepth(), 0);
 
@@ -135,7 +140,7 @@ TEST(SgSharedMemory, LockIsExclusiveNestedAndTimed) {
     EXPECT_FALSE(memory.tryLock(25));
     const long long waited = msSince(start);
     EXPECT_GE(waited, 24);
-    EXPECT_LT(waited, 250);
+    EXPECT_LT(waited, 400);
     EXPECT_EQ(memory.status(), SgSharedMemory::StatusLockFailed);
     EXPECT_TRUE(peer.ok("unlock"));
     EXPECT_TRUE(memory.tryLock(25));
@@ -179,14 +184,14 @@ TEST(SgSharedMemory, RemoveUncountsAndWaitsForTheOthers) {
     ASSERT_TRUE(peer.ok("attach 1"));
 
     // Alone-wait: returns once the peer has detached.
+    const auto start = Clock::now(); // before the thread, which may run first
     std::thread detacher([&peer] {
         std::this_thread::sleep_for(std::chrono::milliseconds(100));
         peer.call("detach");
     });
-    const auto start = Clock::now();
     EXPECT_TRUE(memory.remove(SgSharedMemory::kRemoveWhenAlone));
     detacher.join();
-    EXPECT_GE(msSince(start), 90);
+    EXPECT_GE(msSince(start), 100);
     EXPECT_FALSE(memory.isAttached());
     EXPECT_EQ(memory.lockDepth(), 0);
 

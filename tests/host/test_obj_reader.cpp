@@ -1,0 +1,177 @@
+#include "sgcore/geometry/sgpolymesh.h"
+#include "sgcore/geometry/sgpolyshape.h"
+#include "sgcore/io/sgobjreader.h"
+#include "sgcore/materials/sgmaterial.h"
+
+#include <gtest/gtest.h>
+
+#include <QFile>
+#include <QTemporaryDir>
+
+#include <string>
+
+namespace {
+
+bool read(SgObjReader &r, const std::string &text) {
+    return r.readBuffer(text.data(), text.size(), QStringLiteral("t.obj"));
+}
+
+std::vector<int> vertexIndices(const SgFaceCorner *c, int n) {
+    std::vector<int> out;
+    for (int i = 0; i < n; ++i) {
+        out.push_back(c[i].vertex);
+    }
+    return out;
+}
+
+} // namespace
+
+TEST(HostObjReader, KeepsVertexOrderPolygonsGroupsAndMaterials) {
+    SgObjReader r;
+    ASSERT_TRUE(read(r, "# comment\n"
+                        "mtllib a.mtl\n"
+                        "v 3 0 0\nv 1 0 0\nv 2 0 0\nv 0 1 0\nv 0 2 0\r\n"
+                        "vt 0.5 0.25\nvt 1\n"
+                        "vn 0 0 1\n"
+                        "f 1 2 3\n"
+                        "g arm\n"
+                        "usemtl Skin\n"
+                        "f 1/1 2/2 3/1 4/2\n"
+                        "usemtl Nails\n"
+                        "f 1//1 2//1 3//1 4//1 5//1\n"
+                        "g\n"
+                        "usemtl Skin\n"
+                        "f -1/-1/-1 -2/-2/1 -3/1/1\n"))
+        << r.getErrorString().toStdString();
+    const SgPolyMesh *m = r.getMesh();
+    ASSERT_NE(m, nullptr);
+    ASSERT_EQ(m->getVertexCount(), 5);
+    EXPECT_EQ(m->getVertex(0), SgVec3(3, 0, 0));
+    EXPECT_EQ(m->getVertex(1), SgVec3(1, 0, 0));
+    EXPECT_EQ(m->getVertex(4), SgVec3(0, 2, 0));
+    ASSERT_EQ(m->getUVCount(), 2);
+    EXPECT_EQ(m->getUVList()->getValue(1), SgVec2(1, 0));
+
+    ASSERT_EQ(m->getTriangleCount(), 2);
+    ASSERT_EQ(m->getQuadCount(), 1);
+    ASSERT_EQ(m->getPolygonCount(), 1);
+    EXPECT_EQ(m->getPolygonCornerCount(0), 5);
+    EXPECT_EQ(vertexIndices(m->getTriangleCorners(0), 3), (std::vector<int>{0, 1, 2}));
+    // Negative indices count back from the last item read so far.
+    EXPECT_EQ(vertexIndices(m->getTriangleCorners(1), 3), (std::vector<int>{4, 3, 2}));
+    EXPECT_EQ(m->getTriangleCorners(1)[0].uv, 1);
+    EXPECT_EQ(m->getTriangleCorners(1)[0].third, 0);
+    EXPECT_EQ(m->getQuadCorners(0)[1].uv, 1);
+    EXPECT_EQ(m->getQuadCorners(0)[1].third, -1);
+    EXPECT_EQ(m->getPolygonCorners(0)[0].uv, -1);
+    EXPECT_EQ(m->getPolygonCorners(0)[0].third, 0);
+
+    // Faces before any usemtl use "default"; names are indexed in order of first use.
+    EXPECT_EQ(r.getMaterialNames(), (QStringList{QStringLiteral("default"), QStringLiteral("Skin"),
+                                                 QStringLiteral("Nails")}));
+    EXPECT_EQ(m->getTriangleMaterial(0), 0);
+    EXPECT_EQ(m->getQuadMaterial(0), 1);
+    EXPECT_EQ(m->getPolygonMaterial(0), 2);
+    EXPECT_EQ(m->getTriangleMaterial(1), 1);
+    EXPECT_EQ(r.getMaterialLibraries(), QStringList{QStringLiteral("a.mtl")});
+
+    ASSERT_EQ(m->getFaceGroupCount(), 1);
+    EXPECT_EQ(m->getFaceGroupName(0), QStringLiteral("arm"));
+    EXPECT_EQ(m->getTriangleGroup(0), -1);
+    EXPECT_EQ(m->getQuadGroup(0), 0);
+    EXPECT_EQ(m->getPolygonGroup(0), 0);
+    EXPECT_EQ(m->getTriangleGroup(1), -1);
+    EXPECT_EQ(m->getFaceGroupVertices(0), (std::vector<int32_t>{0, 1, 2, 3, 4}));
+    QString why;
+    EXPECT_TRUE(m->validate(&why)) << why.toStdString();
+
+    SgPolyShape *shape = r.takeShape(QStringLiteral("body"));
+    ASSERT_NE(shape, nullptr);
+    EXPECT_EQ(shape->getMaterialCount(), 3);
+    EXPECT_NE(shape->findMaterial(QStringLiteral("Nails")), nullptr);
+    EXPECT_EQ(shape->getPolyMesh()->getVertexCount(), 5);
+    EXPECT_EQ(r.getMesh(), nullptr);
+    delete shape;
+}
+
+TEST(HostObjReader, RejectsMalformedInputWithFileAndLine) {
+    struct Case {
+        const char *text;
+        int line;
+        const char *words;
+    };
+    const Case cases[] = {
+        {"v 1 2 3\nv 1 2\n", 2, "three coordinates"},
+        {"v 1 2 x\n", 1, "bad number"},
+        {"v 1 2 3e99999\n", 1, "out of range"},
+        {"v 0 0 0\nv 1 0 0\nf 1 2\n", 3, "three corners"},
+        {"v 0 0 0\nf 1 2 0\n", 2, "index 0"},
+        {"v 0 0 0\nv 0 0 0\nv 0 0 0\nf 1 2 -4\n", 4, "before the first"},
+        {"v 0 0 0\nv 0 0 0\nv 0 0 0\nf 1 2 3\nf 1 2 9\n", 5, "out of range"},
+        {"v 0 0 0\nv 0 0 0\nv 0 0 0\nf 1/4 2 3\n", 4, "texture index"},
+        {"v 0 0 0\nv 0 0 0\nv 0 0 0\nf 1//2 2 3\n", 4, "normal index"},
+        {"v 0 0 0\nv 0 0 0\nv 0 0 0\nf 1/a 2 3\n", 4, "bad texture"},
+        {"v 0 0 0\nv 0 0 0\nv 0 0 0\nf 1x 2 3\n", 4, "bad face corner"},
+        {"v 0 0 0\nv 0 0 0\nv 0 0 0\nf 99999999999 2 3\n", 4, "too large"},
+        {"\n\nbogus 1 2\n", 3, "unknown statement"},
+        {"v 0 0 0\n\x01\x02garbage\n", 2, "control character"},
+        {"usemtl\n", 1, "material name"},
+        {"vt\n", 1, "texture coordinate"},
+        {"vn 1 2\n", 1, "normal"},
+    };
+    for (const Case &c : cases) {
+        SgObjReader r;
+        EXPECT_FALSE(read(r, c.text)) << c.text;
+        EXPECT_EQ(r.getErrorLine(), c.line) << c.text;
+        EXPECT_TRUE(r.getErrorString().startsWith(QStringLiteral("t.obj:%1: ").arg(c.line)))
+            << r.getErrorString().toStdString();
+        EXPECT_TRUE(r.getErrorString().contains(QLatin1String(c.words)))
+            << r.getErrorString().toStdString();
+        EXPECT_EQ(r.getMesh(), nullptr);
+    }
+
+    // A polygon of more than 255 corners cannot be stored.
+    std::string big = "v 0 0 0\n";
+    big += "f";
+    for (int i = 0; i < 256; ++i) {
+        big += " 1";
+    }
+    big += "\n";
+    SgObjReader r;
+    EXPECT_FALSE(read(r, big));
+    EXPECT_TRUE(r.getErrorString().contains(QLatin1String("255")))
+        << r.getErrorString().toStdString();
+
+    // More than 256 materials do not fit the 8-bit material index.
+    std::string many = "v 0 0 0\n";
+    for (int i = 0; i < 257; ++i) {
+        many += "usemtl m" + std::to_string(i) + "\n";
+    }
+    EXPECT_FALSE(read(r, many));
+    EXPECT_EQ(r.getErrorLine(), 258);
+
+    EXPECT_FALSE(r.readFile(QStringLiteral("/nonexistent/x.obj")));
+    EXPECT_TRUE(r.getErrorString().startsWith(QStringLiteral("/nonexistent/x.obj:0: ")));
+}
+
+TEST(HostObjReader, ReadsFilesAndOddButValidText) {
+    QTemporaryDir dir;
+    const QString path = dir.filePath(QStringLiteral("a.obj"));
+    QFile f(path);
+    ASSERT_TRUE(f.open(QIODevice::WriteOnly));
+    // No final newline, tabs, a w component, a forward reference and ignored statements.
+    f.write("o thing\ns 1\nf 1 2 3\nv\t+1.5 -2 3 1\nv 1e-50 0 0\nv .5 0 0 0.2 0.3 0.4\nl 1 2\nf 1 "
+            "2 3 # tail");
+    f.close();
+    SgObjReader r;
+    ASSERT_TRUE(r.readFile(path)) << r.getErrorString().toStdString();
+    const SgPolyMesh *m = r.getMesh();
+    EXPECT_EQ(m->getVertexCount(), 3);
+    EXPECT_EQ(m->getVertex(0), SgVec3(1.5f, -2, 3));
+    EXPECT_EQ(m->getVertex(1).x, 0.0f);
+    EXPECT_EQ(m->getTriangleCount(), 2);
+
+    // An empty file is an empty mesh.
+    EXPECT_TRUE(read(r, ""));
+    EXPECT_EQ(r.getMesh()->getVertexCount(), 0);
+}

@@ -1,0 +1,180 @@
+#include "sgcore/geometry/sgmodifier.h"
+#include "sgcore/geometry/sgobject.h"
+#include "sgcore/geometry/sgpolymesh.h"
+#include "sgcore/geometry/sgpolyshape.h"
+#include "sgcore/materials/sgmaterial.h"
+#include "sgcore/scene/sgbone.h"
+#include "sgcore/scene/sgfigurewelder.h"
+#include "sgcore/scene/sgskeleton.h"
+#include "tests/support/sgtestfigure.h"
+
+#include <gtest/gtest.h>
+
+#include <memory>
+
+namespace {
+
+const SgPolyMesh *boneMesh(SgBone *bone) {
+    return static_cast<SgPolyShape *>(bone->getObject()->getCurrentShape())->getPolyMesh();
+}
+
+// The group extraction the morph engine applies to a bone: the vertices used by the bone's
+// face group, each once, in ascending order.
+std::vector<SgVec3> extract(const SgPolyMesh &mesh, const QString &group) {
+    std::vector<SgVec3> out;
+    const int g = mesh.findFaceGroup(group);
+    if (g < 0) {
+        return out;
+    }
+    for (int32_t v : mesh.getFaceGroupVertices(g)) {
+        out.push_back(mesh.getVertex(v));
+    }
+    return out;
+}
+
+std::unique_ptr<SgPolyMesh> unweld(const SgFigureWelder &w, const SgVertexMesh &edited) {
+    SgVertexMesh *out = w.unWeld(&edited);
+    return std::unique_ptr<SgPolyMesh>(dynamic_cast<SgPolyMesh *>(out));
+}
+
+// A morph-like modifier that lifts vertex 0 by `amount`.
+class LiftFirstVertex : public SgModifier {
+public:
+    explicit LiftFirstVertex(float amount) : SgModifier(QStringLiteral("lift")), m_amount(amount) {}
+    void apply(SgVertexMesh *mesh, SgNode *) const override {
+        mesh->setVertex(0, mesh->getVertex(0) + SgVec3(0, 0, m_amount));
+    }
+    void applyInverse(SgVertexMesh *mesh, SgNode *) const override {
+        mesh->setVertex(0, mesh->getVertex(0) - SgVec3(0, 0, m_amount));
+    }
+    bool isMorphModifier() const override { return true; }
+
+private:
+    float m_amount;
+};
+
+} // namespace
+
+TEST(HostWelder, UnweldingTheUnchangedWeldGivesEveryBoneExactlyItsOwnVertices) {
+    std::unique_ptr<SgSkeleton> figure(sgTestMakeFigure(QStringLiteral("Fig"), 4, 3, true));
+    figure->setLabel(QStringLiteral("Fig 1"));
+    for (bool removeUnused : {true, false}) {
+        SgFigureWelder welder(figure.get(), false, true, removeUnused, true);
+        const SgPolyMesh *welded = welder.getGeometry();
+        // 4 bones of 8 vertices (+1 unused), 3 seams of 4 shared vertices.
+        EXPECT_EQ(welded->getVertexCount(), 4 * 8 - 3 * 4 + (removeUnused ? 0 : 4));
+        EXPECT_EQ(welded->getQuadCount(), 12);
+        EXPECT_EQ(welded->getFaceGroupCount(), 4);
+        EXPECT_EQ(welder.getShape()->getName(), QStringLiteral("Fig 1"));
+        ASSERT_EQ(welder.getShape()->getMaterialCount(), 2);
+        EXPECT_EQ(welder.getShape()->getMaterial(1)->getName(), QStringLiteral("Cloth"));
+        EXPECT_EQ(welder.getSubDTextureMap(), (std::vector<int32_t>{0, 1}));
+        EXPECT_EQ(welded->getQuadMaterial(3), 1); // the first quad of bone 1
+        EXPECT_EQ(welded->getUVCount(), 4 * 8);
+        QString why;
+        EXPECT_TRUE(welded->validate(&why)) << why.toStdString();
+
+        auto result = unweld(welder, *welded);
+        ASSERT_TRUE(result);
+        EXPECT_TRUE(result->validate(&why)) << why.toStdString();
+        for (SgBone *bone : figure->getAllBones()) {
+            const std::vector<SgVec3> own = boneMesh(bone)->vertices();
+            EXPECT_EQ(extract(*result, bone->getName()), own) << bone->getName().toStdString();
+        }
+    }
+}
+
+TEST(HostWelder, MovingOneSeamVertexChangesExactlyThatVertexInEachBoneSharingIt) {
+    std::unique_ptr<SgSkeleton> figure(sgTestMakeFigure(QStringLiteral("Fig"), 3, 2));
+    SgFigureWelder welder(figure.get(), false, true, true, true);
+    const SgPolyMesh *welded = welder.getGeometry();
+    // The seam between bone 0 and bone 1 at (1, 1, 0).
+    int seam = -1;
+    for (int i = 0; i < welded->getVertexCount(); ++i) {
+        if (welded->getVertex(i) == SgVec3(1, 1, 0)) {
+            EXPECT_EQ(seam, -1) << "seam vertices are welded into one";
+            seam = i;
+        }
+    }
+    ASSERT_GE(seam, 0);
+    EXPECT_EQ(welder.getWeldCounts()[size_t(seam)], 2);
+
+    std::unique_ptr<SgVertexMesh> edited(welded->clone());
+    edited->setVertex(seam, SgVec3(1, 1, 0.5f));
+    auto result = unweld(welder, *edited);
+    ASSERT_TRUE(result);
+    const SgBoneList bones = figure->getAllBones();
+    const int changedIndex[3] = {4, 1, -1}; // right column row 1 in bone 0, left in bone 1
+    for (int b = 0; b < 3; ++b) {
+        const std::vector<SgVec3> own = boneMesh(bones[b])->vertices();
+        const std::vector<SgVec3> got = extract(*result, bones[b]->getName());
+        ASSERT_EQ(got.size(), own.size());
+        for (size_t i = 0; i < own.size(); ++i) {
+            if (int(i) == changedIndex[b]) {
+                EXPECT_EQ(got[i], SgVec3(1, 1, 0.5f));
+            } else {
+                EXPECT_EQ(got[i], own[i]) << "bone " << b << " vertex " << i;
+            }
+        }
+    }
+
+    // A mesh of another vertex count cannot be unwelded.
+    edited->setVertexCount(edited->getVertexCount() - 1);
+    EXPECT_EQ(welder.unWeld(edited.get()), nullptr);
+    EXPECT_EQ(welder.unWeld(nullptr), nullptr);
+}
+
+TEST(HostWelder, FlagsSelectBonesSeamsAndMorphedGeometry) {
+    std::unique_ptr<SgSkeleton> figure(sgTestMakeFigure(QStringLiteral("Fig"), 3, 2));
+    const SgBoneList bones = figure->getAllBones();
+
+    // Without welding the bones sit side by side.
+    SgFigureWelder apart(figure.get(), false, false, true, true);
+    EXPECT_EQ(apart.getGeometry()->getVertexCount(), 3 * 6);
+
+    // A hidden bone is left out only when invisible bones are ignored.
+    bones[1]->setHidden(true);
+    SgFigureWelder visible(figure.get(), true, true, true, true);
+    EXPECT_EQ(visible.getBones().size(), 2);
+    EXPECT_EQ(visible.getGeometry()->getVertexCount(), 12);
+    auto result = unweld(visible, *visible.getGeometry());
+    EXPECT_EQ(result->findFaceGroup(QStringLiteral("bone1")), -1);
+    EXPECT_EQ(extract(*result, QStringLiteral("bone2")), boneMesh(bones[2])->vertices());
+    SgFigureWelder all(figure.get(), false, true, true, true);
+    EXPECT_EQ(all.getBones().size(), 3);
+    bones[1]->setHidden(false);
+
+    // Morphed geometry: the weld shows the morph, unwelding takes it out again.
+    bones[0]->getObject()->addModifier(new LiftFirstVertex(2.0f));
+    SgFigureWelder morphed(figure.get(), false, true, true, true);
+    EXPECT_EQ(morphed.getGeometry()->getVertex(0), SgVec3(0, 0, 2));
+    result = unweld(morphed, *morphed.getGeometry());
+    EXPECT_EQ(extract(*result, QStringLiteral("bone0")), boneMesh(bones[0])->vertices());
+    SgFigureWelder bare(figure.get(), false, true, true, false);
+    EXPECT_EQ(bare.getGeometry()->getVertex(0), SgVec3(0, 0, 0));
+
+    SgVertexMesh *morphOnly = SgFigureWelder::getMorphOnlyGeom(bones[0]);
+    ASSERT_NE(morphOnly, boneMesh(bones[0]));
+    EXPECT_EQ(morphOnly->getVertex(0), SgVec3(0, 0, 2));
+    EXPECT_EQ(morphOnly->getVertex(1), SgVec3(0, 1, 0));
+    EXPECT_EQ(static_cast<SgPolyMesh *>(morphOnly)->getQuadCount(), 2);
+    delete morphOnly;
+    EXPECT_EQ(SgFigureWelder::getMorphOnlyGeom(bones[1]), boneMesh(bones[1]));
+}
+
+TEST(HostWelder, OrderedBonesFollowTheFigureHierarchy) {
+    std::unique_ptr<SgSkeleton> a(sgTestMakeFigure(QStringLiteral("A"), 3, 1));
+    std::unique_ptr<SgSkeleton> b(sgTestMakeFigure(QStringLiteral("B"), 2, 1));
+    const SgBoneList ab = a->getAllBones();
+    const SgBoneList bb = b->getAllBones();
+    SgNode prop(QStringLiteral("prop"));
+    const SgBoneList ordered =
+        SgFigureWelder::getOrderedBones({ab[2], &prop, b.get(), ab[0], ab[2]});
+    EXPECT_EQ(ordered, (SgBoneList{ab[0], ab[2], bb[0], bb[1]}));
+
+    // A welder built on a list of bones welds them in that order, each once.
+    SgFigureWelder w(SgBoneList{ab[1], ab[0], ab[1], nullptr}, false, true, true, true, 0);
+    EXPECT_EQ(w.getBones(), (SgBoneList{ab[1], ab[0]}));
+    EXPECT_EQ(w.getGeometry()->getFaceGroupName(0), QStringLiteral("bone1"));
+    EXPECT_EQ(w.getGeometry()->getVertexCount(), 4 + 4 - 2);
+}
