@@ -1,0 +1,243 @@
+#include "enginetestsupport.h"
+
+#include "sgcore/morph/sgerclink.h"
+#include "sgcore/morph/sgmorph.h"
+#include "sgcore/morph/sgmorphdeltas.h"
+#include "sgcore/properties/sgfloatproperty.h"
+#include "sgcore/properties/sgintproperty.h"
+#include "sharedsource/engine/sgmorphloader.h"
+#include "sharedsource/engine/sgmorphloadlog.h"
+
+#include <QSignalSpy>
+
+#include <memory>
+
+using namespace enginetest;
+
+namespace {
+
+// Collects what the Qt warning and debug channels print while it lives.
+class MessageCatcher {
+public:
+    MessageCatcher() {
+        s_lines.clear();
+        m_previous = qInstallMessageHandler(&MessageCatcher::handle);
+    }
+    ~MessageCatcher() { qInstallMessageHandler(m_previous); }
+    QStringList lines() const { return s_lines; }
+
+private:
+    static void handle(QtMsgType, const QMessageLogContext &, const QString &text) {
+        s_lines << text;
+    }
+    static inline QStringList s_lines;
+    QtMessageHandler m_previous = nullptr;
+};
+
+SgERCLink *onlyLink(SgNumericProperty *channel) {
+    return channel->getControllerCount() == 1 ? dynamic_cast<SgERCLink *>(channel->getController(0))
+                                              : nullptr;
+}
+
+SgNumericProperty *channelOf(SgNode *node, const QString &morph) {
+    auto *m = dynamic_cast<SgMorph *>(node->getObject()->findModifier(morph));
+    return m ? m->getValueChannel() : nullptr;
+}
+
+// Two props that each move one vertex in the target, and a loader for the morph "Smile".
+struct TwoProps {
+    SgNode *a = makeNodeWithMesh("A", makeMesh(8));
+    SgNode *b = makeNodeWithMesh("B", makeMesh(8));
+    SgPolyMesh *target = copyVertices(*baseOf(a));
+    SgMorphLoader loader;
+    SgMorphLoadLog log;
+
+    TwoProps() {
+        sgApp->getScene()->addNode(a);
+        sgApp->getScene()->addNode(b);
+        target->setVertex(5, target->getVertex(5) + SgVec3(0, 2, 0));
+        target->ref();
+        loader.setMorphName("Smile");
+        loader.setMorphGroup("Morphs");
+    }
+    ~TwoProps() { target->unref(); }
+    void run() { loader.createMorphForNodes(target, {a, b}, log); }
+};
+
+} // namespace
+
+class ControlProperty : public EngineTest {};
+
+TEST_F(ControlProperty, WithoutControlNodeMorphsAreMadeUnlinkedWithOneWarningEach) {
+    TwoProps props;
+    MessageCatcher catcher;
+    props.run();
+    ASSERT_TRUE(channelOf(props.a, "Smile") && channelOf(props.b, "Smile"));
+    EXPECT_EQ(props.loader.controlProperty(), nullptr);
+    EXPECT_EQ(channelOf(props.a, "Smile")->getControllerCount(), 0);
+    EXPECT_EQ(catcher.lines(),
+              QStringList(2, "No control node in SgMorphLoader::setupMorph() - control link "
+                             "could not be created."));
+}
+
+TEST_F(ControlProperty, FirstMorphOnTheControlNodeDrivesTheOthers) {
+    TwoProps props;
+    QSignalSpy spy(&props.loader, &SgMorphLoader::controlPropertyChanged);
+    props.loader.setControlNode(props.a);
+    props.run();
+    SgNumericProperty *control = channelOf(props.a, "Smile");
+    ASSERT_TRUE(control);
+    EXPECT_EQ(props.loader.controlProperty(), control);
+    EXPECT_EQ(spy.count(), 1);
+    EXPECT_EQ(control->getControllerCount(), 0);
+    SgERCLink *link = onlyLink(channelOf(props.b, "Smile"));
+    ASSERT_TRUE(link);
+    EXPECT_EQ(link->getProperty(), control);
+
+    // Driving the control moves the other node's morph through the link.
+    control->setValue(0.5f);
+    EXPECT_NEAR(props.b->getObject()->getCachedGeom()->getVertex(5).y,
+                baseOf(props.b)->getVertex(5).y + 1.0f, 1e-5);
+}
+
+TEST_F(ControlProperty, NamesakeOnTheControlNodeIsReusedAndLinksCarryTypeScaleAndLabel) {
+    TwoProps props;
+    auto *controls = new SgNode("Controls");
+    scene()->addNode(controls);
+    auto *namesake = new SgFloatProperty("Smile");
+    controls->addProperty(namesake);
+    props.loader.setControlNode(controls);
+    props.loader.setUseCustomValue(true);
+    props.loader.setCustomValue(0.5f);
+    props.loader.setHideSecondary(true);
+    props.loader.setUseCustomLabel(true);
+    props.loader.setCustomLabel("p_Smile");
+    props.run();
+    EXPECT_EQ(props.loader.controlProperty(), namesake);
+    EXPECT_EQ(controls->getPropertyCount(), 1);
+    for (SgNode *node : {props.a, props.b}) {
+        SgNumericProperty *channel = channelOf(node, "Smile");
+        SgERCLink *link = onlyLink(channel);
+        ASSERT_TRUE(link);
+        EXPECT_EQ(link->getTypeName(), QString("ERC[DeltaAdd]"));
+        EXPECT_FLOAT_EQ(link->getScale(), 0.5f);
+        EXPECT_FLOAT_EQ(link->getOffset(), 0.0f);
+        EXPECT_TRUE(channel->isHidden());
+        EXPECT_EQ(channel->getLabel(), QString("p_Smile"));
+    }
+
+    // Another type ignores the custom value only when it is switched off.
+    TwoProps second;
+    second.loader.setMorphName("Frown");
+    second.loader.setControlNode(controls);
+    second.loader.setErcType(SgERCLink::Multiply);
+    second.run();
+    auto *created = dynamic_cast<SgFloatProperty *>(controls->findProperty("Frown"));
+    ASSERT_TRUE(created);
+    EXPECT_EQ(created->getLabel(), QString("Frown"));
+    EXPECT_EQ(created->getPath(), QString("Morphs"));
+    EXPECT_TRUE(created->getDisplayAsPercent());
+    EXPECT_TRUE(created->isUserProperty());
+    EXPECT_FLOAT_EQ(created->getMin(), -1.0f);
+    SgERCLink *link = onlyLink(channelOf(second.a, "Frown"));
+    ASSERT_TRUE(link);
+    EXPECT_EQ(link->getTypeName(), QString("ERC[Multiply]"));
+    EXPECT_FLOAT_EQ(link->getScale(), 1.0f);
+    EXPECT_FALSE(channelOf(second.a, "Frown")->isHidden());
+}
+
+TEST_F(ControlProperty, UnplacedPropertiesArePlacedOrDiscarded) {
+    auto *controls = new SgNode("Controls");
+    scene()->addNode(controls);
+
+    // A free property is placed on the control node.
+    {
+        SgMorphLoader loader;
+        auto *free = new SgFloatProperty("Dial");
+        loader.setControlProperty(free);
+        loader.setControlNode(controls);
+        loader.prepareControlProperty();
+        EXPECT_EQ(free->getOwner(), controls);
+    }
+    EXPECT_TRUE(controls->findProperty("Dial")); // placed: the loader leaves it
+
+    // A free namesake is dropped for the node's own property.
+    {
+        SgMorphLoader loader;
+        auto *free = new SgFloatProperty("Dial");
+        const auto life = free->getLifeToken();
+        loader.setControlProperty(free);
+        loader.setControlNode(controls);
+        loader.prepareControlProperty();
+        EXPECT_TRUE(life.expired());
+        EXPECT_EQ(loader.controlProperty(), controls->findProperty("Dial"));
+    }
+
+    // A control morph goes onto the control node's object, made for it when missing.
+    {
+        SgMorphLoader loader;
+        auto *morph = new SgMorph("Ctrl");
+        loader.setControlProperty(morph->getValueChannel());
+        loader.setControlNode(controls);
+        loader.prepareControlProperty();
+        ASSERT_TRUE(controls->getObject());
+        EXPECT_EQ(controls->getObject()->findModifier("Ctrl"), morph);
+    }
+
+    // Without a control node, replaced, or left at the end: an unplaced property is deleted.
+    MessageCatcher catcher;
+    std::weak_ptr<const void> lives[3];
+    {
+        SgMorphLoader loader;
+        auto *first = new SgFloatProperty("One");
+        lives[0] = first->getLifeToken();
+        loader.setControlProperty(first);
+        loader.prepareControlProperty();
+        EXPECT_EQ(loader.controlProperty(), nullptr);
+
+        auto *morph = new SgMorph("Two");
+        lives[1] = morph->getValueChannel()->getLifeToken();
+        loader.setControlProperty(morph->getValueChannel());
+        auto *third = new SgIntProperty("Three");
+        lives[2] = third->getLifeToken();
+        loader.setControlProperty(third);
+        EXPECT_TRUE(lives[1].expired());
+    }
+    EXPECT_TRUE(lives[0].expired());
+    EXPECT_TRUE(lives[2].expired());
+    EXPECT_EQ(catcher.lines(),
+              QStringList("No control node in SgMorphLoader::prepareControlProperty()!"));
+}
+
+TEST(ErcLink, EachTypeCombinesChannelAndControl) {
+    SgFloatProperty control("Control");
+    control.setValue(4.0f);
+    SgFloatProperty channel("Channel");
+    channel.setMin(-100.0f);
+    channel.setMax(100.0f);
+    const struct {
+        int type;
+        float expected;
+        const char *name;
+    } cases[] = {{SgERCLink::DeltaAdd, 2.0f + 0.5f * (4.0f - 1.0f), "ERC[DeltaAdd]"},
+                 {SgERCLink::DivideInto, 4.0f / 2.0f, "ERC[DivideInto]"},
+                 {SgERCLink::DivideBy, 2.0f / 4.0f, "ERC[DivideBy]"},
+                 {SgERCLink::Multiply, 8.0f, "ERC[Multiply]"},
+                 {SgERCLink::Subtract, -2.0f, "ERC[Subtract]"},
+                 {SgERCLink::Add, 6.0f, "ERC[Add]"}};
+    for (const auto &c : cases) {
+        SgERCLink link(c.type, &control, 0.5f, 1.0f);
+        EXPECT_FLOAT_EQ(link.evaluate(2.0f, channel), c.expected) << c.name;
+        EXPECT_EQ(link.getTypeName(), QString(c.name));
+    }
+
+    // Division by zero and a vanished control leave the channel's value alone.
+    control.setValue(0.0f);
+    EXPECT_FLOAT_EQ(SgERCLink(SgERCLink::DivideBy, &control, 1.0f, 0.0f).evaluate(3.0f, channel),
+                    3.0f);
+    auto *gone = new SgFloatProperty("Gone");
+    SgERCLink orphan(SgERCLink::Add, gone, 1.0f, 0.0f);
+    delete gone;
+    EXPECT_EQ(orphan.getLinkProperty(), nullptr);
+    EXPECT_FLOAT_EQ(orphan.evaluate(3.0f, channel), 3.0f);
+}

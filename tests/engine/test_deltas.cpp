@@ -1,0 +1,82 @@
+#include "enginetestsupport.h"
+
+#include "sgcore/morph/sgmorphdeltas.h"
+#include "sharedsource/engine/sgmorphloader.h"
+
+#include <cmath>
+#include <limits>
+#include <memory>
+
+using namespace enginetest;
+
+class Deltas : public EngineTest {};
+
+TEST_F(Deltas, ThresholdIsStrictlyAboveOneThousandth) {
+    std::unique_ptr<SgPolyMesh> base(makeMesh(200));
+    // Moved vertices sit at the origin, where 0.001 and 0.0011 are differences as written.
+    for (int i : {3, 70, 150, 199})
+        base->setVertex(i, SgVec3());
+    std::unique_ptr<SgPolyMesh> morph(copyVertices(*base));
+
+    // Exactly 0.001 (as a float) in one axis, in both directions: no delta.
+    morph->setVertex(3, base->getVertex(3) + SgVec3(0.001f, 0.0f, 0.0f));
+    morph->setVertex(150, base->getVertex(150) - SgVec3(0.0f, 0.0f, 0.001f));
+    EXPECT_EQ(SgMorphLoader::computeDeltas(*base, *morph), nullptr);
+
+    // 0.0011 gives an entry, in a quiet block and in the tail after the last full block.
+    const SgVec3 moved = SgVec3(0.0f, 0.0011f, 0.0f);
+    morph->setVertex(70, base->getVertex(70) + moved);
+    morph->setVertex(199, base->getVertex(199) - moved);
+    std::unique_ptr<SgMorphDeltas> deltas(SgMorphLoader::computeDeltas(*base, *morph));
+    ASSERT_TRUE(deltas);
+    EXPECT_EQ(deltas->getVertCount(), 200);
+    ASSERT_EQ(deltas->getNumEntries(), 2);
+    EXPECT_EQ(deltas->getVertex(0), 70);
+    EXPECT_NEAR(deltas->getDelta(0).y, 0.0011f, 1e-6);
+    EXPECT_EQ(deltas->getVertex(1), 199);
+    EXPECT_NEAR(deltas->getDelta(1).y, -0.0011f, 1e-6);
+}
+
+TEST_F(Deltas, CountMismatchAndInvalidTargetsGiveNoTable) {
+    std::unique_ptr<SgPolyMesh> base(makeMesh(12));
+    std::unique_ptr<SgPolyMesh> shorter(makeMesh(10, 1.0f));
+    EXPECT_EQ(SgMorphLoader::computeDeltas(*base, *shorter), nullptr);
+    EXPECT_EQ(statusLines().last(), QString("Vertex Count mismatch - delta calculation failed."));
+
+    // A coordinate that is not a number or infinite must never become a delta, wherever it is.
+    for (float bad :
+         {std::numeric_limits<float>::quiet_NaN(), std::numeric_limits<float>::infinity()}) {
+        for (int at : {0, 11}) {
+            std::unique_ptr<SgPolyMesh> morph(copyVertices(*base));
+            morph->setVertex(5, base->getVertex(5) + SgVec3(1.0f, 0.0f, 0.0f));
+            morph->setVertex(at, SgVec3(0.0f, bad, 0.0f));
+            EXPECT_EQ(SgMorphLoader::computeDeltas(*base, *morph), nullptr);
+            EXPECT_EQ(statusLines().last(),
+                      QString("Morph target has invalid coordinates - delta calculation failed."));
+        }
+    }
+}
+
+TEST_F(Deltas, TableKeepsVertexOrderAndAppliesWithWeight) {
+    SgMorphDeltas deltas;
+    deltas.setVertCount(10);
+    deltas.addDelta(5, SgVec3(1, 0, 0), false);
+    deltas.addDelta(2, SgVec3(0, 1, 0), false);
+    deltas.addDelta(5, SgVec3(2, 0, 0), false);
+    deltas.addDelta(8, SgVec3(0, 0, 1), true);
+    ASSERT_EQ(deltas.getNumEntries(), 3);
+    EXPECT_EQ(deltas.getVertex(0), 2);
+    EXPECT_EQ(deltas.getVertex(1), 5);
+    EXPECT_EQ(deltas.getDelta(1), SgVec3(2, 0, 0));
+    EXPECT_EQ(deltas.findEntry(8), 2);
+    EXPECT_EQ(deltas.findEntry(3), -1);
+
+    std::vector<SgVec3> points(6);
+    deltas.apply(points.data(), 6, 0.5f); // vertex 8 lies outside these points
+    EXPECT_EQ(points[2], SgVec3(0, 0.5f, 0));
+    EXPECT_EQ(points[5], SgVec3(1, 0, 0));
+
+    deltas.filter([](int vertex) { return vertex != 5; });
+    EXPECT_EQ(deltas.getNumEntries(), 2);
+    EXPECT_FALSE(deltas.hasVertex(5));
+}

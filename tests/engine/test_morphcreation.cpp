@@ -1,0 +1,283 @@
+#include "enginetestsupport.h"
+
+#include "sgcore/morph/sgerclink.h"
+#include "sgcore/morph/sgmorph.h"
+#include "sgcore/morph/sgmorphdeltas.h"
+#include "sgcore/properties/sgfloatproperty.h"
+#include "sharedsource/engine/sgmorphloader.h"
+#include "sharedsource/engine/sgmorphloadlog.h"
+
+#include <memory>
+
+using namespace enginetest;
+
+namespace {
+
+SgMorph *morphOn(SgNode *node, const QString &name) {
+    return dynamic_cast<SgMorph *>(node->getObject()->findModifier(name));
+}
+
+// A 12-vertex prop in the scene and a loader that makes the morph "Smile" in "Morphs/Face".
+struct Prop {
+    SgNode *node = makeNodeWithMesh("Box", makeMesh(12));
+    SgMorphLoader loader;
+    SgMorphLoadLog log;
+
+    Prop() {
+        sgApp->getScene()->addNode(node);
+        loader.setMorphName("Smile");
+        loader.setMorphGroup("Morphs/Face");
+        loader.setCreateControl(false);
+    }
+    // A target with vertex `vertex` moved by `by`.
+    SgPolyMesh *target(int vertex, const SgVec3 &by) const {
+        SgPolyMesh *mesh = copyVertices(*baseOf(node));
+        mesh->setVertex(vertex, mesh->getVertex(vertex) + by);
+        return mesh;
+    }
+    void create(SgPolyMesh *target) {
+        target->ref();
+        loader.createMorphForNode(target, node, log);
+        target->unref();
+    }
+};
+
+} // namespace
+
+class MorphCreation : public EngineTest {};
+
+TEST_F(MorphCreation, NewMorphCarriesDeltasChannelSettingsAndLogEntries) {
+    Prop prop;
+    prop.create(prop.target(4, SgVec3(0, 0.5f, 0)));
+    EXPECT_EQ(prop.log.toHtml(), QString("<HTML><HEAD></HEAD><BODY>\nCreated morph successfully."
+                                         "<BR>\n</BODY>"));
+    SgMorph *morph = morphOn(prop.node, "Smile");
+    ASSERT_TRUE(morph);
+    ASSERT_EQ(morph->getDeltas()->getNumEntries(), 1);
+    EXPECT_EQ(morph->getDeltas()->getVertex(0), 4);
+    SgFloatProperty *channel = morph->getValueChannel();
+    EXPECT_EQ(channel->getOwner(), morph);
+    EXPECT_EQ(channel->getPath(), QString("Morphs/Face"));
+    EXPECT_FLOAT_EQ(channel->getMin(), -1.0f);
+    EXPECT_FLOAT_EQ(channel->getMax(), 1.0f);
+    EXPECT_TRUE(channel->isClamped());
+    EXPECT_TRUE(logLines().contains("Creating morph for Box..."));
+    EXPECT_TRUE(logLines().contains("Morph contains 1 deltas"));
+
+    // The channel drives the cached geometry, clamped to its range.
+    channel->setValue(2.0f);
+    const SgVertexMesh *shown = prop.node->getObject()->getCachedGeom();
+    EXPECT_NEAR(shown->getVertex(4).y, baseOf(prop.node)->getVertex(4).y + 0.5f, 1e-6);
+}
+
+TEST_F(MorphCreation, UnchangedOrMismatchedTargetsLeaveTheNodeAlone) {
+    Prop prop;
+    prop.create(copyVertices(*baseOf(prop.node)));
+    EXPECT_TRUE(logLines().contains("No deltas for morph, skipping node."));
+    EXPECT_EQ(prop.node->getObject()->getModifierCount(), 0);
+    EXPECT_TRUE(prop.log.hasProblems());
+    EXPECT_TRUE(prop.log.toHtml().contains("Geometry did not match, failed to create morph."));
+
+    SgMorphLoadLog second;
+    std::unique_ptr<SgPolyMesh> shorter(makeMesh(10, 1.0f));
+    shorter->ref();
+    prop.loader.createMorphForNode(shorter.get(), prop.node, second);
+    EXPECT_EQ(statusLines().last(), QString("Vertex Count mismatch 12:10 (Base:Morph)."));
+    EXPECT_EQ(prop.node->getObject()->getModifierCount(), 0);
+    shorter.release()->unref();
+
+    // A node without an object is skipped with its own log line.
+    SgNode bare("Empty");
+    SgNumericProperty *channel = nullptr;
+    EXPECT_FALSE(prop.loader.createMorph(&bare, baseOf(prop.node), false, channel));
+    EXPECT_EQ(logLines().last(), QString("No object found, skipping node."));
+}
+
+TEST_F(MorphCreation, MakeUniqueAsksUntilTheNameIsFreeOrTheUserCancels) {
+    Prop prop;
+    prop.create(prop.target(1, SgVec3(1, 0, 0)));
+    ASSERT_TRUE(morphOn(prop.node, "Smile"));
+
+    // The first answer is taken too, the second is free.
+    SgPolyMesh *target = prop.target(2, SgVec3(1, 0, 0));
+    target->ref();
+    int asked = 0;
+    QString title, label;
+    whenModal([&](QWidget *first) {
+        ++asked;
+        title = first->windowTitle();
+        label = static_cast<QInputDialog *>(first)->labelText();
+        answerInput("Grin");
+        static_cast<QInputDialog *>(first)->setTextValue("Smile");
+        static_cast<QInputDialog *>(first)->accept();
+    });
+    prop.loader.createMorphForNode(target, prop.node, prop.log);
+    EXPECT_EQ(asked, 1);
+    EXPECT_EQ(title, QString("Morph Already Exists"));
+    EXPECT_EQ(label, QString("A morph named \"Smile\" already exists. Please enter a new name for "
+                             "the morph:"));
+    EXPECT_EQ(prop.loader.morphName(), QString("Grin"));
+    ASSERT_TRUE(morphOn(prop.node, "Grin"));
+    EXPECT_EQ(morphOn(prop.node, "Grin")->getDeltas()->getVertex(0), 2);
+
+    SgMorphLoadLog cancelled;
+    prop.loader.setMorphName("Smile");
+    answerInput(QString(), false);
+    prop.loader.createMorphForNode(target, prop.node, cancelled);
+    EXPECT_EQ(cancelled.toHtml(), QString("<HTML><HEAD></HEAD><BODY>\n<FONT COLOR=#0000ff>"
+                                          "Warning: </FONT>User cancelled.<BR>\n</BODY>"));
+    EXPECT_EQ(prop.node->getObject()->getModifierCount(), 2);
+    target->unref();
+}
+
+TEST_F(MorphCreation, OverrideReplacesDeltasKeepsPlaceAndHandlesLinks) {
+    Prop prop;
+    auto *controls = new SgNode("Controls");
+    scene()->addNode(controls);
+    prop.loader.setCreateControl(true);
+    prop.loader.setControlNode(controls);
+    prop.create(prop.target(1, SgVec3(1, 0, 0)));
+    prop.loader.setMorphName("Other");
+    prop.create(prop.target(2, SgVec3(1, 0, 0)));
+    SgMorph *smile = morphOn(prop.node, "Smile");
+    ASSERT_TRUE(smile);
+    ASSERT_EQ(smile->getValueChannel()->getControllerCount(), 1);
+    auto *control = dynamic_cast<SgFloatProperty *>(controls->findProperty("Smile"));
+    ASSERT_TRUE(control);
+
+    // Deltas Only, twice: new deltas, the one link kept and not doubled, same stack place.
+    prop.loader.setMorphName("Smile");
+    prop.loader.setOverride(SgMorphLoader::DeltasOnly);
+    prop.loader.setControlProperty(nullptr);
+    for (int run = 0; run < 2; ++run) {
+        prop.loader.setControlProperty(control);
+        prop.create(prop.target(7, SgVec3(0, 0, 1)));
+    }
+    EXPECT_EQ(morphOn(prop.node, "Smile"), smile);
+    EXPECT_EQ(prop.node->getObject()->getModifierIndex(smile), 0);
+    EXPECT_EQ(smile->getDeltas()->getVertex(0), 7);
+    EXPECT_EQ(smile->getValueChannel()->getControllerCount(), 1);
+
+    // Deltas and ERC Links: a foreign controller goes, and one new link comes.
+    SgFloatProperty foreign("Foreign");
+    smile->getValueChannel()->insertController(
+        new SgERCLink(SgERCLink::Multiply, &foreign, 1.0f, 0.0f));
+    prop.loader.setOverride(SgMorphLoader::DeltasAndLinks);
+    prop.create(prop.target(9, SgVec3(0, 0, 1)));
+    EXPECT_EQ(smile->getDeltas()->getVertex(0), 9);
+    ASSERT_EQ(smile->getValueChannel()->getControllerCount(), 1);
+    auto *link = dynamic_cast<SgERCLink *>(smile->getValueChannel()->getController(0));
+    ASSERT_TRUE(link);
+    EXPECT_EQ(link->getProperty(), control);
+    EXPECT_EQ(prop.node->getObject()->getModifierIndex(smile), 0);
+}
+
+TEST_F(MorphCreation, OrphanCleanUpRemovesUnlinkedMorphsOnlyWhenOverriding) {
+    Prop prop;
+    prop.create(prop.target(1, SgVec3(1, 0, 0))); // "Smile" without any link
+    prop.loader.setOverride(SgMorphLoader::DeltasAndLinks);
+
+    prop.loader.setCleanUpOrphans(false);
+    prop.create(copyVertices(*baseOf(prop.node)));
+    EXPECT_TRUE(morphOn(prop.node, "Smile"));
+
+    prop.loader.setCleanUpOrphans(true);
+    prop.create(copyVertices(*baseOf(prop.node)));
+    EXPECT_FALSE(morphOn(prop.node, "Smile"));
+}
+
+namespace {
+
+// A figure "Fig" with bones head, neck (labelled "Neck", named "b2") and hip, each with its own
+// mesh, and a welded-style target whose face groups address the bones' vertices out of order.
+struct Figure {
+    SgSkeleton *figure = new SgSkeleton("Fig");
+    SgBone *head = makeNodeWithMesh<SgBone>("head", makeMesh(6));
+    SgBone *neck = makeNodeWithMesh<SgBone>("b2", makeMesh(4, 10.0f));
+    SgBone *hip = makeNodeWithMesh<SgBone>("hip", makeMesh(4, 20.0f));
+    SgPolyMesh *target = new SgPolyMesh;
+    // Source vertex of each bone vertex, in ascending order.
+    std::vector<int> headSource{1, 3, 5, 7, 9, 11};
+    std::vector<int> neckSource{0, 2, 4, 6};
+    std::vector<int> hipSource{12, 13, 14, 15};
+
+    Figure() {
+        neck->setLabel("Neck");
+        figure->addBone(hip);
+        figure->addBone(neck, hip);
+        figure->addBone(head, neck);
+        sgApp->getScene()->addNode(figure);
+
+        target->beginEdit(true);
+        SgVec3 *v = target->setVertexArray(17);
+        place(v, head, headSource);
+        place(v, neck, neckSource);
+        place(v, hip, hipSource);
+        v[16] = SgVec3(99, 99, 99);
+        face(target->addFaceGroup("head"), {9, 3, 7, 1});
+        face(target->addFaceGroup("head"), {11, 5, 3});
+        face(target->addFaceGroup("Neck"), {6, 4, 2, 0});
+        face(target->addFaceGroup("hip"), {15, 14, 13, 12});
+        face(target->addFaceGroup("BODY"), {16, 0, 1});
+        target->finishEdit();
+        target->ref();
+    }
+    ~Figure() { target->unref(); }
+
+    void place(SgVec3 *v, SgBone *bone, const std::vector<int> &source) {
+        for (size_t k = 0; k < source.size(); ++k)
+            v[source[k]] = baseOf(bone)->getVertex(int(k));
+    }
+    void face(int group, std::initializer_list<int> corners) {
+        target->setActiveFaceGroup(group);
+        target->startFace();
+        for (int c : corners)
+            target->addFaceEdge(c);
+        target->finishFace();
+    }
+    void move(int source, const SgVec3 &by) {
+        target->setVertex(source, target->getVertex(source) + by);
+    }
+};
+
+} // namespace
+
+TEST_F(MorphCreation, NodeListMatchesBoneGroupsByNameOrLabelAndFiguresByBody) {
+    Figure fig;
+    fig.move(7, SgVec3(0, 1, 0));  // head vertex 3
+    fig.move(4, SgVec3(0, 0, -1)); // neck vertex 2
+    SgMorphLoader loader;
+    loader.setMorphName("Sculpt");
+    loader.setCreateControl(false);
+    SgMorphLoadLog log;
+    loader.createMorphForNodes(fig.target, {fig.hip, fig.neck, fig.head}, log);
+    EXPECT_EQ(log.toHtml(), QString("<HTML><HEAD></HEAD><BODY>\nCreated morph successfully."
+                                    "<BR>\n</BODY>"));
+    EXPECT_FALSE(morphOn(fig.hip, "Sculpt"));
+    SgMorph *head = morphOn(fig.head, "Sculpt");
+    SgMorph *neck = morphOn(fig.neck, "Sculpt");
+    ASSERT_TRUE(head && neck);
+    ASSERT_EQ(head->getDeltas()->getNumEntries(), 1);
+    EXPECT_EQ(head->getDeltas()->getVertex(0), 3);
+    EXPECT_EQ(head->getDeltas()->getDelta(0), SgVec3(0, 1, 0));
+    EXPECT_EQ(neck->getDeltas()->getVertex(0), 2);
+
+    // The figure itself takes the group "BODY" (3 vertices: 0, 1, 16).
+    auto *body = makeNodeWithMesh<SgSkeleton>("Body", makeMesh(3));
+    scene()->addNode(body);
+    std::unique_ptr<SgVertexMesh> group(loader.groupGeometry(body, fig.target));
+    ASSERT_TRUE(group);
+    ASSERT_EQ(group->getVertexCount(), 3);
+    EXPECT_EQ(group->getVertex(2), SgVec3(99, 99, 99));
+    group.release()->unref();
+
+    // A bone without a group of its name gets nothing, and the log says so.
+    auto *tail = makeNodeWithMesh<SgBone>("tail", makeMesh(4));
+    fig.figure->addBone(tail, fig.hip);
+    scene()->addNode(tail);
+    SgMorphLoadLog none;
+    loader.setMorphName("Other");
+    loader.createMorphForNodes(fig.target, {tail}, none);
+    EXPECT_TRUE(logLines().contains("No morph geometry found, skipping node."));
+    EXPECT_TRUE(none.toHtml().contains("Geometry did not match, no morphs created."));
+}
