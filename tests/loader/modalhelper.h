@@ -1,7 +1,9 @@
 #pragma once
 
 #include <QString>
+#include <QStringList>
 #include <functional>
+#include <ostream>
 
 class QMenu;
 class QMessageBox;
@@ -30,3 +32,8 @@ ModalAnswer::Handler chooseMenuEntry(const QString &text, QStringList *seen = nu
 ModalAnswer::Handler closeMessageBox(QString *title, QString *text);
 // The texts of a menu's entries, separators as "-".
 QStringList menuEntries(const QMenu *menu);
+
+// Readable QString values in test failure messages.
+inline void PrintTo(const QString &text, std::ostream *out) {
+    *out << '"' << text.toStdString() << '"';
+}
