@@ -1,6 +1,7 @@
 #include "sgcore/app/sgimportmgr.h"
 
 #include "sgcore/app/sgimporter.h"
+#include "sgcore/importer/sggeometryimporter.h"
 
 #include <QString>
 
@@ -57,4 +58,34 @@ bool SgImportMgr::registerDefaultImporter(Factory factory) {
         factories().push_back(std::move(factory));
     }
     return true;
+}
+
+void SgImportMgr::makeGeometryFileFilter(QString &filter, const QString &preferred,
+                                         bool withAllFiles) const {
+    QStringList allPatterns;
+    QStringList entries;
+    for (const auto &importer : m_importers) {
+        if (!dynamic_cast<const SgGeometryImporter *>(importer.get()))
+            continue;
+        QStringList patterns;
+        for (const QString &extension : importer->getExtensions())
+            patterns << QStringLiteral("*.") + extension;
+        allPatterns << patterns;
+        const QString entry =
+            QStringLiteral("%1 (%2)").arg(importer->getName(), patterns.join(QLatin1Char(' ')));
+        const bool first = !preferred.isEmpty() &&
+                           (importer->getName().compare(preferred, Qt::CaseInsensitive) == 0 ||
+                            importer->getExtensions().contains(preferred.toLower()));
+        if (first)
+            entries.prepend(entry);
+        else
+            entries.append(entry);
+    }
+    allPatterns.removeDuplicates();
+    QStringList parts;
+    parts << QStringLiteral("Geometry Files (%1)").arg(allPatterns.join(QLatin1Char(' ')));
+    parts << entries;
+    if (withAllFiles)
+        parts << QStringLiteral("All Files (*)");
+    filter = parts.join(QStringLiteral(";;"));
 }

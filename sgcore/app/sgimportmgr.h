@@ -30,6 +30,16 @@ public:
     // The first importer (registration order) that takes `fileName` (SgImporter::canImport),
     // or null.
     SgImporter *findImporterFor(const QString &fileName) const;
+    // The same as findImporterFor: the importer for `fileName`, or null.
+    SgImporter *findImporter(const QString &fileName) const { return findImporterFor(fileName); }
+
+    // Builds the open-file filter for geometry files into `filter` (replacing its contents):
+    // an entry "Geometry Files (...)" with the patterns of every geometry importer
+    // (SgGeometryImporter), then one entry per geometry importer ("Wavefront OBJ (*.obj)") in
+    // registration order, except that the importer named `preferred` (by name or extension,
+    // without case) comes first of those when given; with `withAllFiles` a last entry
+    // "All Files (*)". Entries are separated by ";;". O(importers).
+    void makeGeometryFileFilter(QString &filter, const QString &preferred, bool withAllFiles) const;
 
     // Registers a factory for every manager made from now on; returns true (so that it can
     // initialise a static).
