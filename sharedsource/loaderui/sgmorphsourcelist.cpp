@@ -63,7 +63,7 @@ QStringList localFiles(const QMimeData *data) {
 // Whether a geometry importer takes `file` (the manager keeps its importers).
 bool isGeometryFile(const QString &file) {
     SgImportMgr *manager = sgApp->getImportMgr();
-    return manager && dynamic_cast<SgGeometryImporter *>(manager->findImporterFor(file)) != nullptr;
+    return manager && dynamic_cast<SgGeometryImporter *>(manager->findImporter(file)) != nullptr;
 }
 } // namespace
 
