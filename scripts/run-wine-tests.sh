@@ -9,6 +9,8 @@ cd "$(dirname "$0")/.."
 ROOT=$PWD
 BUILD=${SG_WIN32_BUILD_DIR:-$ROOT/build-win32}
 WINE=${SG_WINE:-/usr/lib/wine/wine64}
+WINESERVER=${SG_WINESERVER:-/usr/lib/wine/wineserver}
+[ -x "$WINESERVER" ] || WINESERVER=wineserver
 TEST_EXE=$BUILD/tests/shm/shm_win32_test.exe
 export WINEPREFIX=${SG_WINEPREFIX:-$BUILD/wineprefix}
 export WINEDEBUG=-all
@@ -27,11 +29,11 @@ else
 fi
 
 # Stop the prefix's wine server however the run ends, so that nothing stays behind.
-trap 'wineserver -k >/dev/null 2>&1 || true' EXIT
+trap '"$WINESERVER" -k >/dev/null 2>&1 || true' EXIT
 if [ ! -f "$WINEPREFIX/system.reg" ]; then
     echo "== creating the Wine prefix $WINEPREFIX (once)"
     timeout 300 "$WINE" wineboot --init >/dev/null 2>&1
-    wineserver -w
+    "$WINESERVER" -w
 fi
 echo "== Win32 segment tests under Wine"
 timeout 300 "$WINE" "$TEST_EXE"

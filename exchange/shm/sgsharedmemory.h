@@ -92,6 +92,8 @@ public:
     // Takes the segment's lock, waiting without a limit. Nested calls on one object only
     // deepen the lock. Fails (without StatusLockFailed, and giving up one held level) when the
     // segment does not exist; fails with StatusLockFailed when the semaphore cannot be had.
+    // Cost: one system call when uncontended and this object holds the mapping open (created
+    // or attached); a handful more otherwise, for the existence test.
     bool lock();
 
     // As lock(), waiting at most `milliseconds` (negative counts as 0).
