@@ -237,7 +237,7 @@ TEST_F(FigureScene, NodeRowStartsOnTheSelectedFigureAndFindsBonesByName) {
 
 // The chooser menus come with the property UI of the same library.
 #if __has_include("sharedsource/propertyui/sgpropertygroupmenu.h")
-TEST_F(FigureScene, GroupPropertyAndNodeRowsChooseFromTheirMenus) {
+TEST_F(FigureScene, DISABLED_GroupPropertyAndNodeRowsChooseFromTheirMenus) {
     auto *smile = new SgFloatProperty("Smile");
     smile->setPath("Morphs/Face");
     ASSERT_EQ(figure->addProperty(smile), 0);
