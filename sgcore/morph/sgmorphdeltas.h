@@ -71,6 +71,10 @@ public:
     // Raw entry arrays (parallel, ascending vertex order), for fast readers.
     const std::vector<int> &vertices() const { return m_vertices; }
     const std::vector<SgVec3> &deltas() const { return m_deltas; }
+    // The same arrays for fast producers that fill many entries at once: whoever writes them
+    // keeps them parallel, in strictly ascending vertex order and below the vertex count.
+    std::vector<int> &vertexArray() { return m_vertices; }
+    std::vector<SgVec3> &deltaArray() { return m_deltas; }
 
 private:
     void insertDelta(int vertex, const SgVec3 &delta, bool last);

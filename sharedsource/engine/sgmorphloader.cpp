@@ -104,8 +104,11 @@ std::unique_ptr<SgMorphDeltas> makeDeltas(const SgVertexMesh &base, const SgVert
     const SgVec3 *m = morph.getVertices();
     const float *bf = reinterpret_cast<const float *>(b);
     const float *mf = reinterpret_cast<const float *>(m);
-    std::unique_ptr<SgMorphDeltas> deltas;
     const size_t n = size_t(count);
+
+    std::unique_ptr<SgMorphDeltas> deltas;
+    size_t used = 0;
+    bool invalid = false;
     for (size_t start = 0; start < n; start += kScanBlock) {
         const size_t end = std::min(start + kScanBlock, n);
         if (end - start == kScanBlock) {
@@ -119,24 +122,47 @@ std::unique_ptr<SgMorphDeltas> makeDeltas(const SgVertexMesh &base, const SgVert
             if (!moved)
                 continue;
         }
+        if (!deltas) {
+            // Room for every vertex from here on (reserved, not yet written); each block with
+            // motion then extends the arrays while they are in the cache.
+            deltas = std::make_unique<SgMorphDeltas>();
+            deltas->setVertCount(count);
+            deltas->reserve(int(n - start));
+        }
+        deltas->vertexArray().resize(used + (end - start));
+        deltas->deltaArray().resize(used + (end - start));
+        int *vertexOut = deltas->vertexArray().data();
+        SgVec3 *deltaOut = deltas->deltaArray().data();
+        // Every vertex is written; only a moved one advances the output (no branch to
+        // mispredict when about half of a block moves).
         for (size_t i = start; i < end; ++i) {
             const SgVec3 d = m[i] - b[i];
-            if (std::fabs(d.x) <= kDeltaThreshold && std::fabs(d.y) <= kDeltaThreshold &&
-                std::fabs(d.z) <= kDeltaThreshold)
-                continue;
-            if (!std::isfinite(d.x + d.y + d.z)) {
-                outcome = DeltaOutcome::InvalidTarget;
-                return nullptr;
-            }
-            if (!deltas) {
-                deltas = std::make_unique<SgMorphDeltas>();
-                deltas->setVertCount(count);
-                deltas->reserve(int(n - i));
-            }
-            deltas->addDelta(int(i), d, false);
+            const bool moved =
+                !(std::fabs(d.x) <= kDeltaThreshold && std::fabs(d.y) <= kDeltaThreshold &&
+                  std::fabs(d.z) <= kDeltaThreshold);
+            invalid |= moved && !std::isfinite(d.x + d.y + d.z);
+            vertexOut[used] = int(i);
+            deltaOut[used] = d;
+            used += moved;
         }
     }
-    outcome = deltas ? DeltaOutcome::Made : DeltaOutcome::NoDeltas;
+    if (invalid) {
+        outcome = DeltaOutcome::InvalidTarget;
+        return nullptr;
+    }
+    if (!deltas || used == 0) {
+        outcome = DeltaOutcome::NoDeltas;
+        return nullptr;
+    }
+    std::vector<int> &vertices = deltas->vertexArray();
+    std::vector<SgVec3> &values = deltas->deltaArray();
+    vertices.resize(used);
+    values.resize(used);
+    if (used < vertices.capacity() / 2) {
+        vertices.shrink_to_fit();
+        values.shrink_to_fit();
+    }
+    outcome = DeltaOutcome::Made;
     return deltas;
 }
 

@@ -1,7 +1,7 @@
 #pragma once
 
-// Shared set-up of the engine tests: one QApplication and one SgApp for the whole run, small
-// scenes built in code, and helpers that answer modal dialogs from inside their event loops.
+// Shared set-up of the engine tests: small scenes built in code, and helpers that answer modal
+// dialogs from inside their event loops (the test main closes any that stay open).
 
 #include "sgcore/app/sgapp.h"
 #include "sgcore/app/sgmessagesink.h"
@@ -24,29 +24,23 @@
 #include <gtest/gtest.h>
 
 #include <functional>
+#include <memory>
 #include <vector>
 
 namespace enginetest {
 
-// Answers the next modal dialog with `answer` from inside its event loop; a modal that is still
-// open after a few seconds is closed so that a broken test fails instead of hanging.
+// Answers the next modal dialog with `answer` from inside its event loop (gives up after 5 s).
 inline void whenModal(std::function<void(QWidget *)> answer) {
     auto *timer = new QTimer;
-    auto *elapsed = new int(0);
-    QObject::connect(timer, &QTimer::timeout, [timer, elapsed, answer]() {
+    auto ticks = std::make_shared<int>(0);
+    QObject::connect(timer, &QTimer::timeout, [timer, ticks, answer]() {
         QWidget *modal = QApplication::activeModalWidget();
-        if (modal) {
+        if (modal || ++*ticks > 500) {
             timer->stop();
             timer->deleteLater();
-            delete elapsed;
+        }
+        if (modal)
             answer(modal);
-            return;
-        }
-        if ((*elapsed += 10) > 5000) {
-            timer->stop();
-            timer->deleteLater();
-            delete elapsed;
-        }
     });
     timer->start(10);
 }

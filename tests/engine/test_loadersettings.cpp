@@ -3,29 +3,6 @@
 #include <QSignalSpy>
 #include <gtest/gtest.h>
 
-TEST(MorphLoaderSettings, DefaultsMatchANewSource) {
-    SgMorphLoader loader;
-    EXPECT_TRUE(loader.createControl());
-    EXPECT_FALSE(loader.useCustomValue());
-    EXPECT_FALSE(loader.useCustomLabel());
-    EXPECT_FALSE(loader.applyAfterJoint());
-    EXPECT_FALSE(loader.hideSecondary());
-    EXPECT_FALSE(loader.reverseModifiers());
-    EXPECT_FLOAT_EQ(loader.customValue(), 1.0f);
-    EXPECT_TRUE(loader.filename().isEmpty());
-    EXPECT_EQ(loader.controlNode(), nullptr);
-    EXPECT_EQ(loader.controlProperty(), nullptr);
-    EXPECT_FALSE(loader.scenaraExported());
-    EXPECT_TRUE(loader.ignoredInvisibleNodes());
-    EXPECT_FALSE(loader.weldedGeometry());
-    EXPECT_FALSE(loader.removedUnusedVertices());
-    EXPECT_FALSE(loader.fourthWeldFlag());
-    EXPECT_EQ(loader.ercType(), 0);
-    EXPECT_EQ(loader.override(), 0);
-    EXPECT_TRUE(loader.cleanUpOrphans());
-    EXPECT_EQ(loader.parent(), nullptr);
-}
-
 TEST(MorphLoaderSettings, SettersEmitOnlyOnChange) {
     SgMorphLoader loader;
     QSignalSpy name(&loader, &SgMorphLoader::morphNameChanged);

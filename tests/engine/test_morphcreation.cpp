@@ -4,8 +4,11 @@
 #include "sgcore/morph/sgmorph.h"
 #include "sgcore/morph/sgmorphdeltas.h"
 #include "sgcore/properties/sgfloatproperty.h"
+#include "sgcore/scene/sgfigurewelder.h"
 #include "sharedsource/engine/sgmorphloader.h"
 #include "sharedsource/engine/sgmorphloadlog.h"
+
+#include "tests/support/sgtestfigure.h"
 
 #include <memory>
 
@@ -280,4 +283,55 @@ TEST_F(MorphCreation, NodeListMatchesBoneGroupsByNameOrLabelAndFiguresByBody) {
     loader.createMorphForNodes(fig.target, {tail}, none);
     EXPECT_TRUE(logLines().contains("No morph geometry found, skipping node."));
     EXPECT_TRUE(none.toHtml().contains("Geometry did not match, no morphs created."));
+}
+
+TEST_F(MorphCreation, WeldedFigureTargetsBecomeOneLinkedMorphPerMovedBone) {
+    SgSkeleton *figure = sgTestMakeFigure("Fig", 3, 2);
+    scene()->addNode(figure);
+    const SgBoneList bones = figure->getAllBones();
+    SgFigureWelder welder(figure, false, true, true, true);
+    std::unique_ptr<SgPolyMesh> edited(copyVertices(*welder.getGeometry()));
+    edited->ref();
+
+    SgMorphLoader loader;
+    loader.setMorphName("Bulge");
+    loader.setControlNode(figure);
+    loader.setScenaraExported(true);
+    loader.setIgnoredInvisibleNodes(false);
+    loader.setWeldedGeometry(true);
+    loader.setRemovedUnusedVertices(true);
+    loader.setFourthWeldFlag(true);
+    const QList<SgNode *> targets(bones.begin(), bones.end());
+
+    SgMorphLoadLog unchanged;
+    loader.createMorphForNodes(edited.get(), targets, unchanged);
+    EXPECT_TRUE(unchanged.toHtml().contains("Geometry did not match, no morphs created."));
+
+    // Move the seam vertex that bone 0 and bone 1 share (x = 1, y = 0).
+    int seam = -1;
+    for (int i = 0; i < edited->getVertexCount(); ++i)
+        if (edited->getVertex(i) == SgVec3(1, 0, 0))
+            seam = i;
+    ASSERT_GE(seam, 0);
+    edited->setVertex(seam, SgVec3(1, -0.5f, 0));
+    sgApp->startProgress("Creating Morphs", 3);
+    SgMorphLoadLog log;
+    loader.createMorphForNodes(edited.get(), targets, log);
+    EXPECT_EQ(sgApp->getMessageSink()->progressRuns().last().steps, 3);
+    sgApp->finishProgress();
+    EXPECT_FALSE(log.hasProblems());
+    auto *control = dynamic_cast<SgFloatProperty *>(figure->findProperty("Bulge"));
+    ASSERT_TRUE(control);
+    for (int b = 0; b < 3; ++b) {
+        SgMorph *morph = morphOn(bones[b], "Bulge");
+        ASSERT_EQ(morph != nullptr, b < 2) << b;
+        if (!morph)
+            continue;
+        ASSERT_EQ(morph->getDeltas()->getNumEntries(), 1);
+        EXPECT_EQ(morph->getDeltas()->getDelta(0), SgVec3(0, -0.5f, 0));
+        auto *link = dynamic_cast<SgERCLink *>(morph->getValueChannel()->getController(0));
+        ASSERT_TRUE(link);
+        EXPECT_EQ(link->getProperty(), control);
+    }
+    edited.release()->unref();
 }

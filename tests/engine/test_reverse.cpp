@@ -5,6 +5,7 @@
 #include "sgcore/morph/sgmorphdeltas.h"
 #include "sgcore/morph/sgrigidskinbinding.h"
 #include "sgcore/properties/sgfloatproperty.h"
+#include "sgcore/script/sgscript.h"
 #include "sharedsource/engine/sgmorphloader.h"
 #include "sharedsource/engine/sgmorphloadlog.h"
 
@@ -124,4 +125,33 @@ TEST_F(ReverseDeformations, PoseFileRunsOrAsksWhetherToGoOn) {
 
     loader.setPoseFile("None");
     EXPECT_TRUE(loader.applyPose());
+}
+
+TEST_F(ReverseDeformations, ScriptsAreCheckedBeforeTheyRunAndReportTheirErrors) {
+    Arm arm;
+    EXPECT_TRUE(SgScript::isScriptFile("/a/pose.SGS"));
+    EXPECT_TRUE(SgScript::isScriptFile("pose.js"));
+    EXPECT_TRUE(SgScript::isScriptFile("pose.sgb"));
+    EXPECT_FALSE(SgScript::isScriptFile("pose.obj"));
+
+    QTemporaryDir dir;
+    const auto write = [&](const QString &name, const QByteArray &text) {
+        QFile file(dir.filePath(name));
+        file.open(QIODevice::WriteOnly);
+        file.write(text);
+        return file.fileName();
+    };
+    SgScript script;
+    // A syntax error fails the load without running the lines before it.
+    EXPECT_FALSE(script.loadFromFile(
+        write("broken.sgs", "scene.setRotation('lower', 90, 0, 0);\nscene.(;\n"), true));
+    EXPECT_TRUE(arm.lower->getLocalRot().isIdentity());
+    EXPECT_FALSE(script.execute());
+    EXPECT_FALSE(script.loadFromFile(write("compiled.sgb", "scene.resetPose('Arm');"), true));
+
+    // A script that throws stops there and names its line in the host log.
+    ASSERT_TRUE(script.loadFromFile(
+        write("throws.js", "scene.setMorph('lower', 'Fix', 1);\nnoSuchCall();\n"), true));
+    EXPECT_FALSE(script.execute());
+    EXPECT_TRUE(logLines().last().contains("line 2")) << logLines().last().toStdString();
 }
