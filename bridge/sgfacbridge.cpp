@@ -266,12 +266,10 @@ void SgFacBridge::sendNext() {
     }
     {
         SgExchangeWriter writer(m_sendList[0], QString());
-        const int32_t size = writer.getMeasuredSize();
+        const int32_t size = writer.getSize();
         if (m_data->create(size) && m_data->attach(SgSharedMemory::kReadWrite) && m_data->lock()) {
-            // The writer fills exactly the measured size; a segment that came out smaller is
-            // left unwritten rather than overrun.
-            if (m_data->size() >= size)
-                writer.write(m_data->data());
+            // Never past the segment as it came out, whatever the measure said.
+            writer.write(m_data->data(), m_data->size());
             m_data->unlock();
         }
     }
