@@ -1,0 +1,290 @@
+// Rows and runs that work on the scene. The run over all sources: target nodes per mode, sources in
+// list order into one log, the pose step that may skip a source, the in-memory source's own
+// targets, and the progress.
+#include "modalhelper.h"
+
+#include "sgcore/app/sgapp.h"
+#include "sgcore/app/sgmessagesink.h"
+#include "sgcore/geometry/sgobject.h"
+#include "sgcore/geometry/sgpolymesh.h"
+#include "sgcore/geometry/sgpolyshape.h"
+#include "sgcore/importer/sgfileiosettings.h"
+#include "sgcore/io/sgobjreader.h"
+#include "sgcore/morph/sgmorph.h"
+#include "sgcore/properties/sgfloatproperty.h"
+#include "sgcore/scene/sgbone.h"
+#include "sgcore/scene/sgscene.h"
+#include "sgcore/scene/sgskeleton.h"
+#include "sharedsource/engine/sgmorphloadlog.h"
+#include "sharedsource/loaderui/sgmorphfileitem.h"
+#include "sharedsource/loaderui/sgmorphmeshitem.h"
+#include "sharedsource/loaderui/sgmorphsourceboolitem.h"
+#include "sharedsource/loaderui/sgmorphsourceitem.h"
+#include "sharedsource/loaderui/sgmorphsourcelist.h"
+
+#include <QAbstractButton>
+#include <QFile>
+#include <QMessageBox>
+#include <QTemporaryDir>
+#include <QTreeWidgetItemIterator>
+#include <gtest/gtest.h>
+
+namespace {
+
+// Two bones of three vertices each, in one figure without geometry of its own.
+const char *HeadObj = "v 0 2 0\nv 1 2 0\nv 0 3 0\nf 1 2 3\n";
+const char *NeckObj = "v 0 1 0\nv 1 1 0\nv 0 2 0\nf 1 2 3\n";
+
+// A welded target: the head's group first, then the neck's; `headDy` lifts the head's first
+// vertex and `neckDy` the neck's first.
+QByteArray figureTarget(double headDy, double neckDy) {
+    return QStringLiteral("v 0 %1 0\nv 1 2 0\nv 0 3 0\nv 0 %2 0\nv 1 1 0\nv 0 2 0\n"
+                          "g head\nf 1 2 3\ng neck\nf 4 5 6\n")
+        .arg(2 + headDy)
+        .arg(1 + neckDy)
+        .toLatin1();
+}
+
+SgObject *objectFrom(const QByteArray &obj, const QString &name) {
+    SgObjReader reader;
+    EXPECT_TRUE(reader.readBuffer(obj.constData(), size_t(obj.size()), name));
+    auto *object = new SgObject(name);
+    object->addShape(reader.takeShape(name));
+    return object;
+}
+
+bool hasMorph(SgNode *node, const QString &name) {
+    return node->getObject() &&
+           dynamic_cast<SgMorph *>(node->getObject()->findModifier(name)) != nullptr;
+}
+
+class FigureScene : public ::testing::Test {
+protected:
+    QTemporaryDir dir;
+    SgScene *scene = sgApp->getScene();
+    SgSkeleton *figure = new SgSkeleton("Figure");
+    SgBone *head = new SgBone("head");
+    SgBone *neck = new SgBone("neck");
+    SgNode *prop = new SgNode("box");
+    SgMorphSourceList list{nullptr, "MorphLoaderSourceList"};
+    SgFileIOSettings options;
+    SgMorphLoadLog log;
+
+    void SetUp() override {
+        scene->clear();
+        figure->addBone(neck);
+        figure->addBone(head, neck);
+        head->setObject(objectFrom(HeadObj, "head"));
+        neck->setObject(objectFrom(NeckObj, "neck"));
+        prop->setObject(objectFrom(HeadObj, "box"));
+        scene->addNode(figure);
+        scene->addNode(prop);
+        sgApp->getMessageSink()->clear();
+    }
+    void TearDown() override {
+        list.clear();
+        scene->clear();
+    }
+
+    QString writeFile(const QString &name, const QByteArray &data) {
+        const QString path = dir.filePath(name);
+        QFile file(path);
+        EXPECT_TRUE(file.open(QIODevice::WriteOnly));
+        file.write(data);
+        return path;
+    }
+    // The nodes the run tried, in order, from the host log.
+    QStringList triedNodes() const {
+        QStringList nodes;
+        for (const QString &line : sgApp->getMessageSink()->logLines()) {
+            if (line.startsWith("Creating morph for "))
+                nodes.append(line.mid(19).chopped(3));
+        }
+        return nodes;
+    }
+    SgMessageSink::Progress lastProgress() const {
+        const auto runs = sgApp->getMessageSink()->progressRuns();
+        return runs.isEmpty() ? SgMessageSink::Progress() : runs.last();
+    }
+};
+
+TEST_F(FigureScene, ModeZeroTakesEveryBoneOfTheSelectedBonesFigureAndTheFigure) {
+    list.addFile(writeFile("lift.obj", figureTarget(0.5, 0)));
+    scene->selectNode(neck);
+    list.createMorphs(options, 0, log);
+
+    EXPECT_EQ(triedNodes(), QStringList({"neck", "head", "Figure"}));
+    EXPECT_TRUE(hasMorph(head, "lift"));
+    EXPECT_FALSE(hasMorph(neck, "lift"));
+    EXPECT_TRUE(log.toHtml().contains("Created morph successfully."));
+    const SgMessageSink::Progress progress = lastProgress();
+    EXPECT_EQ(progress.text, "Creating Morphs");
+    EXPECT_EQ(progress.total, 3);
+    EXPECT_TRUE(progress.finished);
+
+    // Nothing selected: no targets, so the file makes no morph, and the log says so.
+    scene->clearSelection();
+    sgApp->getMessageSink()->clear();
+    SgMorphLoadLog empty;
+    static_cast<SgMorphFileItem *>(list.topLevelItem(0))->loader().setMorphName("again");
+    list.createMorphs(options, 0, empty);
+    EXPECT_TRUE(triedNodes().isEmpty());
+    EXPECT_EQ(lastProgress().total, 0);
+    EXPECT_TRUE(empty.hasProblems());
+    EXPECT_FALSE(hasMorph(head, "again"));
+}
+
+TEST_F(FigureScene, ModeOneRunsSourcesTopDownOnTheSelectionAndSkipsOnAFailedPose) {
+    list.addFile(writeFile("first.obj", figureTarget(0, 0.5)));
+    list.addFile(writeFile("second.obj", figureTarget(0, 0.25)));
+    list.addFile(writeFile("third.obj", figureTarget(0, 0.75)));
+    // "third" is on top; its pose cannot load and the user declines to go on without it.
+    auto *third = static_cast<SgMorphFileItem *>(list.topLevelItem(0));
+    third->loader().setReverseModifiers(true);
+    third->loader().setPoseFile(dir.filePath("missing.sgs"));
+    scene->selectNode(neck);
+
+    QString title;
+    {
+        ModalAnswer answer([&](QWidget *w) {
+            auto *box = qobject_cast<QMessageBox *>(w);
+            ASSERT_NE(box, nullptr);
+            title = box->windowTitle();
+            box->button(QMessageBox::No)->click();
+        });
+        list.createMorphs(options, 1, log);
+        EXPECT_TRUE(answer.answered());
+    }
+    EXPECT_EQ(title, "Pose File Error");
+    const QString html = log.toHtml();
+    EXPECT_FALSE(html.contains("Loading morph third..."));
+    EXPECT_LT(html.indexOf("Loading morph second..."), html.indexOf("Loading morph first..."));
+    EXPECT_GE(html.indexOf("Loading morph second..."), 0);
+    EXPECT_EQ(triedNodes(), QStringList({"neck", "neck"}));
+    EXPECT_TRUE(hasMorph(neck, "first"));
+    EXPECT_TRUE(hasMorph(neck, "second"));
+    EXPECT_FALSE(hasMorph(neck, "third"));
+    EXPECT_FALSE(hasMorph(head, "first"));
+    EXPECT_EQ(lastProgress().total, 3); // one target times three file rows
+}
+
+TEST_F(FigureScene, ModeTwoLoadsOntoThePrimarySelectionOnly) {
+    list.addFile(writeFile("dent.obj", "v 0 2 0.5\nv 1 2 0\nv 0 3 0\nf 1 2 3\n"));
+    scene->selectNode(neck);
+    scene->selectNode(prop, true);
+    list.createMorphs(options, 2, log);
+    EXPECT_EQ(triedNodes(), QStringList({"box"}));
+    EXPECT_TRUE(hasMorph(prop, "dent"));
+    EXPECT_FALSE(log.hasProblems());
+    EXPECT_EQ(lastProgress().total, 2);
+}
+
+TEST_F(FigureScene, TheInMemorySourceTargetsItsOwnFiguresBones) {
+    SgObjReader reader;
+    const QByteArray obj = figureTarget(0.5, 0.5);
+    ASSERT_TRUE(reader.readBuffer(obj.constData(), size_t(obj.size()), "returned"));
+    SgPolyMesh *mesh = reader.takeMesh();
+    mesh->ref();
+    list.addFile(writeFile("lift.obj", figureTarget(0.5, 0)));
+    SgMorphMeshItem *source = list.addMesh(mesh, figure);
+    mesh->unref(); // the row keeps its own reference
+    // The returned mesh is not a welded export here: take its groups as they are.
+    source->loader().setScenaraExported(false);
+    source->loader().setReverseModifiers(false);
+    scene->selectNode(prop);
+
+    list.createMorphs(options, 1, log);
+    // The in-memory row (on top) runs first on the figure's bones; the file row on the prop.
+    EXPECT_EQ(triedNodes(), QStringList({"neck", "head", "box"}));
+    EXPECT_TRUE(hasMorph(head, "FacMorph"));
+    EXPECT_TRUE(hasMorph(neck, "FacMorph"));
+    EXPECT_FALSE(hasMorph(figure, "FacMorph"));
+    // Only file rows from the top are counted, and the in-memory row stops the count.
+    EXPECT_EQ(lastProgress().total, 0);
+}
+
+TEST_F(FigureScene, NodeRowStartsOnTheSelectedFigureAndFindsBonesByName) {
+    scene->selectNode(head);
+    auto *file = new SgMorphFileItem(&list, "/m/a.obj");
+    SgMorphLoader &loader = file->loader();
+    SgMorphSourceItem *node = nullptr;
+    for (QTreeWidgetItemIterator it(&list); *it; ++it) {
+        if ((*it)->text(0) == "Node:")
+            node = static_cast<SgMorphSourceItem *>(*it);
+    }
+    ASSERT_NE(node, nullptr);
+    EXPECT_EQ(loader.controlNode(), figure);
+    EXPECT_EQ(node->text(1), "Figure");
+    EXPECT_EQ(node->valueText(), "Figure");
+
+    node->setValueText("head");
+    EXPECT_EQ(loader.controlNode(), head);
+    EXPECT_EQ(node->text(1), "head");
+    EXPECT_EQ(node->valueText(), "head");
+    node->setValueText("tail"); // no such bone: the figure itself
+    EXPECT_EQ(loader.controlNode(), figure);
+    node->setValueText("");
+    EXPECT_EQ(node->text(1), "- none -");
+    EXPECT_EQ(loader.controlNode(), figure);
+
+    // Without a selected figure a stored name finds nothing and changes nothing.
+    scene->clearSelection();
+    node->setValueText("head");
+    EXPECT_EQ(loader.controlNode(), figure);
+    auto *other = new SgMorphFileItem(&list, "/m/b.obj");
+    EXPECT_EQ(other->loader().controlNode(), nullptr);
+}
+
+// The chooser menus come with the property UI of the same library.
+#if __has_include("sharedsource/propertyui/sgpropertygroupmenu.h")
+TEST_F(FigureScene, GroupPropertyAndNodeRowsChooseFromTheirMenus) {
+    auto *smile = new SgFloatProperty("Smile");
+    smile->setPath("Morphs/Face");
+    ASSERT_EQ(figure->addProperty(smile), 0);
+    scene->selectNode(figure);
+    auto *file = new SgMorphFileItem(&list, "/m/a.obj");
+    SgMorphLoader &loader = file->loader();
+    list.show();
+    list.expandAll();
+    const auto row = [&](const QString &label) {
+        for (QTreeWidgetItemIterator it(&list); *it; ++it) {
+            if ((*it)->text(0) == label)
+                return *it;
+        }
+        return static_cast<QTreeWidgetItem *>(nullptr);
+    };
+    const auto choose = [&](const QString &label, const QString &entry) {
+        QStringList seen;
+        ModalAnswer answer(chooseMenuEntry(entry, &seen));
+        list.showContextMenu(row(label), list.viewport()->mapToGlobal(QPoint(5, 5)), 1);
+        EXPECT_TRUE(answer.answered()) << label.toStdString();
+        return seen;
+    };
+
+    EXPECT_EQ(choose("Property Group:", "Morphs/Face"),
+              QStringList({"Create...", "-", "Morphs", "Morphs/Face"}));
+    EXPECT_EQ(loader.morphGroup(), "Morphs/Face");
+    EXPECT_EQ(row("Property Group:")->text(1), "Morphs/Face");
+    choose("Property Group:", "");
+    EXPECT_EQ(loader.morphGroup(), "Morphs/Face");
+
+    loader.setControlProperty(smile);
+    EXPECT_EQ(row("Property:")->text(1), "Smile");
+    choose("Property:", "a"); // the morph name: no separate property
+    EXPECT_EQ(loader.controlProperty(), nullptr);
+    EXPECT_EQ(row("Property:")->text(1), "a");
+
+    EXPECT_EQ(choose("Node:", "box"), QStringList({"Figure", "neck", "head", "box"}));
+    EXPECT_EQ(loader.controlNode(), prop);
+    EXPECT_EQ(row("Node:")->text(1), "box");
+
+    // With the control off, the node and property rows open nothing.
+    static_cast<SgMorphSourceBoolItem *>(row("Create Control Property:"))->setValue(false);
+    ModalAnswer none(chooseMenuEntry("Figure"), 300);
+    list.showContextMenu(row("Node:"), list.viewport()->mapToGlobal(QPoint(5, 5)), 1);
+    EXPECT_FALSE(none.answered());
+    EXPECT_EQ(loader.controlNode(), prop);
+}
+#endif
+
+} // namespace

@@ -1,0 +1,245 @@
+// The source list: adding, refusing duplicates, removing, reordering, dropping files and the
+// context menus, driven through the real list.
+#include "modalhelper.h"
+
+#include "sgcore/script/sgscript.h"
+#include "sharedsource/engine/sgmorphloader.h"
+#include "sharedsource/loaderui/sgmorphfileitem.h"
+#include "sharedsource/loaderui/sgmorphmeshitem.h"
+#include "sharedsource/loaderui/sgmorphposeitem.h"
+#include "sharedsource/loaderui/sgmorphsourceboolitem.h"
+#include "sharedsource/loaderui/sgmorphsourcelist.h"
+
+#include <QDropEvent>
+#include <QMimeData>
+#include <QSignalSpy>
+#include <QTemporaryDir>
+#include <QTest>
+#include <QUrl>
+#include <gtest/gtest.h>
+
+namespace {
+
+QString poseExtension() {
+    return QString(SgScript::s_VarnScript2TextExtension);
+}
+
+QStringList rowPaths(const SgMorphSourceList &list) {
+    QStringList paths;
+    for (int i = 0; i < list.topLevelItemCount(); ++i)
+        paths.append(list.topLevelItem(i)->text(1));
+    return paths;
+}
+
+QTreeWidgetItem *findLabel(QTreeWidgetItem *top, const QString &label) {
+    for (int i = 0; i < top->childCount(); ++i) {
+        QTreeWidgetItem *child = top->child(i);
+        if (child->text(0) == label)
+            return child;
+        if (QTreeWidgetItem *found = findLabel(child, label))
+            return found;
+    }
+    return nullptr;
+}
+
+// Drops `files` onto the list's viewport at `point`.
+void drop(SgMorphSourceList &list, const QStringList &files, QPoint point) {
+    QMimeData data;
+    QList<QUrl> urls;
+    for (const QString &file : files)
+        urls.append(QUrl::fromLocalFile(file));
+    data.setUrls(urls);
+    QDragEnterEvent enter(point, Qt::CopyAction, &data, Qt::LeftButton, Qt::NoModifier);
+    QCoreApplication::sendEvent(list.viewport(), &enter);
+    EXPECT_TRUE(enter.isAccepted());
+    QDropEvent dropEvent(QPointF(point), Qt::CopyAction, &data, Qt::LeftButton, Qt::NoModifier);
+    QCoreApplication::sendEvent(list.viewport(), &dropEvent);
+}
+
+class SourceList : public ::testing::Test {
+protected:
+    SgMorphSourceList list{nullptr, QStringLiteral("MorphLoaderSourceList")};
+    void SetUp() override { list.show(); }
+
+    void select(const QList<int> &rows) {
+        list.clearSelection();
+        for (int row : rows)
+            list.topLevelItem(row)->setSelected(true);
+    }
+};
+
+TEST_F(SourceList, AddsOnTopAndRefusesExactDuplicatesOnce) {
+    EXPECT_EQ(list.columnCount(), 2);
+    EXPECT_EQ(list.headerItem()->text(0), "Item");
+    EXPECT_EQ(list.headerItem()->text(1), "Value");
+    EXPECT_EQ(list.selectionMode(), QAbstractItemView::ExtendedSelection);
+
+    list.addFile("/m/a.obj");
+    list.addFile("/m/b.obj");
+    EXPECT_EQ(rowPaths(list), QStringList({"/m/b.obj", "/m/a.obj"}));
+
+    QString title, text;
+    {
+        ModalAnswer answer(closeMessageBox(&title, &text));
+        list.addFile("/m/a.obj");
+        EXPECT_TRUE(answer.answered());
+    }
+    EXPECT_EQ(title, "File already selected");
+    EXPECT_EQ(text, "The file \"/m/a.obj\" is already in the list, it will not be added again.");
+    EXPECT_EQ(rowPaths(list), QStringList({"/m/b.obj", "/m/a.obj"}));
+
+    // A path in another letter case is another file.
+    list.addFile("/m/A.obj");
+    EXPECT_EQ(list.topLevelItemCount(), 3);
+
+    // One warning for the one duplicate of a batch; the last path of the batch ends on top.
+    int warnings = 0;
+    {
+        ModalAnswer answer([&](QWidget *w) {
+            ++warnings;
+            closeMessageBox(nullptr, nullptr)(w);
+        });
+        list.addFiles({"/m/c.obj", "/m/b.obj", "/m/d.obj"});
+    }
+    EXPECT_EQ(warnings, 1);
+    EXPECT_EQ(rowPaths(list),
+              QStringList({"/m/d.obj", "/m/c.obj", "/m/A.obj", "/m/b.obj", "/m/a.obj"}));
+
+    select({1, 3});
+    list.removeSelected();
+    EXPECT_EQ(rowPaths(list), QStringList({"/m/d.obj", "/m/A.obj", "/m/a.obj"}));
+}
+
+TEST_F(SourceList, MovesSelectedRowsAsBlocks) {
+    list.addFiles({"/4", "/3", "/2", "/1"});
+    ASSERT_EQ(rowPaths(list), QStringList({"/1", "/2", "/3", "/4"}));
+    list.topLevelItem(1)->setExpanded(true);
+
+    select({0, 1});
+    list.moveSelected(true);
+    EXPECT_EQ(rowPaths(list), QStringList({"/1", "/2", "/3", "/4"}));
+
+    select({1, 2});
+    list.moveSelected(true);
+    EXPECT_EQ(rowPaths(list), QStringList({"/2", "/3", "/1", "/4"}));
+    EXPECT_TRUE(list.topLevelItem(0)->isSelected());
+    EXPECT_TRUE(list.topLevelItem(1)->isSelected());
+    EXPECT_FALSE(list.topLevelItem(2)->isSelected());
+
+    list.clear();
+    list.addFiles({"/4", "/3", "/2", "/1"});
+    select({1, 2});
+    list.moveSelected(false);
+    EXPECT_EQ(rowPaths(list), QStringList({"/1", "/4", "/2", "/3"}));
+    list.moveSelected(false);
+    EXPECT_EQ(rowPaths(list), QStringList({"/1", "/4", "/2", "/3"}));
+
+    // Separate selected rows each move one place.
+    list.clear();
+    list.addFiles({"/5", "/4", "/3", "/2", "/1"});
+    select({1, 3});
+    list.moveSelected(false);
+    EXPECT_EQ(rowPaths(list), QStringList({"/1", "/3", "/2", "/5", "/4"}));
+    list.moveSelected(true);
+    EXPECT_EQ(rowPaths(list), QStringList({"/1", "/2", "/3", "/4", "/5"}));
+}
+
+TEST_F(SourceList, ContextMenusForwardToRowsAndOfferSavingOnFileRows) {
+    list.addFile("/m/a.obj");
+    list.addMesh(nullptr, nullptr);
+    QSignalSpy saved(&list, &SgMorphSourceList::saveObject);
+    QTreeWidgetItem *file = list.topLevelItem(1);
+    const QPoint at = list.viewport()->mapToGlobal(QPoint(5, 5));
+
+    QStringList seen;
+    {
+        ModalAnswer answer(chooseMenuEntry("Cancel", &seen));
+        list.showContextMenu(file, at, 0);
+    }
+    EXPECT_EQ(seen, QStringList({"Save Object Configuration..", "-", "Cancel"}));
+    EXPECT_EQ(saved.count(), 0);
+    {
+        ModalAnswer answer(chooseMenuEntry("Save Object Configuration.."));
+        list.showContextMenu(file, at, 0);
+    }
+    EXPECT_EQ(saved.count(), 1);
+
+    // The in-memory row has no menu.
+    {
+        ModalAnswer answer(chooseMenuEntry(""), 300);
+        list.showContextMenu(list.topLevelItem(0), at, 0);
+        EXPECT_FALSE(answer.answered());
+    }
+    list.showContextMenu(nullptr, at, 0);
+
+    // A right click on a setting row's value opens its editor.
+    list.expandAll();
+    QTreeWidgetItem *reverse = findLabel(file, "Reverse Deformations:");
+    const QRect rect = list.visualItemRect(reverse);
+    const QPoint click(list.columnViewportPosition(1) + 5, rect.center().y());
+    {
+        ModalAnswer answer(chooseMenuEntry("yes"));
+        QContextMenuEvent event(QContextMenuEvent::Mouse, click,
+                                list.viewport()->mapToGlobal(click));
+        QCoreApplication::sendEvent(list.viewport(), &event);
+        EXPECT_TRUE(answer.answered());
+    }
+    EXPECT_TRUE(static_cast<SgMorphFileItem *>(file)->loader().reverseModifiers());
+
+    // The context-menu key opens the editor of the current row.
+    list.setCurrentItem(findLabel(file, "Apply After Joint Binding:"));
+    {
+        ModalAnswer answer(chooseMenuEntry("yes"));
+        QContextMenuEvent event(QContextMenuEvent::Keyboard, QPoint(1, 1),
+                                list.viewport()->mapToGlobal(QPoint(1, 1)));
+        QCoreApplication::sendEvent(list.viewport(), &event);
+        EXPECT_TRUE(answer.answered());
+    }
+    EXPECT_TRUE(static_cast<SgMorphFileItem *>(file)->loader().applyAfterJoint());
+}
+
+TEST_F(SourceList, DropsAddGeometryFilesAndSetPoses) {
+    QString title, text;
+    const QPoint empty(10, list.viewport()->height() - 5);
+    {
+        ModalAnswer answer(closeMessageBox(&title, &text));
+        drop(list, {"/m/a.obj", "/m/notes.txt", "/m/b.obj", "/m/c.png"}, empty);
+        EXPECT_TRUE(answer.answered());
+    }
+    EXPECT_EQ(rowPaths(list), QStringList({"/m/b.obj", "/m/a.obj"}));
+    EXPECT_EQ(title, "Error loading files");
+    EXPECT_EQ(text, "Some Files dropped in the Morph Loader could not be imported:"
+                    "\n\t/m/notes.txt\n\t/m/c.png");
+
+    // A pose file onto the enabled "Pose:" row sets the pose and adds nothing.
+    QTreeWidgetItem *file = list.topLevelItem(0);
+    auto *reverse = static_cast<SgMorphSourceBoolItem *>(findLabel(file, "Reverse Deformations:"));
+    auto *pose = static_cast<SgMorphPoseItem *>(findLabel(file, "Pose:"));
+    const QString script = "/poses/sit." + poseExtension();
+    list.expandAll();
+    {
+        ModalAnswer answer(closeMessageBox(&title, &text), 300);
+        drop(list, {script}, list.visualItemRect(pose).center());
+        EXPECT_TRUE(answer.answered()); // not drop-enabled yet: the list reports it
+    }
+    EXPECT_EQ(pose->text(1), "None");
+    reverse->setValue(true);
+    drop(list, {script}, list.visualItemRect(pose).center());
+    EXPECT_EQ(pose->text(1), script);
+    EXPECT_EQ(static_cast<SgMorphFileItem *>(file)->loader().poseFile(), script);
+    EXPECT_EQ(list.topLevelItemCount(), 2);
+
+    // Anything else onto the pose row is refused with the pose kept.
+    {
+        ModalAnswer answer(closeMessageBox(&title, &text));
+        drop(list, {"/m/d.obj"}, list.visualItemRect(pose).center());
+        EXPECT_TRUE(answer.answered());
+    }
+    EXPECT_EQ(title, "Error loading files");
+    EXPECT_EQ(text, "Some Files dropped in the Morph Loader could not be imported as Pose files:"
+                    "\n\t/m/d.obj");
+    EXPECT_EQ(pose->text(1), script);
+    EXPECT_EQ(list.topLevelItemCount(), 2);
+}
+
+} // namespace
