@@ -27,6 +27,10 @@ public:
     // The texture for `path` if one was made, or null.
     SgTexture *findImage(const QString &path) const;
     int getImageCount() const { return static_cast<int>(m_textures.size()); }
+    // The texture at `index` in the order of first request; null outside the list.
+    SgTexture *getImageAt(int index) const {
+        return index >= 0 && index < getImageCount() ? m_textures[size_t(index)].get() : nullptr;
+    }
     // Reloads every texture's image from its file (textures whose file fails keep a null image).
     void refresh();
 

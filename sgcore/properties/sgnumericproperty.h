@@ -5,6 +5,7 @@
 #include <vector>
 
 class SgController;
+class SgPropertySettings;
 
 // A numeric property (float or int): raw value, default, limits with optional clamping,
 // slider sensitivity, percent display, and a list of controllers evaluated when the value is
@@ -14,6 +15,10 @@ public:
     SgNumericProperty();
     explicit SgNumericProperty(const QString &name);
     ~SgNumericProperty() override;
+
+    // Add the numeric attributes: raw value, default, limits, clamping, sensitivity, percent.
+    void getAttributes(SgPropertySettings &settings) const override;
+    void setAttributes(const SgPropertySettings &settings) override;
 
     // The value readers see: the raw value passed through every controller in order, then
     // clamped to [min, max] when clamping is on. A controller chain that reads this property

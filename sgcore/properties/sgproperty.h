@@ -5,6 +5,7 @@
 #include <memory>
 
 class SgElement;
+class SgPropertySettings;
 class SgTexture;
 
 // Base of all properties: name (unique on its owner), label, group path, owner element and
@@ -16,6 +17,12 @@ public:
     ~SgProperty() override;
     SgProperty(const SgProperty &) = delete;
     SgProperty &operator=(const SgProperty &) = delete;
+
+    // Records the property's attributes into `settings` (keys: see SgPropertySettings). The
+    // settings classes implement these (sgcore/settings/sgpropertyattributes.cpp).
+    virtual void getAttributes(SgPropertySettings &settings) const;
+    // Applies the attributes present in `settings`; absent or mistyped ones are left unchanged.
+    virtual void setAttributes(const SgPropertySettings &settings);
 
     // The label shown to the user; the name while no label has been set.
     QString getLabel() const { return m_label.isNull() ? getName() : m_label; }

@@ -1,3 +1,7 @@
+#include "sgcore/properties/sgfloatproperty.h"
+#include "sgcore/properties/sgintproperty.h"
+#include "sgcore/properties/sgnumericnodeproperty.h"
+#include "sgcore/settings/sgpropertysettings.h"
 #include "sgcore/settings/sgsettings.h"
 #include "sgcore/widgets/sgboolbutton.h"
 #include "sgcore/widgets/sgcolorwgt.h"
@@ -12,6 +16,8 @@
 #include <QSlider>
 #include <QTest>
 #include <gtest/gtest.h>
+
+#include "uitesthelpers.h"
 
 TEST(HostWidgets, BoolButtonFlipsBetweenItsTwoTexts) {
     SgBoolButton button(nullptr, "b", "Off", "On");
@@ -130,4 +136,84 @@ TEST(HostSettings, DomRoundTripIsExactAndBadChildrenAreSkipped) {
     EXPECT_FALSE(back.fromDOM(bad.documentElement()));
     EXPECT_EQ(back.keys(), QStringList({"D"}));
     EXPECT_EQ(back.value("D").toInt(), 4);
+}
+
+namespace {
+
+// Writes the attributes of `property` into a document, reparses it and applies them to `target`.
+void roundTrip(const SgProperty &property, SgProperty &target) {
+    SgPropertySettings settings;
+    property.getAttributes(settings);
+    QDomDocument document;
+    QDomElement element = document.createElement("Property");
+    document.appendChild(element);
+    settings.toDOM(document, element);
+    QDomDocument reread;
+    ASSERT_TRUE(reread.setContent(document.toString()));
+    SgPropertySettings back;
+    ASSERT_TRUE(back.fromDOM(reread.documentElement()));
+    target.setAttributes(back);
+}
+
+} // namespace
+
+TEST(HostSettings, NumericPropertyAttributesRoundTripThroughTheDom) {
+    SgFloatProperty source("smile");
+    source.setLabel("Big <Smile> & \"more\"");
+    source.setPath("Morphs/Face");
+    source.setHidden(true);
+    source.lock(true);
+    source.setCanAnimate(false);
+    source.setIsUserProperty(true);
+    source.setValue(0.1f);
+    source.setDefaultValue(-1.0e-30f);
+    source.setMin(-3.4028235e38f);
+    source.setMax(2.5f);
+    source.setIsClamped(true);
+    source.setSensitivity(0.0037f);
+    source.setDisplayAsPercent(true);
+
+    SgFloatProperty target("other");
+    roundTrip(source, target);
+    SgPropertySettings expected, actual;
+    source.getAttributes(expected);
+    target.getAttributes(actual);
+    EXPECT_TRUE(actual == expected);
+    EXPECT_EQ(target.getName(), "smile");
+    EXPECT_EQ(target.getLabel(), "Big <Smile> & \"more\"");
+    EXPECT_EQ(target.getRawValue(), 0.1f);
+    EXPECT_EQ(target.getDefaultValue(), -1.0e-30f);
+    EXPECT_EQ(target.getMin(), -3.4028235e38f);
+    EXPECT_EQ(target.getSensitivity(), 0.0037f);
+    EXPECT_TRUE(target.isClamped() && target.getDisplayAsPercent() && target.isLocked());
+    EXPECT_FALSE(target.canAnimate());
+
+    SgIntProperty count("count");
+    count.setValue(-7);
+    count.setMax(12);
+    SgIntProperty countBack;
+    roundTrip(count, countBack);
+    EXPECT_EQ(countBack.getIntValue(), -7);
+    EXPECT_EQ(countBack.getMax(), 12.0f);
+
+    SgNumericNodeProperty follow("follow");
+    follow.setMustHaveNode(true);
+    follow.setMin(-0.5f);
+    SgNumericNodeProperty followBack;
+    roundTrip(follow, followBack);
+    EXPECT_TRUE(followBack.getMustHaveNode());
+    EXPECT_EQ(followBack.getMin(), -0.5f);
+
+    // A partial or damaged set changes only what it carries with the right type.
+    SgPropertySettings partial;
+    partial.setValue("Max", 9.0f);
+    partial.setValue("Min", QString("not a number"));
+    partial.setValue("Hidden", 0);
+    partial.setValue("Locked", false);
+    target.setAttributes(partial);
+    EXPECT_EQ(target.getMax(), 9.0f);
+    EXPECT_EQ(target.getMin(), -3.4028235e38f);
+    EXPECT_TRUE(target.isHidden());
+    EXPECT_FALSE(target.isLocked());
+    EXPECT_EQ(target.getName(), "smile");
 }

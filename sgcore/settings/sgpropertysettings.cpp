@@ -1,0 +1,5 @@
+#include "sgcore/settings/sgpropertysettings.h"
+
+SgPropertySettings::SgPropertySettings() = default;
+
+SgPropertySettings::~SgPropertySettings() = default;

@@ -1,0 +1,727 @@
+#include "uitesthelpers.h"
+
+#include "sgcore/app/sgapp.h"
+#include "sgcore/geometry/sgobject.h"
+#include "sgcore/morph/sgmorph.h"
+#include "sgcore/properties/sgboolproperty.h"
+#include "sgcore/properties/sgcolorproperty.h"
+#include "sgcore/properties/sgenumproperty.h"
+#include "sgcore/properties/sgfloatproperty.h"
+#include "sgcore/properties/sgimageproperty.h"
+#include "sgcore/properties/sgintproperty.h"
+#include "sgcore/properties/sgnodeproperty.h"
+#include "sgcore/properties/sgnumericnodeproperty.h"
+#include "sgcore/properties/sgpropertygrouptree.h"
+#include "sgcore/properties/sgskeletonproperty.h"
+#include "sgcore/scene/sgnode.h"
+#include "sgcore/scene/sgscene.h"
+#include "sgcore/scene/sgskeleton.h"
+#include "sgcore/widgets/sgboolbutton.h"
+#include "sgcore/widgets/sgcolorwgt.h"
+#include "sgcore/widgets/sgenumslider.h"
+#include "sgcore/widgets/sgfloatslider.h"
+#include "sgcore/widgets/sgintslider.h"
+#include "sgcore/widgets/sgnodemenu.h"
+#include "sharedsource/propertyui/sgcreatepropertydlg.h"
+
+#include <QCheckBox>
+#include <QComboBox>
+#include <QDir>
+#include <QGroupBox>
+#include <QLabel>
+#include <QLineEdit>
+#include <QMetaMethod>
+#include <QMouseEvent>
+#include <QPushButton>
+#include <QTest>
+#include <QTreeWidget>
+#include <memory>
+
+namespace {
+
+using Dlg = SgCreatePropertyDlg;
+
+class CreatePropertyDialog : public ::testing::Test {
+protected:
+    void SetUp() override { sgApp->getScene()->clear(); }
+    void TearDown() override { sgApp->getScene()->clear(); }
+
+    // A dialog as most callers make it: all types, create on accept, values kept between shows.
+    std::unique_ptr<Dlg> makeDialog(int type = Dlg::FloatType, bool createOnAccept = true) {
+        auto dialog = std::make_unique<Dlg>(nullptr, "TestCreatePropertyDlg", false, type,
+                                            createOnAccept, false);
+        return dialog;
+    }
+
+    template <typename T> static T *child(Dlg &dialog, const char *name) {
+        T *widget = dialog.findChild<T *>(QString::fromLatin1(name));
+        EXPECT_NE(widget, nullptr) << name;
+        return widget;
+    }
+
+    static void chooseType(Dlg &dialog, int type) {
+        auto *box = child<QComboBox>(dialog, "SgCreatePropertyTypeBox");
+        box->setCurrentIndex(type);
+        emit box->activated(type);
+    }
+
+    static void setFloat(Dlg &dialog, const char *name, float value) {
+        child<SgFloatSlider>(dialog, name)->setValue(value);
+    }
+    static void setInt(Dlg &dialog, const char *name, int value) {
+        child<SgIntSlider>(dialog, name)->setValue(value);
+    }
+    static void setText(Dlg &dialog, const char *name, const QString &text) {
+        child<QLineEdit>(dialog, name)->setText(text);
+    }
+    static void setOn(Dlg &dialog, const char *name, bool on) {
+        child<SgBoolButton>(dialog, name)->setOn(on);
+    }
+
+    // Clicks "Create" and returns the warning text (empty when no warning came).
+    static QString clickCreate(Dlg &dialog, bool expectWarning) {
+        QString warning;
+        if (expectWarning)
+            uitest::answerMessageBox(&warning);
+        QTest::mouseClick(child<QPushButton>(dialog, "SgCreatePropButton"), Qt::LeftButton);
+        if (expectWarning) {
+            EXPECT_FALSE(warning.isEmpty());
+        }
+        return warning;
+    }
+
+    SgNode *addNode(const QString &name) {
+        auto *node = new SgNode(name);
+        sgApp->getScene()->addNode(node);
+        return node;
+    }
+};
+
+const QString Header = "Could not create properties for the following reasons:\n";
+
+TEST_F(CreatePropertyDialog, MetaObjectLayoutAndPages) {
+    auto dialog = makeDialog();
+    const QMetaObject *meta = dialog->metaObject();
+    EXPECT_STREQ(meta->className(), "SgCreatePropertyDlg");
+    QStringList methods;
+    for (int i = meta->methodOffset(); i < meta->methodCount(); ++i)
+        methods.append(QString::fromLatin1(meta->method(i).name()));
+    EXPECT_EQ(methods,
+              QStringList({"setCreateOnAccept",  "setResetValuesOnShow", "setDefaultName",
+                           "setDefaultLabel",    "setPathDefaults",      "setPathDefaults",
+                           "setDefaultPath",     "setPathReadOnly",      "setCreationNodes",
+                           "insertCreationNode", "setCreationNode",      "setNodeMenu",
+                           "setNodeMenu",        "setSkeletonMenu",      "setSkeletonMenu",
+                           "createProperties",   "createProperty",       "createProperty",
+                           "validate",           "autoFillPropLabel",    "acceptButtonClicked",
+                           "updateDisplay",      "saveCurrentValues",    "resetValues",
+                           "beginRenameEnum",    "renameEnum",           "moveEnumUp",
+                           "moveEnumDown",       "removeEnum",           "addDefaultEnumItem"}));
+
+    // Pages shown per type, the type row and the node page's relabelling.
+    dialog->show();
+    const QStringList pages = {
+        "SgImagePropertyAttribs", "SgNodePropertyAttribs", "SgNumericPropertyAttribs",
+        "SgFloatAttribs",         "SgNumericNodeAttribs",  "SgIntAttribs",
+        "SgBoolAttribs",          "SgColorAttribs",        "SgEnumAttribs",
+        "SgAdditionalOptions"};
+    auto shownPages = [&] {
+        QStringList shown;
+        for (const QString &page : pages) {
+            if (dialog->findChild<QGroupBox *>(page)->isVisible())
+                shown.append(page);
+        }
+        return shown;
+    };
+    EXPECT_EQ(shownPages(),
+              QStringList({"SgNumericPropertyAttribs", "SgFloatAttribs", "SgAdditionalOptions"}));
+    chooseType(*dialog, Dlg::NumericNodeType);
+    EXPECT_EQ(shownPages(),
+              QStringList({"SgNumericPropertyAttribs", "SgFloatAttribs", "SgNumericNodeAttribs"}));
+    chooseType(*dialog, Dlg::SkeletonType);
+    EXPECT_EQ(shownPages(), QStringList({"SgNodePropertyAttribs"}));
+    EXPECT_EQ(child<QGroupBox>(*dialog, "SgNodePropertyAttribs")->title(), "Skeleton Attributes");
+    EXPECT_EQ(child<QLabel>(*dialog, "SgDefaultNodeLabel")->text(), "Default Skeleton:");
+    chooseType(*dialog, Dlg::NodeType);
+    EXPECT_EQ(child<QLabel>(*dialog, "SgNodeLabel")->text(), "Node:");
+    EXPECT_TRUE(child<QWidget>(*dialog, "SgPropTypeBox")->isVisible());
+    EXPECT_TRUE(child<QWidget>(*dialog, "SgUniversalPropSettingsBox")->isVisible());
+    EXPECT_EQ(dialog->windowTitle(), "Create Property");
+
+    // Only the int page's Max slider refuses typed text.
+    for (const char *name : {"SgFloatVal", "SgDefaultFloatVal", "SgFloatMinAttrib",
+                             "SgFloatMaxAttrib", "SgFloatSensitivityAttrib"})
+        EXPECT_TRUE(child<SgFloatSlider>(*dialog, name)->isTextEditable()) << name;
+    for (const char *name :
+         {"SgIntVal", "SgDefaultIntVal", "SgIntMinAttrib", "SgIntSensitivityAttrib"})
+        EXPECT_TRUE(child<SgIntSlider>(*dialog, name)->isTextEditable()) << name;
+    EXPECT_FALSE(child<SgIntSlider>(*dialog, "SgIntMaxAttrib")->isTextEditable());
+
+    // "Create morph after joint" follows "Create as empty morph" without being unchecked.
+    auto *morph = child<QCheckBox>(*dialog, "SgCreateAsMorphOption");
+    auto *afterJoint = child<QCheckBox>(*dialog, "SgCreateAfterJointOption");
+    EXPECT_FALSE(afterJoint->isEnabled());
+    afterJoint->click();
+    EXPECT_FALSE(afterJoint->isChecked());
+    morph->setChecked(true);
+    afterJoint->click();
+    EXPECT_TRUE(afterJoint->isChecked());
+    morph->setChecked(false);
+    EXPECT_FALSE(afterJoint->isEnabled());
+    EXPECT_TRUE(afterJoint->isChecked());
+
+    auto single = std::make_unique<Dlg>(nullptr, "single", true, Dlg::FloatType, false, true);
+    EXPECT_EQ(single->windowTitle(), "");
+    single->show();
+    EXPECT_EQ(single->windowTitle(), "Create Float Property");
+    EXPECT_FALSE(child<QWidget>(*single, "SgPropTypeBox")->isVisible());
+}
+
+TEST_F(CreatePropertyDialog, ValidationListsEveryFailedCheckInOrder) {
+    auto dialog = makeDialog();
+    dialog->show();
+    setText(*dialog, "SgPropertyInternalNameAttrib", "   ");
+    setText(*dialog, "SgPropertyLabelAttrib", " ");
+    EXPECT_EQ(clickCreate(*dialog, true), Header + "   - No nodes have been specified\n"
+                                                   "   - Name cannot be empty\n"
+                                                   "   - Label cannot be empty\n");
+    EXPECT_TRUE(dialog->isVisible());
+
+    SgNode *node = addNode("body");
+    dialog->setCreationNode(node);
+    setText(*dialog, "SgPropertyInternalNameAttrib", "smile");
+    setText(*dialog, "SgPropertyLabelAttrib", "Smile");
+    setFloat(*dialog, "SgFloatMinAttrib", 2.0f);
+    setFloat(*dialog, "SgFloatMaxAttrib", 1.0f);
+    EXPECT_EQ(clickCreate(*dialog, true), Header + "   - Min is greater than Max\n"
+                                                   "   - Value is not within limits\n"
+                                                   "   - Default Value is not within limits\n");
+    // Without limits only the range itself is checked.
+    setOn(*dialog, "SgObeyLimitsAttrib", false);
+    EXPECT_EQ(clickCreate(*dialog, true), Header + "   - Min is greater than Max\n");
+    setFloat(*dialog, "SgFloatMinAttrib", -1.0f);
+    setFloat(*dialog, "SgFloatVal", 5.0f);
+    clickCreate(*dialog, false);
+    EXPECT_EQ(dialog->result(), QDialog::Accepted);
+    EXPECT_FALSE(dialog->isVisible());
+    ASSERT_EQ(node->getPropertyCount(), 1);
+    EXPECT_EQ(static_cast<SgFloatProperty *>(node->getProperty(0))->getRawValue(), 5.0f);
+}
+
+TEST_F(CreatePropertyDialog, IntAndNumericNodeRangesAndEqualValues) {
+    SgNode *node = addNode("body");
+    auto dialog = makeDialog(Dlg::IntType);
+    dialog->show();
+    dialog->setCreationNode(node);
+    setText(*dialog, "SgPropertyInternalNameAttrib", "count");
+    setText(*dialog, "SgPropertyLabelAttrib", "Count");
+    setInt(*dialog, "SgIntVal", 4);
+    EXPECT_EQ(clickCreate(*dialog, true), Header + "   - Value is not within limits\n");
+    setInt(*dialog, "SgIntMinAttrib", 5);
+    setInt(*dialog, "SgIntMaxAttrib", 2);
+    setInt(*dialog, "SgIntVal", 2);
+    setInt(*dialog, "SgDefaultIntVal", 2);
+    EXPECT_EQ(clickCreate(*dialog, true), Header + "   - Min is greater than Max\n"
+                                                   "   - Value is not within limits\n"
+                                                   "   - Default Value is not within limits\n");
+    // Values equal to the limits pass; the int property is made without clamping.
+    setInt(*dialog, "SgIntMinAttrib", 2);
+    setInt(*dialog, "SgIntMaxAttrib", 4);
+    setInt(*dialog, "SgIntVal", 4);
+    clickCreate(*dialog, false);
+    ASSERT_EQ(node->getPropertyCount(), 1);
+    auto *created = dynamic_cast<SgIntProperty *>(node->getProperty(0));
+    ASSERT_NE(created, nullptr);
+    EXPECT_EQ(created->getIntValue(), 4);
+    EXPECT_EQ(created->getDefaultValue(), 2.0f);
+    EXPECT_EQ(created->getMin(), 2.0f);
+    EXPECT_EQ(created->getMax(), 4.0f);
+    EXPECT_FALSE(created->isClamped());
+
+    // Numeric node: min above max is accepted.
+    auto numericNode = makeDialog(Dlg::NumericNodeType);
+    numericNode->show();
+    numericNode->setCreationNode(node);
+    setText(*numericNode, "SgPropertyInternalNameAttrib", "follow");
+    setText(*numericNode, "SgPropertyLabelAttrib", "Follow");
+    setFloat(*numericNode, "SgFloatMinAttrib", 3.0f);
+    setFloat(*numericNode, "SgFloatVal", 9.0f);
+    clickCreate(*numericNode, false);
+    EXPECT_EQ(numericNode->result(), QDialog::Accepted);
+    EXPECT_EQ(node->getPropertyCount(), 2);
+
+    // An enum without items fails with the header line alone.
+    auto enumDialog = makeDialog(Dlg::EnumType);
+    enumDialog->show();
+    enumDialog->setCreationNode(node);
+    setText(*enumDialog, "SgPropertyInternalNameAttrib", "mood");
+    setText(*enumDialog, "SgPropertyLabelAttrib", "Mood");
+    EXPECT_EQ(clickCreate(*enumDialog, true), Header);
+}
+
+TEST_F(CreatePropertyDialog, EachTypeCreatesItsPropertyFromTheDialogsValues) {
+    SgNode *first = addNode("first");
+    auto *figure = new SgSkeleton("figure");
+    sgApp->getScene()->addNode(figure);
+    auto dialog = makeDialog(Dlg::FloatType, false);
+    dialog->show();
+    setText(*dialog, "SgPathAttrib", "Morphs/Face");
+    setText(*dialog, "SgPropertyInternalNameAttrib", " smile ");
+    setText(*dialog, "SgPropertyLabelAttrib", "Smile");
+    setOn(*dialog, "SgPropertyHiddenAttrib", true);
+    setOn(*dialog, "SgPropertyLockedAttrib", true);
+    setOn(*dialog, "SgPropertyAnimationAttrib", false);
+
+    setFloat(*dialog, "SgFloatMinAttrib", -2.0f);
+    setFloat(*dialog, "SgFloatMaxAttrib", 3.0f);
+    setFloat(*dialog, "SgFloatVal", 0.5f);
+    setFloat(*dialog, "SgDefaultFloatVal", 0.25f);
+    setFloat(*dialog, "SgFloatSensitivityAttrib", 0.125f);
+    setOn(*dialog, "SgDisplayAsPercentAttrib", false);
+    setOn(*dialog, "SgObeyLimitsAttrib", false);
+    std::unique_ptr<SgProperty> property(dialog->createProperty());
+    auto *floatProperty = dynamic_cast<SgFloatProperty *>(property.get());
+    ASSERT_NE(floatProperty, nullptr);
+    EXPECT_EQ(floatProperty->getRawValue(), 0.5f);
+    EXPECT_EQ(floatProperty->getDefaultValue(), 0.25f);
+    EXPECT_EQ(floatProperty->getMin(), -2.0f);
+    EXPECT_EQ(floatProperty->getMax(), 3.0f);
+    EXPECT_EQ(floatProperty->getSensitivity(), 0.125f);
+    EXPECT_FALSE(floatProperty->getDisplayAsPercent());
+    EXPECT_FALSE(floatProperty->isClamped());
+    EXPECT_EQ(floatProperty->getName(), " smile "); // as typed
+    EXPECT_EQ(floatProperty->getLabel(), "Smile");
+    EXPECT_EQ(floatProperty->getPath(), "Morphs/Face");
+    EXPECT_TRUE(floatProperty->isHidden());
+    EXPECT_TRUE(floatProperty->isLocked());
+    EXPECT_FALSE(floatProperty->canAnimate());
+    EXPECT_TRUE(floatProperty->isUserProperty());
+    EXPECT_EQ(floatProperty->getOwner(), nullptr);
+
+    chooseType(*dialog, Dlg::BoolType);
+    setOn(*dialog, "SgDefaultBoolValueAttrib", true);
+    property.reset(dialog->createProperty());
+    auto *boolProperty = dynamic_cast<SgBoolProperty *>(property.get());
+    ASSERT_NE(boolProperty, nullptr);
+    EXPECT_FALSE(boolProperty->getBoolValue());
+    EXPECT_EQ(boolProperty->getDefaultValue(), 1);
+
+    chooseType(*dialog, Dlg::ColorType);
+    child<SgColorWgt>(*dialog, "SgColorAttrib")->setColor(QColor(10, 20, 30));
+    child<SgColorWgt>(*dialog, "SgDefaultColorAttrib")->setColor(QColor(1, 2, 3));
+    property.reset(dialog->createProperty());
+    auto *colorProperty = dynamic_cast<SgColorProperty *>(property.get());
+    ASSERT_NE(colorProperty, nullptr);
+    EXPECT_EQ(colorProperty->getColorValue(), QColor(10, 20, 30));
+    EXPECT_EQ(colorProperty->getDefaultValue(), qRgb(1, 2, 3));
+
+    chooseType(*dialog, Dlg::NodeType);
+    auto *nodeMenu = child<SgNodeMenu>(*dialog, "SgNodeAttrib");
+    EXPECT_EQ(nodeMenu->getNodes(), QList<SgNode *>({first, figure}));
+    EXPECT_EQ(nodeMenu->getCurrentNode(), nullptr);
+    nodeMenu->setCurrentNode(first);
+    child<SgNodeMenu>(*dialog, "SgDefaultNodeAttrib")->setCurrentNode(figure);
+    property.reset(dialog->createProperty());
+    auto *nodeProperty = dynamic_cast<SgNodeProperty *>(property.get());
+    ASSERT_NE(nodeProperty, nullptr);
+    EXPECT_EQ(dynamic_cast<SgSkeletonProperty *>(property.get()), nullptr);
+    EXPECT_EQ(nodeProperty->getValue(), first);
+    EXPECT_EQ(nodeProperty->getDefaultValue(), figure);
+
+    chooseType(*dialog, Dlg::SkeletonType);
+    EXPECT_EQ(nodeMenu->getNodes(), QList<SgNode *>({figure}));
+    nodeMenu->setCurrentNode(figure);
+    property.reset(dialog->createProperty());
+    auto *skeletonProperty = dynamic_cast<SgSkeletonProperty *>(property.get());
+    ASSERT_NE(skeletonProperty, nullptr);
+    EXPECT_EQ(skeletonProperty->getValue(), figure);
+    EXPECT_EQ(skeletonProperty->getDefaultValue(), nullptr);
+
+    // A list given to setNodeMenu replaces the scene's nodes in both node menus.
+    SgNodeList only{figure};
+    dialog->setNodeMenu(only);
+    chooseType(*dialog, Dlg::NodeType);
+    EXPECT_EQ(nodeMenu->getNodes(), QList<SgNode *>({figure}));
+
+    chooseType(*dialog, Dlg::NumericNodeType);
+    auto *numericNodeMenu = child<SgNodeMenu>(*dialog, "SgNumericNodeAttrib");
+    EXPECT_EQ(numericNodeMenu->getNodes(), QList<SgNode *>({first, figure}));
+    numericNodeMenu->setCurrentNode(first);
+    setOn(*dialog, "SgRequiresNodeAttrib", true);
+    property.reset(dialog->createProperty());
+    auto *numericNode = dynamic_cast<SgNumericNodeProperty *>(property.get());
+    ASSERT_NE(numericNode, nullptr);
+    EXPECT_EQ(numericNode->getNode(), first);
+    EXPECT_TRUE(numericNode->getMustHaveNode());
+    EXPECT_EQ(numericNode->getSensitivity(), 0.125f);
+    EXPECT_EQ(numericNode->getMin(), -2.0f);
+
+    chooseType(*dialog, Dlg::ImageType);
+    property.reset(dialog->createProperty());
+    auto *imageProperty = dynamic_cast<SgImageProperty *>(property.get());
+    ASSERT_NE(imageProperty, nullptr);
+    EXPECT_EQ(imageProperty->getValue(), nullptr);
+}
+
+TEST_F(CreatePropertyDialog, CreatesOnEveryNodeAndWarnsForARefusingOne) {
+    SgNode *first = addNode("first");
+    SgNode *refusing = addNode("refusing");
+    SgNode *third = addNode("third");
+    refusing->addProperty(new SgFloatProperty("wink"));
+    auto dialog = makeDialog();
+    dialog->show();
+    dialog->insertCreationNode(first);
+    dialog->insertCreationNode(refusing);
+    dialog->insertCreationNode(first);
+    dialog->insertCreationNode(nullptr);
+    dialog->insertCreationNode(third);
+    dialog->setCreationNode(nullptr);
+    EXPECT_EQ(dialog->getCreationNodes(), QList<SgNode *>({first, refusing, third}));
+    setText(*dialog, "SgPropertyInternalNameAttrib", "wink");
+    setText(*dialog, "SgPropertyLabelAttrib", "Wink");
+    EXPECT_EQ(clickCreate(*dialog, true), "Unable to add property to refusing node");
+    EXPECT_EQ(dialog->result(), QDialog::Accepted);
+    ASSERT_EQ(first->getPropertyCount(), 1);
+    ASSERT_EQ(third->getPropertyCount(), 1);
+    EXPECT_EQ(refusing->getPropertyCount(), 1);
+    EXPECT_NE(first->getProperty(0), third->getProperty(0));
+    EXPECT_EQ(first->getProperty(0)->getLabel(), "Wink");
+
+    // With create-on-accept off, "Create" only validates and closes.
+    auto validateOnly = makeDialog(Dlg::FloatType, false);
+    validateOnly->show();
+    validateOnly->setCreationNode(third);
+    setText(*validateOnly, "SgPropertyInternalNameAttrib", "blink");
+    setText(*validateOnly, "SgPropertyLabelAttrib", "Blink");
+    clickCreate(*validateOnly, false);
+    EXPECT_EQ(validateOnly->result(), QDialog::Accepted);
+    EXPECT_EQ(third->getPropertyCount(), 1);
+}
+
+TEST_F(CreatePropertyDialog, EmptyMorphGoesFirstOrAfterTheJoint) {
+    SgNode *withObject = addNode("withObject");
+    withObject->setObject(new SgObject);
+    withObject->getObject()->addModifier(new SgMorph("existing"));
+    SgNode *withoutObject = addNode("withoutObject");
+    auto dialog = makeDialog();
+    dialog->show();
+    SgNodeList nodes{withObject, withoutObject};
+    dialog->setCreationNodes(nodes);
+    setText(*dialog, "SgPropertyInternalNameAttrib", "bulge");
+    setText(*dialog, "SgPropertyLabelAttrib", "Bulge");
+    setFloat(*dialog, "SgFloatMaxAttrib", 2.0f);
+    child<QCheckBox>(*dialog, "SgCreateAsMorphOption")->setChecked(true);
+    clickCreate(*dialog, false);
+    ASSERT_NE(withoutObject->getObject(), nullptr);
+    auto *morph = dynamic_cast<SgMorph *>(withObject->getObject()->getModifier(0));
+    ASSERT_NE(morph, nullptr);
+    EXPECT_EQ(morph->getName(), "bulge");
+    EXPECT_EQ(morph->getValueChannel()->getMax(), 2.0f);
+    EXPECT_EQ(morph->getValueChannel()->getLabel(), "Bulge");
+    EXPECT_EQ(morph->getValueChannel()->getName(), "bulge"); // named by the morph, not the dialog
+    EXPECT_EQ(withObject->getPropertyCount(), 0);
+    EXPECT_EQ(withoutObject->getObject()->getModifierCount(), 1);
+
+    // After the joint: appended to the stack.
+    auto after = makeDialog();
+    after->show();
+    after->setCreationNode(withObject);
+    setText(*after, "SgPropertyInternalNameAttrib", "late");
+    setText(*after, "SgPropertyLabelAttrib", "Late");
+    child<QCheckBox>(*after, "SgCreateAsMorphOption")->setChecked(true);
+    child<QCheckBox>(*after, "SgCreateAfterJointOption")->setChecked(true);
+    clickCreate(*after, false);
+    SgObject *object = withObject->getObject();
+    ASSERT_EQ(object->getModifierCount(), 3);
+    EXPECT_EQ(object->getModifier(2)->getName(), "late");
+
+    // createProperty hands the morph to the owner pointer.
+    SgElement *owner = nullptr;
+    SgProperty *channel = after->createProperty(&owner);
+    auto *ownerMorph = dynamic_cast<SgMorph *>(owner);
+    ASSERT_NE(ownerMorph, nullptr);
+    EXPECT_EQ(channel, ownerMorph->getValueChannel());
+    delete ownerMorph;
+}
+
+TEST_F(CreatePropertyDialog, PathDefaultsAndLabelAutoFill) {
+    auto dialog = makeDialog();
+    auto *box = child<QComboBox>(*dialog, "SgPathDefaults");
+    auto *path = child<QLineEdit>(*dialog, "SgPathAttrib");
+    auto items = [box] {
+        QStringList texts;
+        for (int i = 0; i < box->count(); ++i)
+            texts.append(box->itemText(i));
+        return texts;
+    };
+    dialog->setPathDefaults(QStringList());
+    EXPECT_EQ(items(), QStringList({""}));
+    EXPECT_EQ(path->text(), "");
+    dialog->setPathDefaults(QStringList({"B", "A"}));
+    EXPECT_EQ(items(), QStringList({"B", "A"}));
+    EXPECT_EQ(path->text(), "B");
+    dialog->setDefaultPath("A");
+    EXPECT_EQ(items(), QStringList({"B", "A"}));
+    EXPECT_EQ(box->currentIndex(), 1);
+    dialog->setDefaultPath("C/D");
+    EXPECT_EQ(items(), QStringList({"B", "A", "C/D"}));
+    EXPECT_EQ(box->currentIndex(), 2);
+    EXPECT_EQ(path->text(), "C/D");
+    emit box->textActivated("B");
+    EXPECT_EQ(path->text(), "B");
+
+    // From the creation nodes: all paths of the first, the first path of the others, sorted.
+    SgNode *first = addNode("first");
+    first->addProperty(new SgFloatProperty("a"));
+    first->getProperty(0)->setPath("Morphs/Face");
+    first->getPropertyGroups()->addGroup("Body");
+    SgNode *second = addNode("second");
+    second->addProperty(new SgFloatProperty("b"));
+    second->getProperty(0)->setPath("Acting/Hands");
+    SgNode *third = addNode("third");
+    second->getPropertyGroups()->addGroup("Zeta");
+    SgNodeList nodes{first, second, third};
+    dialog->setCreationNodes(nodes);
+    dialog->setPathDefaults();
+    EXPECT_EQ(items(), QStringList({"Acting", "Body", "Morphs", "Morphs/Face"}));
+    EXPECT_EQ(path->text(), "Acting");
+
+    dialog->setPathReadOnly(true);
+    dialog->show();
+    EXPECT_FALSE(path->isVisible());
+    EXPECT_FALSE(child<QLabel>(*dialog, "SgPathLabel")->isVisible());
+    EXPECT_TRUE(box->isVisible());
+
+    // The label takes the name when focus leaves the name edit and the label is empty.
+    auto *name = child<QLineEdit>(*dialog, "SgPropertyInternalNameAttrib");
+    auto *label = child<QLineEdit>(*dialog, "SgPropertyLabelAttrib");
+    QApplication::setActiveWindow(dialog.get());
+    name->setFocus();
+    name->setText("grin");
+    label->setFocus();
+    EXPECT_EQ(label->text(), "grin");
+    name->setFocus();
+    name->setText("grin2");
+    label->setFocus();
+    EXPECT_EQ(label->text(), "grin");
+}
+
+// The enum editor, driven as a user: double-click the label column and type, select rows and
+// press the up, down and delete buttons.
+class EnumEditor {
+public:
+    explicit EnumEditor(Dlg &dialog)
+        : m_dialog(dialog), m_list(dialog.findChild<QTreeWidget *>("SgEnumAttrib")),
+          m_value(dialog.findChild<SgEnumSlider *>("SgEnumAttrib")),
+          m_default(dialog.findChild<SgEnumSlider *>("SgDefaultEnumAttrib")) {}
+
+    QTreeWidget *list() const { return m_list; }
+
+    void doubleClick(int row, int column) {
+        const QModelIndex index = m_list->model()->index(row, column);
+        m_list->scrollTo(index);
+        const QPoint point = m_list->visualRect(index).center();
+        QWidget *viewport = m_list->viewport();
+        QTest::mouseClick(viewport, Qt::LeftButton, Qt::NoModifier, point);
+        // The double click itself is sent as the window system would, after the first click.
+        const QPointF global = viewport->mapToGlobal(QPointF(point));
+        QMouseEvent doubleClick(QEvent::MouseButtonDblClick, QPointF(point), global, Qt::LeftButton,
+                                Qt::LeftButton, Qt::NoModifier);
+        QApplication::sendEvent(viewport, &doubleClick);
+        QTest::mouseRelease(viewport, Qt::LeftButton, Qt::NoModifier, point);
+    }
+
+    // Double-clicks the label of `row` and types `text`. Returns whether an editor opened.
+    bool type(int row, const QString &text) {
+        doubleClick(row, 1);
+        QLineEdit *editor = openEditor();
+        if (!editor)
+            return false;
+        editor->selectAll();
+        QTest::keyClick(editor, Qt::Key_Backspace);
+        QTest::keyClicks(editor, text);
+        QTest::keyClick(editor, Qt::Key_Return);
+        QApplication::processEvents();
+        return true;
+    }
+
+    // The open in-place editor, or null (closed editors linger until deleted).
+    QLineEdit *openEditor() const {
+        for (QLineEdit *editor : m_list->viewport()->findChildren<QLineEdit *>()) {
+            if (editor->isVisible())
+                return editor;
+        }
+        return nullptr;
+    }
+
+    void select(int row) { m_list->setCurrentItem(m_list->topLevelItem(row)); }
+    void press(const char *button) {
+        QTest::mouseClick(m_dialog.findChild<QPushButton *>(button), Qt::LeftButton);
+    }
+
+    // "index:label" per row, then the labels of both sliders; checked against the expected rows.
+    void expect(const QStringList &rows, int line) {
+        QStringList shown;
+        for (int row = 0; row < m_list->topLevelItemCount(); ++row)
+            shown.append(m_list->topLevelItem(row)->text(0) + ":" +
+                         m_list->topLevelItem(row)->text(1));
+        QStringList expected = rows;
+        expected.append(":" + Dlg::enumPlaceholderText());
+        EXPECT_EQ(shown, expected) << "line " << line;
+        QStringList labels;
+        for (const QString &row : rows)
+            labels.append(row.section(':', 1));
+        EXPECT_EQ(m_value->items(), labels) << "line " << line;
+        EXPECT_EQ(m_default->items(), labels) << "line " << line;
+    }
+
+    QString currentLabel() const { return m_list->currentItem()->text(1); }
+    SgEnumSlider *valueSlider() const { return m_value; }
+    SgEnumSlider *defaultSlider() const { return m_default; }
+
+private:
+    Dlg &m_dialog;
+    QTreeWidget *m_list;
+    SgEnumSlider *m_value;
+    SgEnumSlider *m_default;
+};
+
+TEST_F(CreatePropertyDialog, EnumEditorKeepsRowsAndSlidersInStep) {
+    auto dialog = makeDialog(Dlg::EnumType);
+    dialog->show();
+    EnumEditor editor(*dialog);
+    editor.expect({}, __LINE__);
+    editor.doubleClick(0, 0); // the "Int Val" column is not renamed
+    EXPECT_EQ(editor.openEditor(), nullptr);
+    ASSERT_TRUE(editor.type(0, "A"));
+    editor.expect({"0:A"}, __LINE__);
+    ASSERT_TRUE(editor.type(1, "B"));
+    ASSERT_TRUE(editor.type(2, "C"));
+    editor.expect({"0:A", "1:B", "2:C"}, __LINE__);
+    ASSERT_TRUE(editor.type(1, "b"));
+    editor.expect({"0:A", "1:b", "2:C"}, __LINE__);
+
+    // Moves that change nothing: first row up, placeholder up or down, last real row down.
+    editor.select(0);
+    editor.press("SgMoveEnumUpButton");
+    editor.select(3);
+    editor.press("SgMoveEnumUpButton");
+    editor.press("SgMoveEnumDownButton");
+    editor.press("SgDeleteEnumDownButton");
+    editor.select(2);
+    editor.press("SgMoveEnumDownButton");
+    editor.expect({"0:A", "1:b", "2:C"}, __LINE__);
+
+    editor.select(1);
+    editor.press("SgMoveEnumUpButton");
+    editor.expect({"0:b", "1:A", "2:C"}, __LINE__);
+    EXPECT_EQ(editor.currentLabel(), "b");
+
+    // After a removal the rows below are renumbered, so later edits reach the right items.
+    editor.select(0);
+    editor.press("SgDeleteEnumDownButton");
+    editor.expect({"0:A", "1:C"}, __LINE__);
+    ASSERT_TRUE(editor.type(1, "Z"));
+    editor.expect({"0:A", "1:Z"}, __LINE__);
+    editor.select(1);
+    editor.press("SgMoveEnumUpButton");
+    editor.expect({"0:Z", "1:A"}, __LINE__);
+    EXPECT_EQ(editor.currentLabel(), "Z");
+    editor.press("SgMoveEnumDownButton");
+    editor.expect({"0:A", "1:Z"}, __LINE__);
+    ASSERT_TRUE(editor.type(2, "D"));
+    editor.expect({"0:A", "1:Z", "2:D"}, __LINE__);
+    editor.select(1);
+    editor.press("SgDeleteEnumDownButton");
+    editor.expect({"0:A", "1:D"}, __LINE__);
+    editor.select(1);
+    editor.press("SgDeleteEnumDownButton");
+    editor.select(0);
+    editor.press("SgDeleteEnumDownButton");
+    editor.expect({}, __LINE__);
+    ASSERT_TRUE(editor.type(0, ""));
+    editor.expect({"0:"}, __LINE__);
+    ASSERT_TRUE(editor.type(1, "E"));
+
+    // The property takes the rows' labels and both sliders' indices.
+    editor.defaultSlider()->setCurrentIndex(1);
+    std::unique_ptr<SgProperty> property(dialog->createProperty());
+    auto *enumProperty = dynamic_cast<SgEnumProperty *>(property.get());
+    ASSERT_NE(enumProperty, nullptr);
+    EXPECT_EQ(enumProperty->getItems(), QStringList({"", "E"}));
+    EXPECT_EQ(enumProperty->getValue(), 0);
+    EXPECT_EQ(enumProperty->getDefaultValue(), 1);
+}
+
+TEST_F(CreatePropertyDialog, DefaultsSavedValuesAndCancel) {
+    SgNode *node = addNode("node");
+    auto dialog = makeDialog(Dlg::EnumType);
+    dialog->setCreationNode(node);
+    dialog->setDefaultName("keep");
+    dialog->show();
+    EnumEditor editor(*dialog);
+    ASSERT_TRUE(editor.type(0, "A"));
+    ASSERT_TRUE(editor.type(1, "B"));
+    editor.defaultSlider()->setCurrentIndex(1);
+    setText(*dialog, "SgPropertyLabelAttrib", "Keep");
+    setFloat(*dialog, "SgFloatMinAttrib", -4.0f);
+    dialog->hide();
+    dialog->show(); // saves the current values
+
+    setText(*dialog, "SgPropertyInternalNameAttrib", "changed");
+    setFloat(*dialog, "SgFloatMinAttrib", 7.0f);
+    setOn(*dialog, "SgPropertyHiddenAttrib", true);
+    editor.select(0);
+    editor.press("SgDeleteEnumDownButton");
+    ASSERT_TRUE(editor.type(1, "X"));
+    QTest::mouseClick(child<QPushButton>(*dialog, "SgCancelCreatePropButton"), Qt::LeftButton);
+    EXPECT_EQ(dialog->result(), QDialog::Rejected);
+    EXPECT_FALSE(dialog->isVisible());
+    EXPECT_EQ(child<QLineEdit>(*dialog, "SgPropertyInternalNameAttrib")->text(), "keep");
+    EXPECT_EQ(child<SgFloatSlider>(*dialog, "SgFloatMinAttrib")->getValue(), -4.0f);
+    EXPECT_FALSE(child<SgBoolButton>(*dialog, "SgPropertyHiddenAttrib")->isOn());
+    editor.expect({"0:A", "1:B"}, __LINE__);
+    EXPECT_EQ(editor.defaultSlider()->currentIndex(), 1);
+
+    // With reset on show, a default name survives exactly one restore.
+    auto resetting = std::make_unique<Dlg>(nullptr, "r", true, Dlg::FloatType, false, true);
+    resetting->setDefaultName("once");
+    resetting->setDefaultLabel("Once");
+    setFloat(*resetting, "SgFloatMaxAttrib", 9.0f);
+    resetting->show();
+    EXPECT_EQ(child<QLineEdit>(*resetting, "SgPropertyInternalNameAttrib")->text(), "once");
+    EXPECT_EQ(child<QLineEdit>(*resetting, "SgPropertyLabelAttrib")->text(), "Once");
+    EXPECT_EQ(child<SgFloatSlider>(*resetting, "SgFloatMaxAttrib")->getValue(), 1.0f);
+    resetting->hide();
+    resetting->show();
+    EXPECT_EQ(child<QLineEdit>(*resetting, "SgPropertyInternalNameAttrib")->text(), "");
+    EXPECT_EQ(child<QLineEdit>(*resetting, "SgPropertyLabelAttrib")->text(), "");
+    setText(*resetting, "SgPropertyInternalNameAttrib", "typed");
+    QTest::mouseClick(child<QPushButton>(*resetting, "SgCancelCreatePropButton"), Qt::LeftButton);
+    EXPECT_EQ(resetting->result(), QDialog::Rejected);
+    EXPECT_EQ(child<QLineEdit>(*resetting, "SgPropertyInternalNameAttrib")->text(), "typed");
+}
+
+TEST_F(CreatePropertyDialog, ScreenshotsOfTheFloatAndEnumPages) {
+    const QString folder = qEnvironmentVariable("SG_TEST_ARTIFACTS");
+    if (folder.isEmpty())
+        GTEST_SKIP() << "SG_TEST_ARTIFACTS is not set";
+    QDir().mkpath(folder);
+    auto dialog = makeDialog();
+    dialog->setPathDefaults(QStringList({"Morphs/Face", "Morphs/Body"}));
+    dialog->setDefaultName("smile");
+    dialog->setDefaultLabel("Smile");
+    dialog->show();
+    QApplication::processEvents();
+    EXPECT_TRUE(dialog->grab().save(folder + "/create_property_float.png"));
+    chooseType(*dialog, Dlg::EnumType);
+    EnumEditor editor(*dialog);
+    ASSERT_TRUE(editor.type(0, "Calm"));
+    ASSERT_TRUE(editor.type(1, "Happy"));
+    ASSERT_TRUE(editor.type(2, "Angry"));
+    dialog->adjustSize();
+    QApplication::processEvents();
+    EXPECT_TRUE(dialog->grab().save(folder + "/create_property_enum.png"));
+}
+
+} // namespace
