@@ -17,13 +17,14 @@
 // What the welder remembers of one bone.
 struct SgFigureWelder::BoneSlice {
     SgBone *bone = nullptr;
-    SgPolyMesh *base = nullptr;       // the bone's base geometry (one reference held)
-    std::vector<SgVec3> source;       // the positions welded (base, or with morphs)
-    std::vector<int32_t> weldIndex;   // per bone vertex: welded vertex, or -1 when left out
-    std::vector<int32_t> unused;      // bone vertices that none of its facets use
-    std::vector<uint8_t> materialMap; // bone material index -> figure material index
-    int32_t uvOffset = 0;             // where the bone's UVs start in the welded UV list
-    int32_t outStart = 0;             // where the bone's vertices start in unWeld's result
+    SgPolyMesh *base = nullptr;        // the bone's base geometry (one reference held)
+    std::vector<SgVec3> morphedSource; // the positions welded when morphs apply
+    const SgVec3 *source = nullptr;    // the positions welded (base, or morphedSource)
+    std::vector<int32_t> weldIndex;    // per bone vertex: welded vertex, or -1 when left out
+    std::vector<int32_t> unused;       // bone vertices that none of its facets use
+    std::vector<uint8_t> materialMap;  // bone material index -> figure material index
+    int32_t uvOffset = 0;              // where the bone's UVs start in the welded UV list
+    int32_t outStart = 0;              // where the bone's vertices start in unWeld's result
     bool hasMorphs = false;
 };
 
@@ -53,7 +54,8 @@ bool hasMorphModifiers(const SgNode *node) {
     return false;
 }
 
-// Open-addressing table from exact positions to welded vertices.
+// Open-addressing table from exact positions to welded vertices. Each slot keeps the
+// position next to the index, so a probe touches one cache line.
 class PositionTable {
 public:
     explicit PositionTable(size_t expected) {
@@ -61,35 +63,50 @@ public:
         while (cap < expected * 2) {
             cap <<= 1;
         }
-        m_slots.assign(cap, -1);
+        m_slots.resize(cap);
         m_mask = cap - 1;
     }
 
-    // The slot for `p`: either holding a welded vertex at exactly `p`, or empty (-1).
-    int32_t &slot(const SgVec3 &p, const std::vector<SgVec3> &welded) {
+    // The welded index stored for exactly `p`; or -1, after storing `newIndex` for `p`
+    // (the caller then adds that vertex).
+    int32_t findOrAdd(const SgVec3 &p, int32_t newIndex) {
         size_t i = hash(p) & m_mask;
         while (true) {
-            int32_t &s = m_slots[i];
-            if (s < 0 || welded[size_t(s)] == p) {
-                return s;
+            Slot &s = m_slots[i];
+            if (s.index < 0) {
+                s.position = p;
+                s.index = newIndex;
+                return -1;
+            }
+            if (s.position == p) {
+                return s.index;
             }
             i = (i + 1) & m_mask;
         }
     }
 
 private:
+    struct Slot {
+        SgVec3 position;
+        int32_t index = -1;
+    };
+
     static size_t hash(const SgVec3 &p) {
         // Adding 0 turns -0 into +0, so both zeros hash alike (they compare equal).
         const uint32_t x = std::bit_cast<uint32_t>(p.x + 0.0f);
         const uint32_t y = std::bit_cast<uint32_t>(p.y + 0.0f);
         const uint32_t z = std::bit_cast<uint32_t>(p.z + 0.0f);
-        uint64_t h = x * 0x9E3779B97F4A7C15ull;
-        h ^= (y + 0x7F4A7C15ull) * 0xC2B2AE3D27D4EB4Full;
-        h ^= (z + 0x165667B1ull) * 0x94D049BB133111EBull;
-        return size_t(h ^ (h >> 29));
+        uint64_t h = (uint64_t(x) << 32 | y) ^ (uint64_t(z) * 0x9E3779B97F4A7C15ull);
+        // A full 64-bit finaliser: float bits of round numbers differ only in their high bits.
+        h ^= h >> 30;
+        h *= 0xBF58476D1CE4E5B9ull;
+        h ^= h >> 27;
+        h *= 0x94D049BB133111EBull;
+        h ^= h >> 31;
+        return size_t(h);
     }
 
-    std::vector<int32_t> m_slots;
+    std::vector<Slot> m_slots;
     size_t m_mask = 0;
 };
 
@@ -112,39 +129,55 @@ SgFaceCorner remapCorner(const SgFaceCorner &c, int32_t vertex, int32_t uvCount,
     return out;
 }
 
+// Grows `v` by `n` default elements and returns a pointer to the first new one.
+template <typename T> T *grow(std::vector<T> &v, size_t n) {
+    const size_t old = v.size();
+    v.resize(old + n);
+    return v.data() + old;
+}
+
 // Appends `bone`'s facets to `out` with vertex indices mapped by `vertexOf`.
 template <typename V>
 void appendFacets(SgPolyMesh &out, const SgPolyMesh &bone, const std::vector<uint8_t> &materialMap,
                   int32_t group, int32_t uvOffset, V &&vertexOf) {
     const int32_t uvCount = bone.getUVCount();
-    auto material = [&](uint8_t local) -> uint8_t {
-        return local < materialMap.size() ? materialMap[local] : uint8_t(255);
+    auto copyCorners = [&](const std::vector<SgFaceCorner> &from, std::vector<SgFaceCorner> &to) {
+        SgFaceCorner *dst = grow(to, from.size());
+        for (const SgFaceCorner &c : from) {
+            *dst++ = remapCorner(c, vertexOf(c.vertex), uvCount, uvOffset);
+        }
     };
-    for (const SgFaceCorner &c : bone.triangleCorners()) {
-        out.triangleCorners().push_back(remapCorner(c, vertexOf(c.vertex), uvCount, uvOffset));
-    }
-    for (uint8_t m : bone.triangleMaterials()) {
-        out.triangleMaterials().push_back(material(m));
-        out.triangleGroups().push_back(group);
-    }
-    for (const SgFaceCorner &c : bone.quadCorners()) {
-        out.quadCorners().push_back(remapCorner(c, vertexOf(c.vertex), uvCount, uvOffset));
-    }
-    for (uint8_t m : bone.quadMaterials()) {
-        out.quadMaterials().push_back(material(m));
-        out.quadGroups().push_back(group);
-    }
+    auto copyFacets = [&](const std::vector<uint8_t> &mats, std::vector<uint8_t> &toMats,
+                          std::vector<int32_t> &toGroups) {
+        uint8_t *m = grow(toMats, mats.size());
+        for (uint8_t local : mats) {
+            *m++ = local < materialMap.size() ? materialMap[local] : uint8_t(255);
+        }
+        int32_t *g = grow(toGroups, mats.size());
+        std::fill(g, g + mats.size(), group);
+    };
+    copyCorners(bone.triangleCorners(), out.triangleCorners());
+    copyFacets(bone.triangleMaterials(), out.triangleMaterials(), out.triangleGroups());
+    copyCorners(bone.quadCorners(), out.quadCorners());
+    copyFacets(bone.quadMaterials(), out.quadMaterials(), out.quadGroups());
     const uint32_t polyBase = static_cast<uint32_t>(out.polygonCorners().size());
-    for (const SgFaceCorner &c : bone.polygonCorners()) {
-        out.polygonCorners().push_back(remapCorner(c, vertexOf(c.vertex), uvCount, uvOffset));
-    }
+    copyCorners(bone.polygonCorners(), out.polygonCorners());
     for (size_t i = 1; i < bone.polygonStarts().size(); ++i) {
         out.polygonStarts().push_back(polyBase + bone.polygonStarts()[i]);
     }
-    for (uint8_t m : bone.polygonMaterials()) {
-        out.polygonMaterials().push_back(material(m));
-        out.polygonGroups().push_back(group);
+    copyFacets(bone.polygonMaterials(), out.polygonMaterials(), out.polygonGroups());
+}
+
+// Reserves room in `out` for the facets of every bone of `slices` plus `extraPolygons`.
+template <typename Slices> void reserveFor(SgPolyMesh &out, const Slices &slices) {
+    size_t t = 0, q = 0, p = 0, pc = 0;
+    for (const auto &s : slices) {
+        t += size_t(s.base->getTriangleCount());
+        q += size_t(s.base->getQuadCount());
+        p += size_t(s.base->getPolygonCount()) + s.unused.size() / 3 + 1;
+        pc += s.base->polygonCorners().size() + s.unused.size() + 2;
     }
+    out.reserveFacets(int(t), int(q), int(p), int(pc));
 }
 
 // Adds degenerate facets of `group` that use each of `vertices` (for the group extraction).
@@ -267,12 +300,13 @@ void SgFigureWelder::build(SgSkeleton *figure, bool ignoreInvisible, bool weldGe
         const int32_t n = s.base->getVertexCount();
         if (s.hasMorphs) {
             SgVertexMesh *morphed = getMorphOnlyGeom(s.bone);
-            s.source = morphed->vertices();
+            s.morphedSource = morphed->vertices();
+            s.source = s.morphedSource.data();
             if (morphed != s.base) {
                 delete morphed;
             }
         } else {
-            s.source = s.base->vertices();
+            s.source = s.base->getVertices();
         }
         std::vector<uint8_t> used(size_t(n), 0);
         forEachCorner(*s.base, [&](const SgFaceCorner &c) { used[size_t(c.vertex)] = 1; });
@@ -287,12 +321,10 @@ void SgFigureWelder::build(SgSkeleton *figure, bool ignoreInvisible, bool weldGe
             const SgVec3 &p = s.source[size_t(i)];
             int32_t w = -1;
             if (weldGeometry) {
-                int32_t &slot = table.slot(p, wv);
-                if (slot >= 0 && lastBone[size_t(slot)] != int32_t(b)) {
-                    w = slot;
+                const int32_t found = table.findOrAdd(p, static_cast<int32_t>(wv.size()));
+                if (found >= 0 && lastBone[size_t(found)] != int32_t(b)) {
+                    w = found;
                     lastBone[size_t(w)] = int32_t(b);
-                } else if (slot < 0) {
-                    slot = static_cast<int32_t>(wv.size());
                 }
             }
             if (w < 0) {
@@ -318,6 +350,7 @@ void SgFigureWelder::build(SgSkeleton *figure, bool ignoreInvisible, bool weldGe
     }
 
     // Facets, one face group per bone.
+    reserveFor(*welded, m_slices);
     for (const BoneSlice &s : m_slices) {
         const int32_t group = welded->addFaceGroup(s.bone->getName());
         appendFacets(*welded, *s.base, s.materialMap, group, s.uvOffset,
@@ -371,6 +404,7 @@ SgVertexMesh *SgFigureWelder::unWeld(const SgVertexMesh *edited) const {
     if (const SgMap *uvs = welded->getUVList()) {
         out->setUVList(new SgMap(*uvs));
     }
+    reserveFor(*out, m_slices);
     for (const BoneSlice &s : m_slices) {
         const int32_t group = out->addFaceGroup(s.bone->getName());
         appendFacets(*out, *s.base, s.materialMap, group, s.uvOffset,

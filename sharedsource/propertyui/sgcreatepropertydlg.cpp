@@ -218,7 +218,7 @@ void SgCreatePropertyDlg::buildNumericPage() {
         newPage(tr("Numeric Attributes"), QStringLiteral("SgNumericPropertyAttribs"), grid);
     m_obeyLimits = newYesNoButton(m_numericPage, QStringLiteral("SgObeyLimitsAttrib"));
     addRow(grid, 0, tr("Obey Limits:"), QStringLiteral("SgObeyLimitsPropertyLabel"), m_obeyLimits);
-    grid->addWidget(new QWidget(m_numericPage), 1, 0);
+    grid->addWidget(new QWidget(m_numericPage), 1, 1);
     m_numericPage->hide();
 }
 

@@ -1,26 +1,264 @@
 #include "sgcore/app/sgapp.h"
+#include "sgcore/app/sgimagemgr.h"
+#include "sgcore/geometry/sgobject.h"
+#include "sgcore/geometry/sgpolymesh.h"
+#include "sgcore/geometry/sgpolyshape.h"
+#include "sgcore/io/sgfileio.h"
+#include "sgcore/io/sgscenefile.h"
+#include "sgcore/materials/sgdefaultmaterial.h"
+#include "sgcore/materials/sgtexture.h"
+#include "sgcore/properties/sgenumproperty.h"
+#include "sgcore/properties/sgfloatproperty.h"
+#include "sgcore/properties/sgpropertygrouptree.h"
 #include "sgcore/scene/sgbone.h"
+#include "sgcore/scene/sgfigurewelder.h"
 #include "sgcore/scene/sgscene.h"
 #include "sgcore/scene/sgskeleton.h"
+#include "tests/support/sgtestfigure.h"
+#include "tests/support/sgtestmain.h"
 
 #include <gtest/gtest.h>
 
+#include <QDir>
+#include <QSignalSpy>
+
+namespace {
+
+const QString kExamples = QStringLiteral(SG_EXAMPLES_DIR);
+
+std::vector<SgVec3> groupVertices(const SgPolyMesh &mesh, const QString &group) {
+    std::vector<SgVec3> out;
+    for (int32_t v : mesh.getFaceGroupVertices(mesh.findFaceGroup(group))) {
+        out.push_back(mesh.getVertex(v));
+    }
+    return out;
+}
+
+const SgPolyMesh *meshOf(SgNode *node) {
+    return static_cast<SgPolyShape *>(node->getObject()->getCurrentShape())->getPolyMesh();
+}
+
+} // namespace
+
 TEST(HostScene, NodesKeepSceneOrderAndSelection) {
     SgScene scene;
+    QSignalSpy selection(&scene, &SgScene::selectionChanged);
     auto *a = new SgNode(QStringLiteral("a"));
     auto *b = new SgNode(QStringLiteral("b"));
+    b->setLabel(QStringLiteral("Bee"));
+    auto *c = new SgNode(QStringLiteral("c"));
     scene.addNode(a);
     scene.addNode(b);
-    ASSERT_EQ(scene.getNodeCount(), 2);
+    scene.addNode(c);
+    scene.addNode(a); // already there: stays where it is
+    ASSERT_EQ(scene.getNodeCount(), 3);
     EXPECT_EQ(scene.getNode(0), a);
-    EXPECT_EQ(scene.findNodeByLabel(QStringLiteral("b")), b);
-    EXPECT_EQ(scene.findNodeByLabel(QStringLiteral("free")), nullptr);
-    scene.selectNode(b);
+    EXPECT_EQ(scene.getNode(3), nullptr);
+    EXPECT_EQ(scene.getNode(-1), nullptr);
+    EXPECT_EQ(scene.findNodeByLabel(QStringLiteral("Bee")), b);
+    EXPECT_EQ(scene.findNodeByLabel(QStringLiteral("b")), nullptr);
+    EXPECT_EQ(scene.findNodeByLabel(QStringLiteral("a")), a);
+
+    // Selected nodes come in scene order; the primary selection is the last one selected.
+    scene.selectNode(c);
     scene.selectNode(a, true);
     EXPECT_EQ(scene.getPrimarySelection(), a);
     SgNodeListIterator it = scene.selectedNodeListIterator();
     EXPECT_EQ(it.next(), a);
-    EXPECT_EQ(it.next(), b);
+    EXPECT_EQ(it.next(), c);
     EXPECT_EQ(it.next(), nullptr);
+    scene.deselectNode(a);
+    EXPECT_EQ(scene.getPrimarySelection(), c);
+    scene.selectNode(b);
+    EXPECT_EQ(scene.getSelectedNodes(), SgNodeList{b});
+    EXPECT_EQ(selection.count(), 4);
+
+    // Removing a node takes it out of the selection; iterators keep their snapshot.
+    SgNodeListIterator all = scene.nodeListIterator();
+    scene.removeNode(b);
+    EXPECT_EQ(scene.getPrimarySelection(), nullptr);
+    EXPECT_EQ(scene.getNodeCount(), 2);
+    EXPECT_EQ(all.count(), 3);
     ASSERT_NE(sgApp, nullptr);
+}
+
+TEST(HostScene, FigureHierarchyAndNodeChildren) {
+    SgScene scene;
+    SgSkeleton *figure = sgTestMakeFigure(QStringLiteral("Fig"), 3, 1);
+    auto *follower = new SgSkeleton(QStringLiteral("Shirt"));
+    follower->setFollowTarget(figure);
+    const SgBoneList bones = figure->getAllBones();
+    auto *prop = new SgNode(QStringLiteral("ring"));
+    prop->setParent(bones[1]);
+    scene.addNode(figure);
+    scene.addNode(follower);
+    // Figures are followed by their bones (and what hangs below them) depth first.
+    EXPECT_EQ(scene.getNodes(), (SgNodeList{figure, bones[0], bones[1], bones[2], prop, follower}));
+    EXPECT_EQ(scene.getSkeletons(), (SgSkeletonList{figure, follower}));
+    EXPECT_EQ(bones[2]->getSkeleton(), figure);
+    EXPECT_EQ(figure->getSkeleton(), figure);
+    EXPECT_EQ(prop->getSkeleton(), nullptr);
+    EXPECT_EQ(figure->findBone(QStringLiteral("bone2")), bones[2]);
+    EXPECT_EQ(figure->findBone(QStringLiteral("Bone 1")), bones[1]);
+    EXPECT_EQ(follower->getFollowTarget(), figure);
+
+    SgNodeList direct;
+    figure->getNodeChildren(direct, false);
+    EXPECT_EQ(direct, SgNodeList{bones[0]});
+    SgNodeList below;
+    bones[0]->getNodeChildren(below, true);
+    EXPECT_EQ(below, (SgNodeList{bones[1], bones[2], prop}));
+    EXPECT_FALSE(bones[0]->setParent(prop)); // no cycles
+
+    // World transform: rotation about the origin, then the parent's transform.
+    bones[0]->setLocalRot(SgQuat::fromAxisAngle({0, 0, 1}, 3.14159265f / 2));
+    const SgVec3 p = bones[1]->getWSTransform().multPnt({1, 0, 0});
+    EXPECT_NEAR(p.x, 0.0f, 1e-5);
+    EXPECT_NEAR(p.y, 2.0f, 1e-5);
+    const SgMatrix4 inv = bones[1]->getWSTransform().inverse();
+    const SgVec3 back = inv.multPnt(p);
+    EXPECT_NEAR(back.x, 1.0f, 1e-5);
+    EXPECT_NEAR(back.y, 0.0f, 1e-5);
+
+    // Removing the figure removes its bones and props; the follower follows none.
+    scene.removeNode(figure);
+    EXPECT_EQ(scene.getNodes(), SgNodeList{follower});
+    EXPECT_EQ(follower->getFollowTarget(), nullptr);
+}
+
+TEST(HostSceneFile, LoadsTheExampleFigureWithSeamsMaterialsAndProperties) {
+    SgScene scene;
+    SgSceneFile file;
+    ASSERT_TRUE(file.load(kExamples + QStringLiteral("/scenes/figure.json"), &scene))
+        << file.getErrorString().toStdString();
+    EXPECT_EQ(file.getAddedNodeCount(), 6);
+    auto *figure = dynamic_cast<SgSkeleton *>(scene.findNodeByLabel(QStringLiteral("Figure 1")));
+    ASSERT_NE(figure, nullptr);
+    const SgBoneList bones = figure->getAllBones();
+    ASSERT_EQ(bones.size(), 3);
+    EXPECT_EQ(bones[1]->getLabel(), QStringLiteral("Chest"));
+    EXPECT_EQ(bones[1]->getParent(), bones[0]);
+    EXPECT_EQ(bones[2]->getOrigin(), SgVec3(0, 2.5f, 0));
+    SgNode *hat = scene.findNodeByName(QStringLiteral("Hat"));
+    ASSERT_NE(hat, nullptr);
+    EXPECT_EQ(hat->getParent(), bones[2]);
+    EXPECT_TRUE(hat->isHidden());
+
+    // Each bone has its own copy of the seam ring it shares with its neighbour.
+    EXPECT_EQ(meshOf(bones[0])->getVertexCount(), 8);
+    EXPECT_EQ(meshOf(bones[2])->getVertexCount(), 8);
+    EXPECT_EQ(meshOf(bones[2])->getQuadCount(), 5);
+    SgFigureWelder welder(figure, false, true, true, true);
+    EXPECT_EQ(welder.getGeometry()->getVertexCount(), 16);
+    std::unique_ptr<SgVertexMesh> back(welder.unWeld(welder.getGeometry()));
+    for (SgBone *b : bones) {
+        EXPECT_EQ(groupVertices(*static_cast<SgPolyMesh *>(back.get()), b->getName()),
+                  meshOf(b)->vertices());
+    }
+
+    SgShape *head = bones[2]->getObject()->getCurrentShape();
+    ASSERT_EQ(head->getMaterialCount(), 2);
+    auto *skin = dynamic_cast<SgDefaultMaterial *>(head->findMaterial(QStringLiteral("Skin")));
+    ASSERT_NE(skin, nullptr);
+    EXPECT_EQ(skin->getDiffuseColor(), QColor(230, 190, 170));
+    ASSERT_NE(skin->getColorMap(), nullptr);
+    EXPECT_TRUE(skin->getColorMap()->isLoaded());
+    EXPECT_EQ(SgFileIO::getShortFileName(skin->getColorMap()->getFileName()),
+              QStringLiteral("skin.png"));
+    EXPECT_FLOAT_EQ(skin->getGlossinessStrength(), 0.25f);
+    auto *hair = dynamic_cast<SgDefaultMaterial *>(head->findMaterial(QStringLiteral("Hair")));
+    ASSERT_NE(hair, nullptr);
+    EXPECT_FLOAT_EQ(hair->getBumpStrength(), 0.3f);
+
+    auto *height = dynamic_cast<SgFloatProperty *>(figure->findProperty(QStringLiteral("Height")));
+    ASSERT_NE(height, nullptr);
+    EXPECT_TRUE(height->isClamped());
+    EXPECT_TRUE(height->isUserProperty());
+    EXPECT_EQ(height->getMin(), -1.0f);
+    auto *mood = dynamic_cast<SgEnumProperty *>(figure->findProperty(QStringLiteral("Mood")));
+    ASSERT_NE(mood, nullptr);
+    EXPECT_EQ(mood->getValueLabel(), QStringLiteral("Happy"));
+    EXPECT_EQ(figure->getPropertyGroups()->getAllPaths(),
+              (QStringList{QStringLiteral("Morphs"), QStringLiteral("Morphs/Face"),
+                           QStringLiteral("Body")}));
+    EXPECT_NE(bones[2]->findProperty(QStringLiteral("Smile")), nullptr);
+
+    SgNode *ball = scene.findNodeByLabel(QStringLiteral("Ball"));
+    ASSERT_NE(ball, nullptr);
+    EXPECT_EQ(meshOf(ball)->getTriangleCount(), 8);
+    EXPECT_EQ(meshOf(ball)->getBoundingBox().getCenter(), SgVec3(0, 0, 0));
+}
+
+TEST(HostSceneFile, RejectsBadFilesWholeWithPlace) {
+    SgScene scene;
+    SgSceneFile file;
+    const QString base = kExamples + QStringLiteral("/scenes");
+    struct Case {
+        const char *json;
+        const char *words;
+    };
+    const Case cases[] = {
+        {"not json", "not a JSON object"},
+        {R"({"nodes": []})", "version 1"},
+        {R"({"scenara": 1, "nodes": [{"kind": "prop", "name": "a"}]})", "needs \"geometry\""},
+        {R"({"scenara": 1, "nodes": [{"kind": "prop", "name": "a", "geometry": "missing.obj"}]})",
+         "missing.obj:0: cannot open"},
+        {R"({"scenara": 1, "nodes": [{"kind": "node", "name": "a"}, {"kind": "figure", "name": "f",
+            "bones": [{"name": "b", "parent": "x"}]}]})",
+         "nodes[1].bones[0]: unknown parent bone \"x\""},
+        {R"({"scenara": 1, "nodes": [{"kind": "node", "name": "a", "properties": [
+            {"type": "float", "name": "p"}, {"type": "int", "name": "p"}]}]})",
+         "(82)"},
+        {R"({"scenara": 1, "nodes": [{"kind": "figure", "name": "f", "followTarget": "g",
+            "bones": []}]})",
+         "unknown follow target"},
+        {R"({"scenara": 1, "nodes": [{"kind": "prop", "name": "a",
+            "geometry": {"file": "figure.obj", "group": "tail"}}]})",
+         "no face group \"tail\""},
+        {R"({"scenara": 1, "nodes": [{"kind": "node", "name": "a", "origin": [1, 2]}]})",
+         "array of 3 numbers"},
+    };
+    for (const Case &c : cases) {
+        EXPECT_FALSE(file.loadFromData(c.json, base, &scene, QStringLiteral("bad.json"))) << c.json;
+        EXPECT_TRUE(file.getErrorString().startsWith(QStringLiteral("bad.json: ")))
+            << file.getErrorString().toStdString();
+        EXPECT_TRUE(file.getErrorString().contains(QString::fromUtf8(c.words)))
+            << file.getErrorString().toStdString();
+        EXPECT_EQ(scene.getNodeCount(), 0) << "nothing is added from a rejected file";
+    }
+}
+
+TEST(HostApp, SinksPathsAndFileNames) {
+    sgApp->getMessageSink()->clear();
+    sgApp->log(QStringLiteral("hello"));
+    sgApp->statusLine(QStringLiteral("Loading"), true);
+    sgApp->startProgress(QStringLiteral("Morphs"), 3, true, false);
+    EXPECT_TRUE(sgApp->isProgressActive());
+    EXPECT_TRUE(sgApp->stepProgress());
+    sgApp->finishProgress();
+    EXPECT_FALSE(sgApp->isProgressActive());
+    EXPECT_FALSE(sgApp->stepProgress());
+    EXPECT_EQ(sgApp->getMessageSink()->logLines(), QStringList{QStringLiteral("hello")});
+    EXPECT_EQ(sgApp->getMessageSink()->currentStatus(), QStringLiteral("Loading"));
+    ASSERT_EQ(sgApp->getMessageSink()->progressRuns().size(), 1);
+    EXPECT_EQ(sgApp->getMessageSink()->progressRuns()[0].steps, 1);
+    EXPECT_EQ(sgApp->getTempPath(), sgTestPath(QStringLiteral("temp")));
+    EXPECT_EQ(sgApp->getInterface(), nullptr);
+
+    EXPECT_EQ(SgFileIO::getFilePath(QStringLiteral("/a/b/c.tar.png")), QStringLiteral("/a/b"));
+    EXPECT_EQ(SgFileIO::getBaseFileName(QStringLiteral("/a/b/c.tar.png")), QStringLiteral("c.tar"));
+    EXPECT_EQ(SgFileIO::getShortFileName(QStringLiteral("/a/b/c.png")), QStringLiteral("c.png"));
+    EXPECT_EQ(SgFileIO::getFilePath(QStringLiteral("c.png")), QString());
+    const QString maps = sgApp->getTempPath() + QStringLiteral("/FacetorMaps");
+    EXPECT_FALSE(SgFileIO::pathExists(maps, false));
+    EXPECT_TRUE(SgFileIO::pathExists(maps, true));
+    EXPECT_TRUE(QDir(maps).exists());
+
+    QImage image;
+    EXPECT_EQ(
+        sgApp->getImageMgr()->loadImage(kExamples + QStringLiteral("/scenes/skin.png"), image, -1),
+        0);
+    EXPECT_EQ(image.width(), 8);
+    EXPECT_NE(sgApp->getImageMgr()->loadImage(QStringLiteral("/nope.png"), image, -1), 0);
+    EXPECT_TRUE(image.isNull());
 }

@@ -21,6 +21,9 @@
 // The scene is sgApp->getScene(); tests that fill it should clear it when done
 // (sgApp->getScene()->clear()).
 
+#include "sgcore/app/sgapp.h"
+#include "sgcore/app/sgmessagesink.h"
+
 #include <QString>
 
 // The fresh temporary folder of this test program (no trailing slash).

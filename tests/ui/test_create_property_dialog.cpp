@@ -1,6 +1,7 @@
 #include "uitesthelpers.h"
 
 #include "sgcore/app/sgapp.h"
+#include "sgcore/app/sgimagemgr.h"
 #include "sgcore/geometry/sgobject.h"
 #include "sgcore/morph/sgmorph.h"
 #include "sgcore/properties/sgboolproperty.h"
@@ -20,9 +21,11 @@
 #include "sgcore/widgets/sgcolorwgt.h"
 #include "sgcore/widgets/sgenumslider.h"
 #include "sgcore/widgets/sgfloatslider.h"
+#include "sgcore/widgets/sgimagemenu.h"
 #include "sgcore/widgets/sgintslider.h"
 #include "sgcore/widgets/sgnodemenu.h"
 #include "sharedsource/propertyui/sgcreatepropertydlg.h"
+#include "tests/support/sgtestmain.h"
 
 #include <QCheckBox>
 #include <QComboBox>
@@ -356,11 +359,17 @@ TEST_F(CreatePropertyDialog, EachTypeCreatesItsPropertyFromTheDialogsValues) {
     EXPECT_EQ(numericNode->getSensitivity(), 0.125f);
     EXPECT_EQ(numericNode->getMin(), -2.0f);
 
+    SgTexture *skin = sgApp->getImageMgr()->getImage(sgTestPath("skin.png"));
     chooseType(*dialog, Dlg::ImageType);
     property.reset(dialog->createProperty());
     auto *imageProperty = dynamic_cast<SgImageProperty *>(property.get());
     ASSERT_NE(imageProperty, nullptr);
     EXPECT_EQ(imageProperty->getValue(), nullptr);
+    auto *images = child<SgImageMenu>(*dialog, "SgImageAttrib");
+    EXPECT_TRUE(images->getImages().contains(skin));
+    images->setCurrentImage(skin);
+    property.reset(dialog->createProperty());
+    EXPECT_EQ(static_cast<SgImageProperty *>(property.get())->getValue(), skin);
 }
 
 TEST_F(CreatePropertyDialog, CreatesOnEveryNodeAndWarnsForARefusingOne) {

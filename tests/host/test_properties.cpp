@@ -1,0 +1,213 @@
+#include "sgcore/app/sgappsettings.h"
+#include "sgcore/materials/sgdefaultmaterial.h"
+#include "sgcore/materials/sgtexture.h"
+#include "sgcore/properties/sgboolproperty.h"
+#include "sgcore/properties/sgcolorproperty.h"
+#include "sgcore/properties/sgcontroller.h"
+#include "sgcore/properties/sgenumproperty.h"
+#include "sgcore/properties/sgfloatproperty.h"
+#include "sgcore/properties/sgintproperty.h"
+#include "sgcore/properties/sgpropertygrouptree.h"
+#include "sgcore/properties/sgskeletonproperty.h"
+#include "sgcore/scene/sgnode.h"
+#include "sgcore/scene/sgskeleton.h"
+#include "tests/support/sgtestmain.h"
+
+#include <gtest/gtest.h>
+
+namespace {
+
+// Adds the value of another property times a scale.
+class AddLinked : public SgController {
+public:
+    AddLinked(SgNumericProperty *source, float scale) : m_source(source), m_scale(scale) {}
+    float evaluate(float value, const SgNumericProperty &) const override {
+        return value + m_scale * m_source->getValue();
+    }
+    SgNumericProperty *getLinkProperty() const override { return m_source; }
+
+private:
+    SgNumericProperty *m_source;
+    float m_scale;
+};
+
+SgFloatProperty *floatProp(const QString &name, const QString &path) {
+    auto *p = new SgFloatProperty(name);
+    p->setPath(path);
+    return p;
+}
+
+} // namespace
+
+TEST(HostProperties, NamesAreUniquePerElementAndOwnershipIsTracked) {
+    SgNode node(QStringLiteral("n"));
+    auto *a = floatProp(QStringLiteral("Smile"), QString());
+    EXPECT_EQ(node.addProperty(a), 0);
+    EXPECT_EQ(a->getOwner(), &node);
+    auto *dup = new SgIntProperty(QStringLiteral("Smile"));
+    EXPECT_EQ(node.addProperty(dup), 82);
+    EXPECT_EQ(dup->getOwner(), nullptr);
+    EXPECT_EQ(node.addProperty(a), SgResult::Failed);
+    EXPECT_EQ(node.addProperty(nullptr), SgResult::Failed);
+    EXPECT_EQ(node.findProperty(QStringLiteral("Smile")), a);
+    EXPECT_EQ(node.findProperty(QStringLiteral("smile")), nullptr);
+
+    const std::weak_ptr<const void> life = a->getLifeToken();
+    EXPECT_EQ(node.removeProperty(QStringLiteral("Smile")), 0);
+    EXPECT_TRUE(life.expired());
+    EXPECT_EQ(node.removeProperty(QStringLiteral("Smile")), SgResult::Failed);
+    EXPECT_EQ(node.addProperty(dup), 0);
+    EXPECT_EQ(node.takeProperty(dup), dup);
+    EXPECT_EQ(dup->getOwner(), nullptr);
+    delete dup;
+}
+
+TEST(HostProperties, ValuesPassThroughControllersAndClampOnReading) {
+    SgFloatProperty control(QStringLiteral("control"));
+    SgFloatProperty channel(QStringLiteral("channel"));
+    channel.setValue(5.0f);
+    channel.setMin(-1.0f);
+    channel.setMax(1.0f);
+    EXPECT_EQ(channel.getValue(), 5.0f);
+    channel.setIsClamped(true);
+    EXPECT_EQ(channel.getValue(), 1.0f);
+    EXPECT_EQ(channel.getRawValue(), 5.0f);
+
+    channel.setValue(0.0f);
+    auto *first = new AddLinked(&control, 0.5f);
+    auto *second = new AddLinked(&control, 0.25f);
+    EXPECT_EQ(channel.insertController(first, -1), 0);
+    EXPECT_EQ(channel.insertController(second, 0), 0);
+    EXPECT_EQ(channel.insertController(first), SgResult::Failed);
+    EXPECT_EQ(channel.getController(0), second);
+    EXPECT_EQ(channel.getLinkProperty(), &control);
+    control.setValue(0.8f);
+    EXPECT_FLOAT_EQ(channel.getValue(), 0.6f);
+    control.setValue(4.0f);
+    EXPECT_FLOAT_EQ(channel.getValue(), 1.0f);
+    EXPECT_EQ(channel.removeController(second), 0);
+    EXPECT_EQ(channel.getControllerCount(), 1);
+
+    // A link cycle reads the raw value instead of recursing.
+    control.insertController(new AddLinked(&channel, 1.0f));
+    control.setValue(0.5f);
+    EXPECT_FLOAT_EQ(control.getValue(), 0.5f + 0.5f * 0.5f);
+    control.removeAllControllers();
+    channel.removeAllControllers();
+    EXPECT_EQ(channel.getLinkProperty(), nullptr);
+
+    SgIntProperty count(QStringLiteral("count"));
+    count.setValue(7);
+    count.setMax(5);
+    count.setIsClamped(true);
+    EXPECT_EQ(count.getIntValue(), 5);
+
+    SgEnumProperty e(QStringLiteral("mode"));
+    EXPECT_EQ(e.getValue(), -1);
+    e.addItem(QStringLiteral("a"));
+    e.addItem(QStringLiteral("b"), 10);
+    e.setValue(1);
+    e.setValue(9);
+    EXPECT_EQ(e.getValueLabel(), QStringLiteral("b"));
+    EXPECT_EQ(e.getItemValue(1), 10);
+    e.removeItem(1);
+    EXPECT_EQ(e.getValue(), 0);
+
+    SgSkeleton figure(QStringLiteral("fig"));
+    SgNode prop(QStringLiteral("prop"));
+    SgSkeletonProperty sk(QStringLiteral("target"));
+    EXPECT_FALSE(sk.setValue(&prop));
+    EXPECT_TRUE(sk.setValue(&figure));
+    EXPECT_EQ(sk.getValue(), &figure);
+}
+
+TEST(HostProperties, PathsFormTheGroupTree) {
+    SgNode node(QStringLiteral("n"));
+    node.addProperty(floatProp(QStringLiteral("a"), QStringLiteral("Morphs/Face")));
+    node.addProperty(floatProp(QStringLiteral("b"), QStringLiteral("Morphs")));
+    node.addProperty(floatProp(QStringLiteral("c"), QStringLiteral("Pose//Arms/")));
+    node.addProperty(floatProp(QStringLiteral("d"), QString()));
+    node.addProperty(floatProp(QStringLiteral("e"), QStringLiteral("Morphs/Face")));
+    SgPropertyGroupTree *tree = node.getPropertyGroups();
+    ASSERT_NE(tree, nullptr);
+    EXPECT_EQ(tree->getAllPaths(),
+              (QStringList{QStringLiteral("Morphs"), QStringLiteral("Morphs/Face"),
+                           QStringLiteral("Pose"), QStringLiteral("Pose/Arms")}));
+    SgPropertyGroup *morphs = tree->getFirstChild();
+    ASSERT_NE(morphs, nullptr);
+    EXPECT_EQ(morphs->getName(), QStringLiteral("Morphs"));
+    SgPropertyGroup *face = morphs->getFirstChild();
+    ASSERT_NE(face, nullptr);
+    EXPECT_EQ(face->getPath(), QStringLiteral("Morphs/Face"));
+    EXPECT_EQ(face->getNextSibling(), nullptr);
+    const std::vector<SgProperty *> inFace = face->getProperties();
+    ASSERT_EQ(inFace.size(), 2u);
+    EXPECT_EQ(inFace[0]->getName(), QStringLiteral("a"));
+    EXPECT_EQ(morphs->getProperties().size(), 1u);
+    SgPropertyGroup *pose = morphs->getNextSibling();
+    ASSERT_NE(pose, nullptr);
+    EXPECT_EQ(pose->getFirstChild()->getProperties().size(), 1u);
+
+    // Groups made by hand stay, and the tree keeps its groups when properties change path.
+    tree->addGroup(QStringLiteral("Empty/Deep"));
+    node.findProperty(QStringLiteral("b"))->setPath(QStringLiteral("New"));
+    EXPECT_EQ(node.getPropertyGroups(), tree);
+    EXPECT_EQ(tree->getAllPaths().size(), 7);
+    EXPECT_EQ(tree->findGroup(QStringLiteral("Morphs/Face")), face);
+    EXPECT_EQ(tree->findGroup(QStringLiteral("Morphs/Nope")), nullptr);
+    EXPECT_TRUE(morphs->getProperties().empty());
+}
+
+TEST(HostProperties, DefaultMaterialOffersItsFiveProperties) {
+    SgDefaultMaterial m(QStringLiteral("Skin"));
+    for (const char *name : {"Diffuse Color", "Specular Color"}) {
+        EXPECT_NE(dynamic_cast<SgColorProperty *>(m.findProperty(QLatin1String(name))), nullptr);
+    }
+    for (const char *name : {"Glossiness", "Opacity Strength", "Bump Strength"}) {
+        EXPECT_NE(dynamic_cast<SgFloatProperty *>(m.findProperty(QLatin1String(name))), nullptr);
+    }
+    SgTexture tex(QStringLiteral("/a/skin.png"));
+    m.setDiffuseColor(QColor(255, 128, 0));
+    m.setColorMap(&tex);
+    m.setGlossinessStrength(0.25f);
+    m.getOpacityControl()->setValue(0.5f);
+    auto *diffuse = m.getDiffuseColorProperty();
+    EXPECT_EQ(diffuse->getColorValue(), QColor(255, 128, 0));
+    EXPECT_TRUE(diffuse->isMapped());
+    EXPECT_EQ(diffuse->getMapValue(), &tex);
+    std::unique_ptr<SgMaterial> copy(m.clone());
+    auto *c = static_cast<SgDefaultMaterial *>(copy.get());
+    EXPECT_EQ(c->getName(), QStringLiteral("Skin"));
+    EXPECT_EQ(c->getColorMap(), &tex);
+    EXPECT_FLOAT_EQ(c->getGlossinessStrength(), 0.25f);
+    EXPECT_FLOAT_EQ(c->getOpacityStrength(), 0.5f);
+    m.setColorMap(nullptr);
+    EXPECT_FALSE(diffuse->isMapped());
+}
+
+TEST(HostSettings, ValuesRoundTripThroughTheIniFileWithDefaults) {
+    {
+        SgAppSettings plain;
+        EXPECT_EQ(plain.getInt(QStringLiteral("FacetorBridgeTools"), 0), 0);
+        plain.setInt(QStringLiteral("FacetorBridgeTools"), 2);
+        plain.setString(QStringLiteral("LastDirectory"), QStringLiteral("/home/x"));
+        SgAppSettings group(QStringLiteral("TargetImporter"));
+        group.setString(QStringLiteral("LastDirectory"), QStringLiteral("/morphs"));
+        group.setBool(QStringLiteral("Flag"), true);
+        group.setDouble(QStringLiteral("Scale"), 0.5);
+        group.setString(QStringLiteral("NotANumber"), QStringLiteral("abc"));
+    }
+    SgAppSettings plain;
+    EXPECT_EQ(plain.getInt(QStringLiteral("FacetorBridgeTools"), 0), 2);
+    EXPECT_EQ(plain.getString(QStringLiteral("LastDirectory")), QStringLiteral("/home/x"));
+    SgAppSettings group(QStringLiteral("TargetImporter"));
+    EXPECT_EQ(group.getString(QStringLiteral("LastDirectory")), QStringLiteral("/morphs"));
+    EXPECT_TRUE(group.getBool(QStringLiteral("Flag")));
+    EXPECT_DOUBLE_EQ(group.getDouble(QStringLiteral("Scale")), 0.5);
+    EXPECT_EQ(group.getInt(QStringLiteral("NotANumber"), 7), 7);
+    EXPECT_FALSE(group.contains(QStringLiteral("Missing")));
+    EXPECT_EQ(group.getString(QStringLiteral("Missing"), QStringLiteral("d")), QStringLiteral("d"));
+    EXPECT_EQ(SgAppSettings::fileName(), sgTestPath(QStringLiteral("settings.ini")));
+    group.remove(QStringLiteral("Flag"));
+    EXPECT_FALSE(group.getBool(QStringLiteral("Flag"), false));
+}
