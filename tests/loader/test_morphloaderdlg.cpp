@@ -4,6 +4,7 @@
 
 #include "sgcore/app/sgapp.h"
 #include "sgcore/app/sgappsettings.h"
+#include "sgcore/geometry/sgobject.h"
 #include "sgcore/geometry/sgpolyshape.h"
 #include "sgcore/io/sgobjreader.h"
 #include "sgcore/morph/sgmorph.h"
@@ -35,6 +36,7 @@
 #include <QTimer>
 #include <functional>
 #include <gtest/gtest.h>
+#include <memory>
 
 namespace {
 
@@ -421,6 +423,7 @@ TEST_F(MorphLoaderDlgTest, SaveOptionsCancelAbsoluteAndWithoutObjects) {
         EXPECT_FALSE(dialog.relativePaths());
         EXPECT_TRUE(dialog.saveObjectConfigurations());
     }
+    QDir().mkpath(path("projects"));
     {
         ModalScript script({saveOptions(true, false), chooseFile(path("projects/abs.scx"))});
         save->click();
@@ -448,8 +451,24 @@ TEST_F(MorphLoaderDlgTest, RunThenSecondOkAcceptsOnlyWithoutProblems) {
     for (bool broken : {false, true}) {
         SgMorphLoaderDlg dialog(nullptr, true, nullptr, nullptr);
         dialog.findChild<QComboBox *>("MorphLoaderNodes")->setCurrentIndex(1);
-        if (broken)
+        SgNode *box = nullptr;
+        if (broken) {
             dialog.sourceList()->addFile(path("missing.obj"));
+        } else {
+            // A prop whose triangle the file lifts: a morph, and only messages in the log.
+            SgObjReader reader;
+            ASSERT_TRUE(
+                reader.readBuffer(TriangleObj.constData(), size_t(TriangleObj.size()), "box"));
+            box = new SgNode("box");
+            auto *object = new SgObject("box");
+            object->addShape(reader.takeShape("box"));
+            box->setObject(object);
+            sgApp->getScene()->addNode(box);
+            sgApp->getScene()->selectNode(box);
+            writeFile(path("lift.obj"), "v 0 0 0\nv 1 0.5 0\nv 0 1 0\nf 1 2 3\n");
+            dialog.sourceList()->addFile(path("lift.obj"));
+            findRow(topSource(dialog), "CreateControlProperty")->setValueText("False");
+        }
         dialog.show();
         QPushButton *ok = dialog.buttonBox()->button(QDialogButtonBox::Ok);
         ok->click();
@@ -458,6 +477,12 @@ TEST_F(MorphLoaderDlgTest, RunThenSecondOkAcceptsOnlyWithoutProblems) {
         EXPECT_EQ(SgAppSettings("TargetImporter").getInt("Nodes", -1), 1);
         EXPECT_EQ(SgAppSettings("TargetImporter").getString("Preset"), "Default");
         EXPECT_FALSE(dialog.findChild<QTextBrowser *>("MorphLoaderLog")->toPlainText().isNull());
+        if (box) {
+            EXPECT_TRUE(dynamic_cast<SgMorph *>(box->getObject()->findModifier("lift")));
+            EXPECT_TRUE(dialog.findChild<QTextBrowser *>("MorphLoaderLog")
+                            ->toHtml()
+                            .contains("Created morph successfully."));
+        }
         ok->click();
         EXPECT_FALSE(dialog.isVisible());
         EXPECT_EQ(dialog.result(), broken ? QDialog::Rejected : QDialog::Accepted);
@@ -478,7 +503,7 @@ TEST_F(MorphLoaderDlgTest, BridgeModeCreatePropClosesWithoutRun) {
 
     SgObjReader reader;
     ASSERT_TRUE(reader.readBuffer(TriangleObj.constData(), size_t(TriangleObj.size()), "FacMorph"));
-    SgPolyShape *shape = reader.takeShape("FacMorph");
+    std::unique_ptr<SgPolyShape> shape(reader.takeShape("FacMorph"));
     SgMorphLoaderDlg bridge(nullptr, false, shape->getGeometry(), m_figure);
     EXPECT_EQ(bridge.findChild<QPushButton *>("MorphLoaderBrowseBtn"), nullptr);
     EXPECT_EQ(bridge.findChild<SgFileIOPresetWidget *>(), nullptr);
@@ -494,7 +519,6 @@ TEST_F(MorphLoaderDlgTest, BridgeModeCreatePropClosesWithoutRun) {
     EXPECT_FALSE(bridge.isVisible());
     EXPECT_EQ(bridge.result(), QDialog::Accepted);
     EXPECT_EQ(bridge.findChild<QTextBrowser *>("MorphLoaderLog")->toPlainText(), "");
-    delete shape;
 }
 
 TEST_F(MorphLoaderDlgTest, ChooseFilesStartsInDocumentsAndRemembersFolder) {
