@@ -1,0 +1,542 @@
+// The morph loader dialog as a user drives it: the run and the two-step close, the stored
+// settings, file choice, the save options and the configuration files it writes and reads.
+#include "modalhelper.h"
+
+#include "sgcore/app/sgapp.h"
+#include "sgcore/app/sgappsettings.h"
+#include "sgcore/geometry/sgobject.h"
+#include "sgcore/geometry/sgpolyshape.h"
+#include "sgcore/io/sgobjreader.h"
+#include "sgcore/morph/sgmorph.h"
+#include "sgcore/properties/sgfloatproperty.h"
+#include "sgcore/scene/sgscene.h"
+#include "sgcore/scene/sgskeleton.h"
+#include "sgcore/settings/sgpropertysettings.h"
+#include "sgcore/widgets/sgfileiopresetwidget.h"
+#include "sharedsource/loaderui/sgconfigurationsaveoptionsdlg.h"
+#include "sharedsource/loaderui/sgmorphconfiguration.h"
+#include "sharedsource/loaderui/sgmorphfileitem.h"
+#include "sharedsource/loaderui/sgmorphloaderdlg.h"
+#include "sharedsource/loaderui/sgmorphsourceitem.h"
+#include "sharedsource/loaderui/sgmorphsourcelist.h"
+
+#include <QApplication>
+#include <QCheckBox>
+#include <QComboBox>
+#include <QDialogButtonBox>
+#include <QDir>
+#include <QDomDocument>
+#include <QFile>
+#include <QFileDialog>
+#include <QMessageBox>
+#include <QPushButton>
+#include <QRadioButton>
+#include <QTemporaryDir>
+#include <QTest>
+#include <QTextBrowser>
+#include <QTimer>
+#include <functional>
+#include <gtest/gtest.h>
+#include <memory>
+
+namespace {
+
+// Answers the modal windows that open, one handler per window in order; after `timeoutMs`
+// every stray modal is closed so that a broken test fails instead of hanging.
+class ModalScript {
+public:
+    using Step = std::function<void(QWidget *)>;
+    explicit ModalScript(QList<Step> steps, int timeoutMs = 4000) : m_steps(std::move(steps)) {
+        m_remaining = timeoutMs;
+        QObject::connect(&m_timer, &QTimer::timeout, [this] { tick(); });
+        m_timer.start(5);
+    }
+    int handled() const { return m_handled; }
+    QStringList titles() const { return m_titles; }
+
+private:
+    void tick() {
+        QWidget *modal = QApplication::activeModalWidget();
+        if (modal && modal->isVisible() && modal != m_last) {
+            m_last = modal;
+            m_titles.append(modal->windowTitle());
+            if (m_handled < m_steps.size())
+                m_steps[m_handled++](modal);
+            else
+                modal->close();
+            return;
+        }
+        if ((m_remaining -= 5) <= 0) {
+            m_timer.stop();
+            if (QWidget *stray = QApplication::activeModalWidget())
+                stray->close();
+        }
+    }
+    QList<Step> m_steps;
+    QTimer m_timer;
+    QWidget *m_last = nullptr;
+    int m_handled = 0;
+    int m_remaining = 0;
+    QStringList m_titles;
+};
+
+ModalScript::Step pressOnlyButton(QString *text = nullptr) {
+    return [text](QWidget *widget) {
+        auto *box = qobject_cast<QMessageBox *>(widget);
+        if (box && text)
+            *text = box->text();
+        if (box && box->buttons().size() == 1)
+            box->buttons().first()->click();
+        else
+            widget->close();
+    };
+}
+
+ModalScript::Step chooseFile(const QString &path, QString *directory = nullptr) {
+    return [path, directory](QWidget *widget) {
+        auto *dialog = qobject_cast<QFileDialog *>(widget);
+        if (!dialog) {
+            widget->close();
+            return;
+        }
+        if (directory)
+            *directory = dialog->directory().absolutePath();
+        if (path.isEmpty()) {
+            dialog->reject();
+            return;
+        }
+        dialog->selectFile(path);
+        static_cast<QDialog *>(dialog)->accept();
+    };
+}
+
+ModalScript::Step saveOptions(bool saveObjects, bool relative) {
+    return [saveObjects, relative](QWidget *widget) {
+        auto *dialog = qobject_cast<SgConfigurationSaveOptionsDlg *>(widget);
+        if (!dialog) {
+            widget->close();
+            return;
+        }
+        EXPECT_EQ(dialog->windowTitle(), "Project Save Options");
+        dialog->findChild<QCheckBox *>("MorphLoaderSaveObjectConfigurationCheckBox")
+            ->setChecked(saveObjects);
+        dialog
+            ->findChild<QRadioButton *>(relative ? "MorphLoaderRelativePathButton"
+                                                 : "MorphLoaderAbsolutePathButton")
+            ->setChecked(true);
+        dialog->buttonBox()->button(QDialogButtonBox::Ok)->click();
+    };
+}
+
+void writeFile(const QString &path, const QByteArray &bytes) {
+    QDir().mkpath(QFileInfo(path).absolutePath());
+    QFile file(path);
+    ASSERT_TRUE(file.open(QIODevice::WriteOnly | QIODevice::Truncate));
+    file.write(bytes);
+}
+
+QByteArray readFile(const QString &path) {
+    QFile file(path);
+    return file.open(QIODevice::ReadOnly) ? file.readAll() : QByteArray();
+}
+
+const QByteArray TriangleObj = "v 0 0 0\nv 1 0 0\nv 0 1 0\nf 1 2 3\n";
+
+// The setting row with `key` below `row` (depth first), or null.
+SgMorphSourceItem *findRow(QTreeWidgetItem *row, const QString &key) {
+    for (int i = 0; i < row->childCount(); ++i) {
+        auto *child = static_cast<SgMorphSourceItem *>(row->child(i));
+        if (child->settingKey() == key)
+            return child;
+        if (SgMorphSourceItem *found = findRow(child, key))
+            return found;
+    }
+    return nullptr;
+}
+
+QString value(QTreeWidgetItem *source, const QString &key) {
+    SgMorphSourceItem *row = findRow(source, key);
+    return row ? row->valueText() : QStringLiteral("<missing>");
+}
+
+// Every row's key and value, in shown order.
+QStringList allValues(QTreeWidgetItem *row) {
+    QStringList values;
+    for (int i = 0; i < row->childCount(); ++i) {
+        auto *child = static_cast<SgMorphSourceItem *>(row->child(i));
+        values << child->settingKey() + "=" + child->valueText();
+        values << allValues(child);
+    }
+    return values;
+}
+
+QStringList listedPaths(SgMorphSourceList *list) {
+    QStringList paths;
+    for (int i = 0; i < list->topLevelItemCount(); ++i)
+        paths << list->topLevelItem(i)->text(1);
+    return paths;
+}
+
+SgMorphFileItem *topSource(SgMorphLoaderDlg &dialog) {
+    return static_cast<SgMorphFileItem *>(dialog.sourceList()->topLevelItem(0));
+}
+
+class MorphLoaderDlgTest : public ::testing::Test {
+protected:
+    void SetUp() override {
+        ASSERT_TRUE(m_dir.isValid());
+        sgApp->getScene()->clear();
+        m_figure = new SgSkeleton("Figure");
+        sgApp->getScene()->addNode(m_figure);
+        sgApp->getScene()->selectNode(m_figure);
+        SgAppSettings(QStringLiteral("TargetImporter")).remove("LastDirectory");
+        SgAppSettings().remove("LastDirectory");
+    }
+    void TearDown() override { sgApp->getScene()->clear(); }
+    QString path(const QString &name) const { return m_dir.path() + "/" + name; }
+
+    QTemporaryDir m_dir;
+    SgSkeleton *m_figure = nullptr;
+};
+
+} // namespace
+
+TEST_F(MorphLoaderDlgTest, ObjectFileOfDefaultsIsByteExact) {
+    SgMorphLoaderDlg dialog(nullptr, true, nullptr, nullptr);
+    dialog.sourceList()->addFile(path("head.obj"));
+    dialog.saveObjectConfiguration(path("head.obj"), topSource(dialog), m_dir.path());
+    const QByteArray expected = "<VarnTargetImporter Version=\"1\">\n"
+                                " <FileType Type=\"Object\">\n"
+                                "  <ScenaraExported Value=\"False\">\n"
+                                "   <ScExportIgnoredInvisibleNodes Value=\"True\"/>\n"
+                                "   <ScExportWeldedGeom Value=\"False\"/>\n"
+                                "   <ScExportRemovedUnusedVerts Value=\"False\"/>\n"
+                                "  </ScenaraExported>\n"
+                                "  <Name Value=\"head\"/>\n"
+                                "  <PropertyGroup Value=\"Morphs/Morph Loader\"/>\n"
+                                "  <CreateControlProperty Value=\"True\">\n"
+                                "   <ERCType Value=\"0\">\n"
+                                "    <UseCustom Value=\"False\">\n"
+                                "     <CustomValue Value=\"1\"/>\n"
+                                "    </UseCustom>\n"
+                                "   </ERCType>\n"
+                                "   <Node Value=\"Figure\"/>\n"
+                                "   <Property Value=\"head\"/>\n"
+                                "   <UseSecondaryLabel Value=\"False\">\n"
+                                "    <Label Value=\"head\"/>\n"
+                                "   </UseSecondaryLabel>\n"
+                                "   <HideSecondaryProperties Value=\"False\"/>\n"
+                                "  </CreateControlProperty>\n"
+                                "  <ReverseDeformations Value=\"False\">\n"
+                                "   <Pose Value=\"None\"/>\n"
+                                "  </ReverseDeformations>\n"
+                                "  <ApplyAfterJointBinding Value=\"False\"/>\n"
+                                "  <UpdateOverrideExisting Value=\"Make Unique\">\n"
+                                "   <CleanUp Value=\"True\"/>\n"
+                                "  </UpdateOverrideExisting>\n"
+                                " </FileType>\n"
+                                "</VarnTargetImporter>\n";
+    EXPECT_EQ(readFile(path("head.obj.scx")), expected);
+    // A source without setting rows writes no file.
+    qDeleteAll(topSource(dialog)->takeChildren());
+    dialog.saveObjectConfiguration(path("empty.obj"), topSource(dialog), m_dir.path());
+    EXPECT_FALSE(QFile::exists(path("empty.obj.scx")));
+}
+
+TEST_F(MorphLoaderDlgTest, ProjectPathsRelativeAbsoluteAndNetwork) {
+    writeFile(path("proj/a.obj"), TriangleObj);
+    writeFile(path("proj-other/b.obj"), TriangleObj);
+    {
+        SgMorphLoaderDlg dialog(nullptr, true, nullptr, nullptr);
+        dialog.sourceList()->addFiles({path("proj-other/b.obj"), path("proj/a.obj")});
+        QString warning;
+        ModalScript script({pressOnlyButton(&warning)});
+        dialog.saveProjectConfiguration(path("proj/set"));
+        // The sibling folder that only starts with the project folder's name is outside it.
+        EXPECT_EQ(script.titles(), QStringList{"Relative Path Warning"});
+        EXPECT_EQ(warning, "The file, " + path("proj-other/b.obj") +
+                               ",is not in the relative path and will be saved as absolute.");
+        // The order of two attributes in an element is the DOM's own; the values are compared.
+        QDomDocument project;
+        ASSERT_TRUE(project.setContent(readFile(path("proj/set.scx"))));
+        const QDomNodeList objects = project.elementsByTagName("Object");
+        ASSERT_EQ(objects.size(), 2);
+        EXPECT_EQ(objects.at(0).toElement().attribute("Name"), "a.obj");
+        EXPECT_EQ(objects.at(0).toElement().attribute("Path"), "/a.obj");
+        EXPECT_EQ(objects.at(1).toElement().attribute("Path"), path("proj-other/b.obj"));
+        EXPECT_TRUE(QFile::exists(path("proj/a.obj.scx")));
+    }
+    // The project moved with its geometry loads the moved copy.
+    writeFile(path("copy/set.scx"), readFile(path("proj/set.scx")));
+    writeFile(path("copy/a.obj"), TriangleObj);
+    SgMorphLoaderDlg dialog(nullptr, true, nullptr, nullptr);
+    dialog.loadConfigurationFile(path("copy/set.scx"), path("copy"));
+    EXPECT_EQ(listedPaths(dialog.sourceList()),
+              (QStringList{path("copy/a.obj"), path("proj-other/b.obj")}));
+
+    EXPECT_EQ(SgMorphConfiguration::resolvePath("E:/copy", "/a.obj"), "E:/copy/a.obj");
+    EXPECT_EQ(SgMorphConfiguration::resolvePath("E:/copy", "//server/share/y.obj"),
+              "//server/share/y.obj");
+    EXPECT_EQ(SgMorphConfiguration::resolvePath("E:/copy", "E:/x/y.obj"), "E:/x/y.obj");
+    // An absolute path of this platform is kept when only it exists.
+    EXPECT_EQ(SgMorphConfiguration::resolvePath("/nowhere", path("proj/a.obj")),
+              path("proj/a.obj"));
+}
+
+TEST_F(MorphLoaderDlgTest, ProjectLoadsInSavedOrderAndSkipsMissingGeometry) {
+    const QStringList names{"one.obj", "two.obj", "gone.obj", "three.obj"};
+    QByteArray project = "<VarnTargetImporter Version=\"1\"><FileType Type=\"Project\">";
+    for (const QString &name : names) {
+        if (name != "gone.obj")
+            writeFile(path(name), TriangleObj);
+        project += "<Object Name=\"" + name.toUtf8() + "\" Path=\"/" + name.toUtf8() + "\"/>";
+    }
+    project += "</FileType></VarnTargetImporter>";
+    writeFile(path("set.scx"), project);
+    // The object file of "two" renames its morph.
+    writeFile(path("two.obj.scx"), "<VarnTargetImporter><FileType Type=\"Object\">"
+                                   "<Name Value=\"second\"/></FileType></VarnTargetImporter>");
+    SgMorphLoaderDlg dialog(nullptr, true, nullptr, nullptr);
+    ModalScript script({});
+    dialog.loadConfigurationFile(path("set.scx"), m_dir.path());
+    EXPECT_EQ(script.handled(), 0);
+    EXPECT_TRUE(script.titles().isEmpty());
+    EXPECT_EQ(listedPaths(dialog.sourceList()),
+              (QStringList{path("one.obj"), path("two.obj"), path("three.obj")}));
+    EXPECT_EQ(value(dialog.sourceList()->topLevelItem(1), "Name"), "second");
+    EXPECT_EQ(value(dialog.sourceList()->topLevelItem(0), "Name"), "one");
+}
+
+TEST_F(MorphLoaderDlgTest, BrokenFilesEndInLoadErrors) {
+    const struct {
+        QByteArray bytes;
+        QString file;
+        QString message;
+    } cases[] = {
+        {"not xml <<", "a.scx", "Error: Document could not set as xml."},
+        {"<Other Version=\"1\"><FileType Type=\"Object\"/></Other>", "b.scx",
+         "Unexpected Root tag name 'Other'...Expected 'VarnTargetImporter'"},
+        {"<VarnTargetImporter Version=\"1\"/>", "c.scx", "Root Element Has No Children"},
+        {"<VarnTargetImporter><FileType Type=\"Scene\"/></VarnTargetImporter>", "d.scx",
+         "XML Parse error, Improper Configuration type."},
+        {"<VarnTargetImporter><FileType Type=\"Object\"><Name Value=\"x\"/></FileType>"
+         "</VarnTargetImporter>",
+         "x.obj.scx",
+         "Could not locate Object file, make sure the file is located in the same directory as "
+         "the Configuration."},
+        {QByteArray(5000, '<').prepend(QByteArray(20000, 'x')), "e.scx",
+         "Error: Document could not set as xml."},
+        {QByteArray("<a>").repeated(100000), "deep.scx", "Error: Document could not set as xml."},
+    };
+    for (const auto &entry : cases) {
+        writeFile(path(entry.file), entry.bytes);
+        SgMorphLoaderDlg dialog(nullptr, true, nullptr, nullptr);
+        QString text;
+        ModalScript script({pressOnlyButton(&text)});
+        dialog.loadConfigurationFile(path(entry.file), m_dir.path());
+        EXPECT_EQ(script.titles(), QStringList{"Load Error"}) << entry.file.toStdString();
+        EXPECT_EQ(text, entry.message);
+        EXPECT_EQ(dialog.sourceList()->topLevelItemCount(), 0);
+    }
+    SgMorphLoaderDlg dialog(nullptr, true, nullptr, nullptr);
+    QString text;
+    ModalScript script({pressOnlyButton(&text)});
+    dialog.loadConfigurationFile(path("absent.scx"), m_dir.path());
+    EXPECT_EQ(text, "Error: Could not open file");
+}
+
+TEST_F(MorphLoaderDlgTest, ObjectValuesLoadAsTheRowsRead) {
+    writeFile(path("head.obj"), TriangleObj);
+    SgMorphLoaderDlg dialog(nullptr, true, nullptr, nullptr);
+    dialog.sourceList()->addFile(path("head.obj"));
+    SgMorphFileItem *source = topSource(dialog);
+    findRow(source, "UpdateOverrideExisting")->setValueText("Deltas Only");
+    findRow(source, "ERCType")->setValueText("3");
+    writeFile(path("head.obj.scx"),
+              "<VarnTargetImporter Version=\"1\"><FileType Type=\"Object\">"
+              "<CreateControlProperty Value=\"True\"><ERCType Value=\"7\">"
+              "<UseCustom Value=\"true\"/></ERCType></CreateControlProperty>"
+              "<ReverseDeformations Value=\"True\"><Pose Value=\"/pose.ds\"/></ReverseDeformations>"
+              "</FileType></VarnTargetImporter>");
+    ModalScript script({});
+    dialog.loadConfigurationFile(path("head.obj.scx"), m_dir.path());
+    // The file's geometry was listed already: its settings go to that row, with no warning.
+    EXPECT_TRUE(script.titles().isEmpty());
+    ASSERT_EQ(dialog.sourceList()->topLevelItemCount(), 1);
+    EXPECT_EQ(value(source, "ERCType"), "3");
+    EXPECT_EQ(value(source, "UseCustom"), "False");
+    EXPECT_EQ(value(source, "UpdateOverrideExisting"), "Make Unique");
+    EXPECT_EQ(value(source, "Name"), "");
+    EXPECT_EQ(value(source, "ReverseDeformations"), "True");
+    EXPECT_EQ(source->loader().poseFile(), path("pose.ds"));
+}
+
+TEST_F(MorphLoaderDlgTest, SaveThenLoadReproducesEveryRowAndTheControlProperty) {
+    writeFile(path("head.obj"), TriangleObj);
+    QStringList saved;
+    SgPropertySettings savedAttributes;
+    {
+        SgMorphLoaderDlg dialog(nullptr, true, nullptr, nullptr);
+        dialog.sourceList()->addFile(path("head.obj"));
+        SgMorphFileItem *source = topSource(dialog);
+        for (const auto &[key, text] :
+             QList<QPair<QString, QString>>{{"ScenaraExported", "True"},
+                                            {"ScExportWeldedGeom", "True"},
+                                            {"Name", "smile"},
+                                            {"PropertyGroup", "Morphs/Face"},
+                                            {"UseCustom", "True"},
+                                            {"CustomValue", "0.25"},
+                                            {"UseSecondaryLabel", "True"},
+                                            {"Label", "Grin"},
+                                            {"HideSecondaryProperties", "True"},
+                                            {"ReverseDeformations", "True"},
+                                            {"Pose", path("poses/p.ds")},
+                                            {"ApplyAfterJointBinding", "True"},
+                                            {"UpdateOverrideExisting", "Deltas and ERC Links"},
+                                            {"CleanUp", "False"}})
+            findRow(source, key)->setValueText(text);
+        auto *property = new SgFloatProperty("smile");
+        property->setLabel("Smile Control");
+        property->setMin(-1.0f);
+        property->setMax(2.0f);
+        source->loader().setControlProperty(property);
+        property->getAttributes(savedAttributes);
+        saved = allValues(source);
+        dialog.saveObjectConfiguration(path("head.obj"), source, m_dir.path());
+    }
+    EXPECT_TRUE(readFile(path("head.obj.scx")).contains("Value=\"/poses/p.ds\""));
+    SgMorphLoaderDlg dialog(nullptr, true, nullptr, nullptr);
+    dialog.loadConfigurationFile(path("head.obj.scx"), m_dir.path());
+    ASSERT_EQ(dialog.sourceList()->topLevelItemCount(), 1);
+    EXPECT_EQ(allValues(topSource(dialog)), saved);
+    SgNumericProperty *loaded = topSource(dialog)->loader().controlProperty();
+    ASSERT_NE(loaded, nullptr);
+    SgPropertySettings loadedAttributes;
+    loaded->getAttributes(loadedAttributes);
+    EXPECT_TRUE(loadedAttributes == savedAttributes);
+}
+
+TEST_F(MorphLoaderDlgTest, SaveOptionsCancelAbsoluteAndWithoutObjects) {
+    writeFile(path("geo/a.obj"), TriangleObj);
+    SgMorphLoaderDlg dialog(nullptr, true, nullptr, nullptr);
+    dialog.sourceList()->addFile(path("geo/a.obj"));
+    auto *save = dialog.findChild<QPushButton *>("MorphLoaderSaveConfigurationBtn");
+    dialog.configuration().setRelativePaths(false);
+    {
+        ModalScript script({[](QWidget *w) { w->close(); }});
+        save->click();
+        EXPECT_EQ(script.titles(), QStringList{"Project Save Options"});
+        EXPECT_FALSE(dialog.relativePaths());
+        EXPECT_TRUE(dialog.saveObjectConfigurations());
+    }
+    QDir().mkpath(path("projects"));
+    {
+        ModalScript script({saveOptions(true, false), chooseFile(path("projects/abs.scx"))});
+        save->click();
+        EXPECT_EQ(script.titles(),
+                  (QStringList{"Project Save Options", "Choose a Configuration file"}));
+        EXPECT_TRUE(readFile(path("projects/abs.scx"))
+                        .contains("Path=\"" + path("geo/a.obj").toUtf8() + "\""));
+        EXPECT_TRUE(QFile::exists(path("geo/a.obj.scx")));
+        EXPECT_EQ(SgAppSettings().getString("LastDirectory"), path("projects"));
+        EXPECT_EQ(SgAppSettings("TargetImporter").getString("LastDirectory"), "");
+    }
+    QFile::remove(path("geo/a.obj.scx"));
+    {
+        QString directory;
+        ModalScript script(
+            {saveOptions(false, true), chooseFile(path("geo/only.scx"), &directory)});
+        save->click();
+        EXPECT_EQ(directory, path("projects"));
+        EXPECT_TRUE(readFile(path("geo/only.scx")).contains("Path=\"/a.obj\""));
+        EXPECT_FALSE(QFile::exists(path("geo/a.obj.scx")));
+    }
+}
+
+TEST_F(MorphLoaderDlgTest, RunThenSecondOkAcceptsOnlyWithoutProblems) {
+    for (bool broken : {false, true}) {
+        SgMorphLoaderDlg dialog(nullptr, true, nullptr, nullptr);
+        dialog.findChild<QComboBox *>("MorphLoaderNodes")->setCurrentIndex(1);
+        SgNode *box = nullptr;
+        if (broken) {
+            dialog.sourceList()->addFile(path("missing.obj"));
+        } else {
+            // A prop whose triangle the file lifts: a morph, and only messages in the log.
+            SgObjReader reader;
+            ASSERT_TRUE(
+                reader.readBuffer(TriangleObj.constData(), size_t(TriangleObj.size()), "box"));
+            box = new SgNode("box");
+            auto *object = new SgObject("box");
+            object->addShape(reader.takeShape("box"));
+            box->setObject(object);
+            sgApp->getScene()->addNode(box);
+            sgApp->getScene()->selectNode(box);
+            writeFile(path("lift.obj"), "v 0 0 0\nv 1 0.5 0\nv 0 1 0\nf 1 2 3\n");
+            dialog.sourceList()->addFile(path("lift.obj"));
+            findRow(topSource(dialog), "CreateControlProperty")->setValueText("False");
+        }
+        dialog.show();
+        QPushButton *ok = dialog.buttonBox()->button(QDialogButtonBox::Ok);
+        ok->click();
+        EXPECT_TRUE(dialog.isVisible());
+        EXPECT_FALSE(dialog.buttonBox()->button(QDialogButtonBox::Cancel)->isEnabled());
+        EXPECT_EQ(SgAppSettings("TargetImporter").getInt("Nodes", -1), 1);
+        EXPECT_EQ(SgAppSettings("TargetImporter").getString("Preset"), "Default");
+        EXPECT_FALSE(dialog.findChild<QTextBrowser *>("MorphLoaderLog")->toPlainText().isNull());
+        if (box) {
+            EXPECT_TRUE(dynamic_cast<SgMorph *>(box->getObject()->findModifier("lift")));
+            EXPECT_TRUE(dialog.findChild<QTextBrowser *>("MorphLoaderLog")
+                            ->toHtml()
+                            .contains("Created morph successfully."));
+        }
+        ok->click();
+        EXPECT_FALSE(dialog.isVisible());
+        EXPECT_EQ(dialog.result(), broken ? QDialog::Rejected : QDialog::Accepted);
+    }
+    // The stored index comes back, unless the nodes box is fixed on the selected node.
+    SgMorphLoaderDlg offered(nullptr, true, nullptr, nullptr);
+    EXPECT_EQ(offered.findChild<QComboBox *>("MorphLoaderNodes")->currentIndex(), 1);
+    SgMorphLoaderDlg fixed(nullptr, false, nullptr, nullptr);
+    auto *nodes = fixed.findChild<QComboBox *>("MorphLoaderNodes");
+    EXPECT_EQ(nodes->currentText(), "Selected Node (Vertex Only)");
+    EXPECT_FALSE(nodes->isEnabled());
+}
+
+TEST_F(MorphLoaderDlgTest, BridgeModeCreatePropClosesWithoutRun) {
+    SgMorphLoaderDlg dialog(nullptr, false, nullptr, nullptr);
+    EXPECT_EQ(dialog.findChild<QComboBox *>("FcBridgehAction"), nullptr);
+    EXPECT_NE(dialog.findChild<QPushButton *>("MorphLoaderBrowseBtn"), nullptr);
+
+    SgObjReader reader;
+    ASSERT_TRUE(reader.readBuffer(TriangleObj.constData(), size_t(TriangleObj.size()), "FacMorph"));
+    std::unique_ptr<SgPolyShape> shape(reader.takeShape("FacMorph"));
+    SgMorphLoaderDlg bridge(nullptr, false, shape->getGeometry(), m_figure);
+    EXPECT_EQ(bridge.findChild<QPushButton *>("MorphLoaderBrowseBtn"), nullptr);
+    EXPECT_EQ(bridge.findChild<SgFileIOPresetWidget *>(), nullptr);
+    EXPECT_EQ(bridge.sourceList()->topLevelItemCount(), 1);
+    auto *actions = bridge.findChild<QComboBox *>("FcBridgehAction");
+    ASSERT_NE(actions, nullptr);
+    bridge.show();
+    actions->setCurrentIndex(1);
+    emit actions->textActivated(actions->currentText());
+    EXPECT_EQ(bridge.actionText(), "Create Prop");
+    EXPECT_FALSE(bridge.sourceList()->isEnabled());
+    bridge.buttonBox()->button(QDialogButtonBox::Ok)->click();
+    EXPECT_FALSE(bridge.isVisible());
+    EXPECT_EQ(bridge.result(), QDialog::Accepted);
+    EXPECT_EQ(bridge.findChild<QTextBrowser *>("MorphLoaderLog")->toPlainText(), "");
+}
+
+TEST_F(MorphLoaderDlgTest, ChooseFilesStartsInDocumentsAndRemembersFolder) {
+    const QString documents = path("docs");
+    QDir().mkpath(documents);
+    sgApp->setDocumentsPath(documents);
+    writeFile(path("geo/a.obj"), TriangleObj);
+    SgMorphLoaderDlg dialog(nullptr, true, nullptr, nullptr);
+    QString directory;
+    ModalScript script({chooseFile(path("geo/a.obj"), &directory)});
+    dialog.findChild<QPushButton *>("MorphLoaderBrowseBtn")->click();
+    EXPECT_EQ(directory, documents);
+    EXPECT_EQ(listedPaths(dialog.sourceList()), QStringList{path("geo/a.obj")});
+    EXPECT_EQ(SgAppSettings("TargetImporter").getString("LastDirectory"), path("geo"));
+}
