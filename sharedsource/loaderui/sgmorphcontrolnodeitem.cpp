@@ -6,12 +6,7 @@
 #include "sgcore/scene/sgskeleton.h"
 #include "sharedsource/engine/sgmorphloader.h"
 
-// The chooser menus belong to the property UI of the same library; a build without it
-// offers no chooser.
-#if __has_include("sharedsource/propertyui/sgscenenodemenu.h")
 #include "sharedsource/propertyui/sgscenenodemenu.h"
-#define SG_HAS_CHOOSER_MENU 1
-#endif
 
 namespace {
 SgNode *primarySelection() {
@@ -44,12 +39,8 @@ SgMorphControlNodeItem::SgMorphControlNodeItem(QTreeWidgetItem *parent, SgMorphL
 void SgMorphControlNodeItem::showEditor(const QPoint &position, int) {
     if (!isEnabled())
         return;
-#ifdef SG_HAS_CHOOSER_MENU
     SgSceneNodeMenu menu(menuParent(), QString());
     loader()->setControlNode(menu.chooseNode(loader()->controlNode(), position));
-#else
-    Q_UNUSED(position);
-#endif
 }
 
 QString SgMorphControlNodeItem::valueText() const {

@@ -4,12 +4,7 @@
 #include "sgcore/scene/sgnode.h"
 #include "sharedsource/engine/sgmorphloader.h"
 
-// The chooser menus belong to the property UI of the same library; a build without it
-// offers no chooser.
-#if __has_include("sharedsource/propertyui/sgpropertytreemenu.h")
 #include "sharedsource/propertyui/sgpropertytreemenu.h"
-#define SG_HAS_CHOOSER_MENU 1
-#endif
 
 SgMorphControlPropertyItem::SgMorphControlPropertyItem(QTreeWidgetItem *parent,
                                                        SgMorphLoader *loader)
@@ -25,13 +20,9 @@ SgMorphControlPropertyItem::SgMorphControlPropertyItem(QTreeWidgetItem *parent,
 void SgMorphControlPropertyItem::showEditor(const QPoint &position, int) {
     if (!isEnabled())
         return;
-#ifdef SG_HAS_CHOOSER_MENU
     SgPropertyTreeMenu menu(loader()->morphName(), loader()->controlNode(), menuParent(),
                             QString());
     loader()->setControlProperty(menu.chooseProperty(loader()->controlProperty(), position));
-#else
-    Q_UNUSED(position);
-#endif
 }
 
 void SgMorphControlPropertyItem::updateText() {
