@@ -81,26 +81,6 @@ int modifierCount(const SgNode *node) {
     return node->getObject() ? node->getObject()->getModifierCount() : 0;
 }
 
-// A figure whose two bones show separate triangles (hip first, then thigh).
-SgSkeleton *makeFigure(const QString &name) {
-    auto *figure = new SgSkeleton(name);
-    auto *hip = new SgBone(QStringLiteral("hip"));
-    auto *thigh = new SgBone(QStringLiteral("thigh"));
-    figure->addBone(hip);
-    figure->addBone(thigh, hip);
-    float offset = 0;
-    for (SgBone *bone : {hip, thigh}) {
-        auto *object = new SgObject(bone->getName());
-        object->addShape(bridgetest::makeShape(
-            bone->getName(),
-            bridgetest::makeMesh(
-                {{offset, 100, 3.25f}, {offset + 7, 100, 0}, {offset, 112.5f, 0}})));
-        bone->setObject(object);
-        offset += 20;
-    }
-    return figure;
-}
-
 // Answers the next "Changed Geometry" question with `button`, recording that it was asked.
 void answerChangedGeometry(QMessageBox::StandardButton button, int *asked) {
     bridgetest::answerModal([button, asked](QWidget *modal) {
@@ -136,7 +116,7 @@ protected:
 } // namespace
 
 TEST_F(ImportRoundTrip, EditedFigureGivesOneMorphPerMovedBoneDrivenByItsControl) {
-    SgSkeleton *figure = makeFigure(QStringLiteral("Body"));
+    SgSkeleton *figure = bridgetest::makeFigure(QStringLiteral("Body"));
     scene()->addNode(figure);
     scene()->selectNode(figure);
     // Vertex 0 of the welded figure is the hip's first vertex; 0.5 modeler units are 5 host units.
@@ -186,7 +166,7 @@ TEST_F(ImportRoundTrip, EditedFigureGivesOneMorphPerMovedBoneDrivenByItsControl)
 }
 
 TEST_F(ImportRoundTrip, UnchangedFigureGivesNoMorphAndAnswersDecideAboutAProp) {
-    SgSkeleton *figure = makeFigure(QStringLiteral("Body"));
+    SgSkeleton *figure = bridgetest::makeFigure(QStringLiteral("Body"));
     scene()->addNode(figure);
     scene()->selectNode(figure);
     int asked = 0;

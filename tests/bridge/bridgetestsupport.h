@@ -69,7 +69,9 @@ inline bool segmentExists(const char *key) {
 #include "sgcore/geometry/sgpolymesh.h"
 #include "sgcore/geometry/sgpolyshape.h"
 #include "sgcore/materials/sgdefaultmaterial.h"
+#include "sgcore/scene/sgbone.h"
 #include "sgcore/scene/sgnode.h"
+#include "sgcore/scene/sgskeleton.h"
 
 #include <initializer_list>
 
@@ -109,6 +111,25 @@ inline SgNode *makeProp(const QString &name, SgVec3 at = SgVec3()) {
     auto *node = new SgNode(name);
     node->setObject(object);
     return node;
+}
+
+// A figure labelled `name` whose two bones, hip and then thigh, show separate triangles.
+inline SgSkeleton *makeFigure(const QString &name) {
+    auto *figure = new SgSkeleton(name);
+    auto *hip = new SgBone(QStringLiteral("hip"));
+    auto *thigh = new SgBone(QStringLiteral("thigh"));
+    figure->addBone(hip);
+    figure->addBone(thigh, hip);
+    float offset = 0;
+    for (SgBone *bone : {hip, thigh}) {
+        auto *object = new SgObject(bone->getName());
+        object->addShape(
+            makeShape(bone->getName(),
+                      makeMesh({{offset, 100, 3.25f}, {offset + 7, 100, 0}, {offset, 112.5f, 0}})));
+        bone->setObject(object);
+        offset += 20;
+    }
+    return figure;
 }
 
 } // namespace bridgetest

@@ -115,26 +115,6 @@ void expectSamePoints(std::vector<Point> actual, std::vector<Point> expected, bo
     }
 }
 
-// A figure whose two bones show separate triangles.
-SgSkeleton *makeFigure(const QString &name) {
-    auto *figure = new SgSkeleton(name);
-    auto *hip = new SgBone(QStringLiteral("hip"));
-    auto *thigh = new SgBone(QStringLiteral("thigh"));
-    figure->addBone(hip);
-    figure->addBone(thigh, hip);
-    float offset = 0;
-    for (SgBone *bone : {hip, thigh}) {
-        auto *object = new SgObject(bone->getName());
-        object->addShape(bridgetest::makeShape(
-            bone->getName(),
-            bridgetest::makeMesh(
-                {{offset, 100, 3.25f}, {offset + 7, 100, 0}, {offset, 112.5f, 0}})));
-        bone->setObject(object);
-        offset += 20;
-    }
-    return figure;
-}
-
 class BridgeRoundTrip : public ::testing::Test {
 protected:
     void SetUp() override {
@@ -150,7 +130,7 @@ protected:
 TEST_F(BridgeRoundTrip, SelectedNodesArriveInOrderAndBothSidesCleanUp) {
     SgScene *scene = sgApp->getScene();
     scene->addNode(bridgetest::makeProp(QStringLiteral("Cup"), {1.5f, -2, 300}));
-    scene->addNode(makeFigure(QStringLiteral("Body")));
+    scene->addNode(bridgetest::makeFigure(QStringLiteral("Body")));
     scene->addNode(bridgetest::makeProp(QStringLiteral("Plate"), {-40, 0.125f, 9}));
     for (const char *label : {"thigh", "Plate", "Cup"})
         scene->selectNode(scene->findNodeByLabel(QString::fromLatin1(label)), true);
