@@ -178,8 +178,10 @@ std::int32_t SgSharedMemory::attachCount() const {
 }
 
 void SgSharedMemory::closeMappings() {
-    Platform::closeHandle(d->dataMapping);
+    // The reference record goes first: while the data object can still be seen the segment
+    // counts as existing, so a peer that finds it gone can create the whole segment afresh.
     Platform::closeHandle(d->referenceMapping);
+    Platform::closeHandle(d->dataMapping);
     d->dataMapping = nullptr;
     d->referenceMapping = nullptr;
 }
