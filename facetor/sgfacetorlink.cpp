@@ -110,6 +110,10 @@ bool SgFacetorLink::dataSegmentExists() {
     return m_data->exists();
 }
 
+bool SgFacetorLink::dataSegmentBusy() const {
+    return m_data->status() == SgSharedMemory::StatusAlreadyExists;
+}
+
 void SgFacetorLink::releaseData() {
     if (m_data->isAttached())
         m_data->detach();

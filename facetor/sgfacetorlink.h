@@ -42,6 +42,10 @@ public:
     // Whether a data segment exists (held by either side).
     bool dataSegmentExists();
 
+    // Whether the last writeRecord failed only because a data segment (or what is left of one
+    // that its holder is removing) still exists, so that a later try can succeed.
+    bool dataSegmentBusy() const;
+
     // Drops this process's hold on the data segment (detach and release when it exists).
     void releaseData();
 

@@ -243,11 +243,17 @@ void SgFacetorModeler::startNextReturn() {
     // acknowledgement; a return waits for it to go.
     if (m_link.dataSegmentExists())
         return;
-    const SgExchangeNode node = m_returns.dequeue();
+    const SgExchangeNode node = m_returns.head();
     if (!m_link.writeRecord(SgFacetorReturn::encode(node))) {
+        // A segment that is still being torn down by the host is tried again at the next poll;
+        // any other failure drops this return so that the rest can go.
+        if (m_link.dataSegmentBusy())
+            return;
+        m_returns.dequeue();
         log(QStringLiteral("error cannot write the returned geometry of %1").arg(node.name));
         return;
     }
+    m_returns.dequeue();
     m_returnInFlight = true;
     log(QStringLiteral("returned %1 vertices=%2").arg(node.name).arg(node.vertexCount()));
     postOrQueue(Data);
