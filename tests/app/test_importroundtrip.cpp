@@ -107,6 +107,7 @@ class ImportRoundTrip : public ::testing::Test {
 protected:
     void SetUp() override { sgApp->getScene()->clear(); }
     void TearDown() override {
+        EXPECT_EQ(bridgetest::cancelPendingAnswers(), 0) << "a question was never asked";
         sgApp->setInterface(nullptr);
         sgApp->getScene()->clear();
     }

@@ -22,10 +22,13 @@ inline SgApp *app() {
     return sgApp;
 }
 
+inline const QString kAnswerTimerName = QStringLiteral("bridgetestModalAnswer");
+
 // Answers the next modal box with `answer` (called with the box) once it is up. The test
 // main's fail-safe closes a modal that nobody answers.
 inline void answerModal(std::function<void(QWidget *)> answer) {
-    auto *timer = new QTimer;
+    auto *timer = new QTimer(qApp);
+    timer->setObjectName(kAnswerTimerName);
     QObject::connect(timer, &QTimer::timeout, [timer, answer] {
         if (QWidget *modal = QApplication::activeModalWidget()) {
             timer->stop();
@@ -34,6 +37,20 @@ inline void answerModal(std::function<void(QWidget *)> answer) {
         }
     });
     timer->start(10);
+}
+
+// Drops the answers still waiting for a modal box and returns how many there were, so that
+// an answer meant for one test never reaches the next (nor the variables it has left).
+inline int cancelPendingAnswers() {
+    const QList<QTimer *> pending =
+        qApp->findChildren<QTimer *>(kAnswerTimerName, Qt::FindDirectChildrenOnly);
+    int count = 0;
+    for (QTimer *timer : pending) {
+        if (timer->isActive())
+            ++count;
+        delete timer;
+    }
+    return count;
 }
 
 // Runs the event loop until `done` holds or `timeoutMs` passes; returns `done()`.

@@ -98,7 +98,10 @@ protected:
         scene()->clear();
         sgApp->getMessageSink()->clear();
     }
-    void TearDown() override { scene()->clear(); }
+    void TearDown() override {
+        EXPECT_EQ(bridgetest::cancelPendingAnswers(), 0) << "a question was never asked";
+        scene()->clear();
+    }
     static SgScene *scene() { return sgApp->getScene(); }
 
     static QStringList labels(const SgTArray<SgNode *> &list) {
