@@ -57,9 +57,10 @@ int main(int argc, char *argv[]) {
         QStringLiteral("folder"));
     const QCommandLineOption edit(
         QStringLiteral("edit"),
-        QStringLiteral("Return every received node after this edit [FACETOR_EDIT]. Steps, "
-                       "separated by ';': move=dx,dy,dz  scale=f  vertex=i,dx,dy,dz  name=TEXT  "
-                       "diffuse=r,g,b (offsets in the modeler's units, the host's times 0.1)."),
+        QStringLiteral(
+            "Return every received node after this edit [FACETOR_EDIT]. Steps, "
+            "separated by ';': move=dx,dy,dz  scale=f  vertex=i,dx,dy,dz  extra=x,y,z  "
+            "name=TEXT  diffuse=r,g,b (offsets in the modeler's units, the host's times 0.1)."),
         QStringLiteral("script"));
     const QCommandLineOption returnFile(
         QStringLiteral("return"),

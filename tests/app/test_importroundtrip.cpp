@@ -209,6 +209,37 @@ TEST_F(ImportRoundTrip, EditedPropGetsAMorph) {
     EXPECT_EQ(scene()->getNodeCount(), 1);
 }
 
+TEST_F(ImportRoundTrip, ChangedVertexCountAsksAndYesMakesAProp) {
+    scene()->addNode(bridgetest::makeProp(QStringLiteral("Cup"), {1, 2, 3}));
+    SgNode *cup = scene()->findNodeByLabel(QStringLiteral("Cup"));
+    scene()->selectNode(cup);
+    int asked = 0;
+    // The modeler adds a fourth vertex (with a triangle over it): no morph can be made.
+    {
+        RoundTrip trip("extra=0,0,5");
+        answerChangedGeometry(QMessageBox::No, &asked);
+        ASSERT_TRUE(trip.run()) << trip.log().toStdString();
+    }
+    EXPECT_EQ(asked, 1);
+    EXPECT_EQ(scene()->getNodeCount(), 1);
+    EXPECT_EQ(modifierCount(cup), 0);
+    EXPECT_EQ(cup->getObject()->getCurrentShape()->getGeometry()->getVertexCount(), 3);
+
+    {
+        RoundTrip trip("extra=0,0,5");
+        answerChangedGeometry(QMessageBox::Yes, &asked);
+        ASSERT_TRUE(trip.run()) << trip.log().toStdString();
+    }
+    EXPECT_EQ(asked, 2);
+    EXPECT_EQ(modifierCount(cup), 0);
+    SgNode *prop = scene()->findNodeByLabel(QStringLiteral("Cup (1)"));
+    ASSERT_NE(prop, nullptr);
+    const SgVertexMesh *mesh = prop->getObject()->getCurrentShape()->getGeometry();
+    ASSERT_EQ(mesh->getVertexCount(), 4);
+    EXPECT_NEAR(mesh->getVertex(3).z, 50.0f, 1e-4);
+    EXPECT_EQ(scene()->getNodeCount(), 2);
+}
+
 TEST_F(ImportRoundTrip, SameLabelsAreTriedInSceneOrder) {
     // The first Cup in scene order has four vertices; the one sent has three.
     auto *first = new SgNode(QStringLiteral("Cup"));
