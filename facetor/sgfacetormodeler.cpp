@@ -127,6 +127,7 @@ void SgFacetorModeler::poll() {
     SgFacetorCheckpoint::reach("unlinked");
     if (m_link.tryLink()) {
         log(QStringLiteral("linked"));
+        m_heardFromHost.start();
         SgFacetorCheckpoint::reach("linked");
         postOrQueue(Idle); // ask for the pending selection
         SgFacetorCheckpoint::reach("requested");
@@ -141,8 +142,17 @@ void SgFacetorModeler::pollLinked() {
         m_outbox.dequeue();
     int value = 0;
     const int code = m_link.take(value);
-    if (code >= 0)
+    if (code >= 0) {
+        m_heardFromHost.restart();
         react(code);
+    } else if (m_options.hostTimeoutMs > 0 && m_heardFromHost.elapsed() > m_options.hostTimeoutMs) {
+        // A host that died cannot say goodbye: a modeler left linked to it would hold the
+        // segments for good.
+        log(QStringLiteral("error the host has sent nothing for %1 ms")
+                .arg(m_options.hostTimeoutMs));
+        quit(1);
+        return;
+    }
     if (!m_selectionArrived && m_options.expect <= 0 && m_idleSince.isValid() &&
         m_idleSince.elapsed() >= kIdleGraceMs)
         selectionComplete();
