@@ -14,6 +14,7 @@
 #include "sgcore/scene/sgbone.h"
 #include "sgcore/scene/sgskeleton.h"
 
+#include <QElapsedTimer>
 #include <QFile>
 #include <QMessageBox>
 #include <QTest>
@@ -298,6 +299,70 @@ TEST_F(BridgeAction, ThePollCountsIdlePollsAndRetriesBeforeNotices) {
     bridge->checkSharedMap();
     EXPECT_FALSE(bridge->isActive());
     EXPECT_FALSE(bridge->pollTimer()->isActive());
+}
+
+TEST_F(BridgeAction, AHeldLockCostsOneWaitAndALostRecordEndsTheExchange) {
+    scene()->addNode(bridgetest::makeProp(QStringLiteral("Cup")));
+    auto bridge = linkedBridge();
+    bridge->pollTimer()->stop(); // the test steps the poll itself
+    Peer peer;
+    // An acknowledgement waits in the retry queue while the slot is taken.
+    ASSERT_TRUE(bridge->postMessage(4, 0));
+    peer.post(1);
+    bridge->checkSharedMap();
+    ASSERT_EQ(bridge->retryQueue().size(), 1);
+    EXPECT_EQ(peer.take(), 4);
+
+    // While the modeler holds the control lock a step waits for it once and posts nothing.
+    {
+        SgSharedMemory modeler(kSgControlSegmentKey);
+        ASSERT_TRUE(modeler.attach(SgSharedMemory::kReadWrite));
+        ASSERT_TRUE(modeler.tryLock(0));
+        QElapsedTimer clock;
+        clock.start();
+        bridge->checkSharedMap();
+        EXPECT_GE(clock.elapsed(), 24);
+        EXPECT_LT(clock.elapsed(), 45);
+        EXPECT_EQ(bridge->retryQueue().size(), 1);
+        modeler.unlock();
+        modeler.detach();
+        modeler.remove(SgSharedMemory::kRemoveUnlocked);
+    }
+    bridge->checkSharedMap();
+    EXPECT_EQ(peer.take(), 3);
+
+    // The modeler takes the node record and asks again without acknowledging it: the same
+    // modeler is still at work; one that has linked since has lost the record.
+    peer.post(0);
+    bridge->checkSharedMap();
+    EXPECT_EQ(peer.take(), 1);
+    bridge->checkSharedMap();
+    peer.post(0);
+    bridge->checkSharedMap();
+    EXPECT_TRUE(bridge->isExchangeBusy());
+    SgSharedMemory restarted(kSgControlSegmentKey);
+    ASSERT_TRUE(restarted.attach(SgSharedMemory::kReadWrite));
+    peer.post(0);
+    bridge->checkSharedMap();
+    EXPECT_FALSE(bridge->isExchangeBusy());
+    EXPECT_FALSE(bridgetest::segmentExists(kSgDataSegmentKey));
+
+    // A modeler that quits ends a busy exchange and drops the queued messages.
+    scene()->addNode(bridgetest::makeProp(QStringLiteral("Plate")));
+    scene()->selectNode(scene()->findNodeByLabel(QStringLiteral("Plate")));
+    bridge->executeAction();
+    peer.post(0);
+    bridge->checkSharedMap();
+    ASSERT_TRUE(bridge->isExchangeBusy());
+    EXPECT_TRUE(bridgetest::segmentExists(kSgDataSegmentKey));
+    peer.post(2);
+    bridge->checkSharedMap();
+    EXPECT_FALSE(bridge->isActive());
+    EXPECT_FALSE(bridge->isExchangeBusy());
+    EXPECT_TRUE(bridge->retryQueue().isEmpty());
+    EXPECT_FALSE(bridgetest::segmentExists(kSgDataSegmentKey));
+    restarted.detach();
+    restarted.remove(SgSharedMemory::kRemoveUnlocked);
 }
 
 TEST_F(BridgeAction, TheHostSwitchLinksWithoutRewritingTheRecord) {
