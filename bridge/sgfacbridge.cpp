@@ -62,6 +62,15 @@ SgFacBridge::SgFacBridge() : SgAction(QStringLiteral("Send to Facetor..."), QStr
 }
 
 SgFacBridge::~SgFacBridge() {
+    // Each hold is dropped outright rather than by counting the other attachments: a modeler
+    // that was killed while attached is never uncounted, and the count would keep this
+    // process's handles, and so both segments, alive until it ends. A live modeler keeps a
+    // segment alive by its own handles.
+    releaseDataSegment();
+    if (m_control->exists()) {
+        m_control->detach();
+        m_control->remove(SgSharedMemory::kRemoveUnlocked);
+    }
     m_control.reset();
     m_data.reset();
     delete m_process;
@@ -219,13 +228,18 @@ bool SgFacBridge::postMessage(int code, int value) {
 }
 
 int SgFacBridge::readMessage(int &value) {
+    m_controlLockMissed = false;
+    m_hostSlotFree = false;
     if (!m_control->isAttached())
         return Idle;
-    if (!m_control->tryLock(kControlLockMs))
+    if (!m_control->tryLock(kControlLockMs)) {
+        m_controlLockMissed = true;
         return NoMessage;
+    }
     int code = NoMessage;
     try {
         SgControlRecord *record = controlRecord(*m_control);
+        m_hostSlotFree = record->toModelerFlag == 1;
         if (record->toHostFlag == 0) {
             value = record->toHostParameter;
             code = record->toHostCode;
@@ -248,6 +262,12 @@ void SgFacBridge::releaseDataSegment() {
         m_data->detach();
         m_data->remove(SgSharedMemory::kRemoveUnlocked);
     }
+}
+
+void SgFacBridge::endExchange() {
+    releaseDataSegment();
+    m_exchangeBusy = false;
+    m_recordTaken = false;
 }
 
 void SgFacBridge::sendNext() {
@@ -275,13 +295,28 @@ void SgFacBridge::sendNext() {
     }
     queueOrPost(Data, 0);
     m_exchangeBusy = true;
+    m_recordTaken = false;
     m_sendList.removeByIndex(0, 1);
 }
 
 void SgFacBridge::checkSharedMap() {
     int value = 0;
     const int code = readMessage(value);
-    if (!m_retryQueue.isEmpty()) {
+    // The record has been taken when the slot is free with no modeler message waiting (a
+    // message 1 still queued is not in the slot yet). The number of processes attached to the
+    // control segment then is remembered: a modeler that is killed never uncounts itself, so
+    // a higher number later means that another modeler has linked since.
+    if (m_exchangeBusy && !m_recordTaken && code == NoMessage && m_hostSlotFree &&
+        !m_retryQueue.contains(std::pair<int, int>(Data, 0))) {
+        m_recordTaken = true;
+        m_attachedAtTake = m_control->attachCount();
+    }
+    if (m_controlLockMissed) {
+        // The modeler holds the control lock: a second wait for it in this step would only
+        // double the time the host stands still. The queued message or the idle notice goes
+        // out at a later step.
+        ++m_idlePolls;
+    } else if (!m_retryQueue.isEmpty()) {
         const std::pair<int, int> retry = m_retryQueue.head();
         if (postMessage(retry.first, retry.second))
             m_retryQueue.dequeue();
@@ -297,6 +332,10 @@ void SgFacBridge::checkSharedMap() {
     }
     switch (code) {
     case Idle:
+        // A modeler that has linked since the record was taken asks for the selection: the
+        // modeler that took the record without acknowledging it is gone, and the record too.
+        if (m_exchangeBusy && m_recordTaken && m_control->attachCount() > m_attachedAtTake)
+            endExchange();
         if (!m_exchangeBusy)
             sendNext();
         break;
@@ -306,14 +345,16 @@ void SgFacBridge::checkSharedMap() {
     case Quit:
         m_active = false;
         m_timer->stop();
+        // No modeler is left to acknowledge a record or take a queued message.
+        endExchange();
+        m_retryQueue.clear();
         if (m_control->exists()) {
             m_control->detach();
             m_control->remove(SgSharedMemory::kRemoveUnlocked);
         }
         break;
     case Acknowledge:
-        releaseDataSegment();
-        m_exchangeBusy = false;
+        endExchange();
         sendNext();
         break;
     case Release:

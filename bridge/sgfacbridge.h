@@ -30,7 +30,7 @@ public:
     // kernel object yet); with the host switch "-facbridge" links to the already running
     // modeler at once and starts polling.
     Q_INVOKABLE SgFacBridge();
-    // Detaches both segments (each is removed when no other process holds it).
+    // Drops this process's hold on both segments: each vanishes unless the modeler holds it.
     ~SgFacBridge() override;
 
     // The category the host lists the action under: "Facetor Bridge".
@@ -44,6 +44,8 @@ public:
     // Takes the waiting modeler-to-host message: its code (0 to 255) with its parameter in
     // `value`. 0 when the control segment is not attached; 5 when the lock is not obtained in
     // 25 ms or no message waits (`value` is then untouched).
+    // Also notes whether the lock was had and whether the modeler has taken the host's last
+    // message (see checkSharedMap).
     int readMessage(int &value);
 
     // Writes the first node of the send list into a fresh data segment and posts message 1
@@ -62,7 +64,13 @@ public:
 
 public slots:
     // One poll step: takes at most one modeler message, retries one queued host message or
-    // sends the idle notice, and reacts to the message.
+    // sends the idle notice, and reacts to the message. A step waits at most 25 ms for the
+    // control lock: when the modeler holds it, the step posts nothing either. When the last
+    // node record was taken and never acknowledged, and a modeler that has linked since asks
+    // for the selection (code 0), the modeler that took the record is gone (restarted): the
+    // exchange ends and the next node goes out. A new link shows in the control segment's
+    // attach count, which a killed modeler never lowers. A modeler that quits (code 2) ends a
+    // busy exchange too and drops the queued messages.
     void checkSharedMap();
 
 protected slots:
@@ -106,6 +114,8 @@ private:
     void queueOrPost(int code, int value);
     // Drops this process's hold on the data segment when it exists.
     void releaseDataSegment();
+    // Ends the exchange of the last node sent: drops the hold on its record, no longer busy.
+    void endExchange();
     void copyMaterialsToTarget(SgPolyShape *shape, SgNode *target);
 
     QTimer *m_timer = nullptr;
@@ -115,6 +125,14 @@ private:
     bool m_active = false;
     int m_idlePolls = 0;
     bool m_exchangeBusy = false;
+    // The last readMessage missed the control lock; it saw the host-to-modeler slot free.
+    bool m_controlLockMissed = false;
+    bool m_hostSlotFree = false;
+    // The modeler has taken the node record of the busy exchange (seen at a poll when no
+    // modeler message was waiting), and how many processes were attached to the control
+    // segment then.
+    bool m_recordTaken = false;
+    int32_t m_attachedAtTake = 0;
     SgTArray<SgNode *> m_sendList{8};
     QQueue<std::pair<int, int>> m_retryQueue;
     qint64 m_modelerPid = 0;

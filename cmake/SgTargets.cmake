@@ -20,7 +20,15 @@ function(sg_add_gtest)
         target_link_libraries(${T_NAME} PRIVATE ${T_LIBS} sgtestmain GTest::gtest)
     endif()
     sg_warnings(${T_NAME})
-    add_test(NAME ${T_NAME} COMMAND ${T_NAME})
+    # A resource lock also holds across build folders: the segment keys of the modeler are
+    # machine-wide, so two checkouts testing at once would meet in them.
+    find_program(SG_FLOCK flock)
+    if(T_RESOURCE_LOCK AND SG_FLOCK)
+        add_test(NAME ${T_NAME} COMMAND ${SG_FLOCK} --close /tmp/sg-test-${T_RESOURCE_LOCK}.lock
+            $<TARGET_FILE:${T_NAME}>)
+    else()
+        add_test(NAME ${T_NAME} COMMAND ${T_NAME})
+    endif()
     if(NOT T_TIMEOUT)
         set(T_TIMEOUT 300)
     endif()

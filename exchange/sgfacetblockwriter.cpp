@@ -12,8 +12,10 @@ namespace {
 
 using Tally = std::array<std::int64_t, 256>;
 
-// How far ahead of a write position the destination is fetched (a few cache lines).
-constexpr size_t kPrefetchDistance = 256;
+// How far ahead of a write position the destination is fetched. Eight lines ahead leave time
+// for the fetch to land even when 256 materials take turns at random (measured against 2, 4,
+// 6, 12 and 16 lines with the exchange benchmark).
+constexpr size_t kPrefetchDistance = 512;
 
 // Facet records and their bytes per material, for each of the three kinds.
 struct MaterialTally {

@@ -57,9 +57,10 @@ int main(int argc, char *argv[]) {
         QStringLiteral("folder"));
     const QCommandLineOption edit(
         QStringLiteral("edit"),
-        QStringLiteral("Return every received node after this edit [FACETOR_EDIT]. Steps, "
-                       "separated by ';': move=dx,dy,dz  scale=f  vertex=i,dx,dy,dz  name=TEXT  "
-                       "diffuse=r,g,b (offsets in the modeler's units, the host's times 0.1)."),
+        QStringLiteral(
+            "Return every received node after this edit [FACETOR_EDIT]. Steps, "
+            "separated by ';': move=dx,dy,dz  scale=f  vertex=i,dx,dy,dz  extra=x,y,z  "
+            "name=TEXT  diffuse=r,g,b (offsets in the modeler's units, the host's times 0.1)."),
         QStringLiteral("script"));
     const QCommandLineOption returnFile(
         QStringLiteral("return"),
@@ -89,8 +90,14 @@ int main(int argc, char *argv[]) {
         QStringLiteral("Give up when the host has not set the link up within this many "
                        "milliseconds [FACETOR_LINK_TIMEOUT]; default 30000."),
         QStringLiteral("ms"));
-    parser.addOptions(
-        {link, workspace, edit, returnFile, watch, expect, quitWhenDone, logFile, linkTimeout});
+    const QCommandLineOption hostTimeout(
+        QStringLiteral("host-timeout"),
+        QStringLiteral("Quit when the linked host has sent nothing (not even its idle notice) "
+                       "for this many milliseconds [FACETOR_HOST_TIMEOUT]; default 10000, 0 "
+                       "waits for ever."),
+        QStringLiteral("ms"));
+    parser.addOptions({link, workspace, edit, returnFile, watch, expect, quitWhenDone, logFile,
+                       linkTimeout, hostTimeout});
     // The host passes its switch with a single dash.
     parser.setSingleDashWordOptionMode(QCommandLineParser::ParseAsLongOptions);
     parser.process(app);
@@ -116,6 +123,9 @@ int main(int argc, char *argv[]) {
     const QString timeout = valueOf(parser, linkTimeout, "FACETOR_LINK_TIMEOUT");
     if (!timeout.isEmpty())
         options.linkTimeoutMs = timeout.toInt();
+    const QString silence = valueOf(parser, hostTimeout, "FACETOR_HOST_TIMEOUT");
+    if (!silence.isEmpty())
+        options.hostTimeoutMs = silence.toInt();
 
     std::signal(SIGINT, onSignal);
     std::signal(SIGTERM, onSignal);

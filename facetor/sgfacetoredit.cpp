@@ -15,6 +15,26 @@ bool parseNumbers(const QString &text, int count, QList<float> &numbers) {
     return true;
 }
 
+// Appends the vertex `at` and, when the node has two vertices to join it to, a triangle over
+// vertices 0, 1 and the new one, so that the returned geometry has one vertex more.
+void addVertex(SgExchangeNode &node, const QList<float> &at) {
+    const int32_t added = node.vertexCount();
+    node.vertices.insert(node.vertices.end(), at.begin(), at.end());
+    if (added < 2)
+        return;
+    SgExchangeNode::Facet facet;
+    facet.type = 'T';
+    facet.firstCorner = uint32_t(node.corners.size());
+    facet.cornerCount = 3;
+    for (const int32_t vertex : {int32_t(0), int32_t(1), added}) {
+        SgExchangeNode::Corner corner;
+        corner.vertex = vertex;
+        corner.uv = node.uvCount() > 0 ? 0 : -1;
+        node.corners.push_back(corner);
+    }
+    node.facets.push_back(facet);
+}
+
 } // namespace
 
 bool SgFacetorEdit::parse(const QString &script, QString &error) {
@@ -32,6 +52,8 @@ bool SgFacetorEdit::parse(const QString &script, QString &error) {
             ok = parseNumbers(argument, 1, parsed.numbers);
         else if (ok && parsed.kind == QLatin1String("vertex"))
             ok = parseNumbers(argument, 4, parsed.numbers);
+        else if (ok && parsed.kind == QLatin1String("extra"))
+            ok = parseNumbers(argument, 3, parsed.numbers);
         else if (ok && parsed.kind == QLatin1String("diffuse"))
             ok = parseNumbers(argument, 3, parsed.numbers);
         else if (ok && parsed.kind == QLatin1String("name"))
@@ -61,6 +83,8 @@ void SgFacetorEdit::apply(SgExchangeNode &node) const {
             if (index >= 0 && index < node.vertexCount())
                 for (int axis = 0; axis < 3; ++axis)
                     node.vertices[size_t(index) * 3 + size_t(axis)] += step.numbers[axis + 1];
+        } else if (step.kind == QLatin1String("extra")) {
+            addVertex(node, step.numbers);
         } else if (step.kind == QLatin1String("name")) {
             node.name = step.text;
         } else if (step.kind == QLatin1String("diffuse")) {

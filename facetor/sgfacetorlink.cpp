@@ -3,12 +3,21 @@
 #include "exchange/sgexchangenodereader.h"
 #include "exchange/shm/sgcontrolrecord.h"
 #include "exchange/shm/sgsharedmemory.h"
+#include "facetor/sgfacetorcheckpoint.h"
 
 #include <cstring>
 
 namespace {
 // Control accesses never hold up the modeler for longer than this.
 constexpr int kControlLockMs = 25;
+
+// The checkpoint reached while a message of `code` is being posted under the control lock.
+const char *postPoint(int code) {
+    static constexpr const char *kPoints[] = {"post-idle-locked", "post-data-locked",
+                                              "post-quit-locked", "post-ack-locked",
+                                              "post-release-locked"};
+    return code >= 0 && code < 5 ? kPoints[code] : "post-other-locked";
+}
 } // namespace
 
 SgFacetorLink::SgFacetorLink()
@@ -28,6 +37,7 @@ bool SgFacetorLink::tryLink() {
     }
     // The host writes a fresh record (both flags "free") right after creating the segment; a
     // record of zeros is one the host has not set up yet.
+    SgFacetorCheckpoint::reach("link-locked");
     const auto *record = reinterpret_cast<const SgControlRecord *>(m_control->data());
     const bool ready = record->toHostFlag == 1;
     m_control->unlock();
@@ -45,6 +55,7 @@ bool SgFacetorLink::post(int code, int value) {
     auto *record = reinterpret_cast<SgControlRecord *>(m_control->data());
     bool posted = false;
     if (record->toHostFlag == 1) {
+        SgFacetorCheckpoint::reach(postPoint(code));
         record->toHostCode = uint8_t(code);
         record->toHostParameter = value;
         record->toHostFlag = 0;
@@ -60,6 +71,7 @@ int SgFacetorLink::take(int &value) {
     auto *record = reinterpret_cast<SgControlRecord *>(m_control->data());
     int code = -1;
     if (record->toModelerFlag == 0) {
+        SgFacetorCheckpoint::reach("take-locked");
         code = record->toModelerCode;
         value = record->toModelerParameter;
         record->toModelerFlag = 1;
@@ -74,35 +86,49 @@ bool SgFacetorLink::readNode(SgExchangeNode &node, QString &error) {
         error = QStringLiteral("There is no data segment.");
         return false;
     }
+    SgFacetorCheckpoint::reach("node-attached");
     bool ok = false;
     if (m_data->lock()) {
+        SgFacetorCheckpoint::reach("node-locked");
         SgExchangeNodeReader reader(m_data->data(), std::size_t(std::max(0, m_data->size())));
         ok = reader.read(node);
         if (!ok)
             error = reader.errorString();
+        SgFacetorCheckpoint::reach("node-read-locked");
         m_data->unlock();
     } else {
         error = QStringLiteral("The data segment's lock cannot be had.");
     }
+    SgFacetorCheckpoint::reach("node-read");
     m_data->detach();
+    SgFacetorCheckpoint::reach("node-detached");
     m_data->remove(SgSharedMemory::kRemoveUnlocked);
+    SgFacetorCheckpoint::reach("node-released");
     return ok;
 }
 
 bool SgFacetorLink::writeRecord(const QByteArray &record) {
     if (record.isEmpty() || !m_data->create(int32_t(record.size())))
         return false;
+    SgFacetorCheckpoint::reach("return-created");
     if (!m_data->attach(SgSharedMemory::kReadWrite)) {
         m_data->remove(SgSharedMemory::kRemoveUnlocked);
         return false;
     }
+    SgFacetorCheckpoint::reach("return-attached");
     if (!m_data->lock() || m_data->size() < record.size()) {
         m_data->unlock();
         releaseData();
         return false;
     }
-    std::memcpy(m_data->data(), record.constData(), size_t(record.size()));
+    SgFacetorCheckpoint::reach("return-locked");
+    // Written in two halves, so that a test can stop the modeler with half a record written.
+    const auto half = size_t(record.size()) / 2;
+    std::memcpy(m_data->data(), record.constData(), half);
+    SgFacetorCheckpoint::reach("return-half-written");
+    std::memcpy(m_data->data() + half, record.constData() + half, size_t(record.size()) - half);
     m_data->unlock();
+    SgFacetorCheckpoint::reach("return-written");
     return true;
 }
 

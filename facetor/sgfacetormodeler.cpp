@@ -1,5 +1,6 @@
 #include "facetor/sgfacetormodeler.h"
 
+#include "facetor/sgfacetorcheckpoint.h"
 #include "facetor/sgfacetorreturn.h"
 
 #include <QCoreApplication>
@@ -86,6 +87,7 @@ bool SgFacetorModeler::start() {
         connect(watcher, &QFileSystemWatcher::fileChanged, this,
                 &SgFacetorModeler::workspaceFileChanged);
     }
+    SgFacetorCheckpoint::setReporter([this](const QString &line) { log(line); });
     log(QStringLiteral("workspace %1").arg(m_workspace->folder().absolutePath()));
     m_linkDeadline = QDateTime::currentDateTimeUtc().addMSecs(m_options.linkTimeoutMs);
     m_timer->start(m_options.pollMs);
@@ -98,12 +100,14 @@ void SgFacetorModeler::quit(int exitCode) {
     m_quitting = true;
     m_timer->stop();
     if (m_link.isLinked()) {
+        SgFacetorCheckpoint::reach("goodbye");
         QElapsedTimer waited;
         waited.start();
         bool posted = false;
         while (!(posted = m_link.post(Quit)) && waited.elapsed() < kGoodbyeMs)
             QThread::msleep(2);
         log(posted ? QStringLiteral("goodbye posted") : QStringLiteral("goodbye not taken"));
+        SgFacetorCheckpoint::reach("goodbye-posted");
     }
     m_link.releaseData();
     m_link.unlink();
@@ -120,9 +124,13 @@ void SgFacetorModeler::poll() {
         pollLinked();
         return;
     }
+    SgFacetorCheckpoint::reach("unlinked");
     if (m_link.tryLink()) {
         log(QStringLiteral("linked"));
+        m_heardFromHost.start();
+        SgFacetorCheckpoint::reach("linked");
         postOrQueue(Idle); // ask for the pending selection
+        SgFacetorCheckpoint::reach("requested");
     } else if (QDateTime::currentDateTimeUtc() > m_linkDeadline) {
         log(QStringLiteral("error the host never set the control segment up"));
         quit(1);
@@ -134,8 +142,17 @@ void SgFacetorModeler::pollLinked() {
         m_outbox.dequeue();
     int value = 0;
     const int code = m_link.take(value);
-    if (code >= 0)
+    if (code >= 0) {
+        m_heardFromHost.restart();
         react(code);
+    } else if (m_options.hostTimeoutMs > 0 && m_heardFromHost.elapsed() > m_options.hostTimeoutMs) {
+        // A host that died cannot say goodbye: a modeler left linked to it would hold the
+        // segments for good.
+        log(QStringLiteral("error the host has sent nothing for %1 ms")
+                .arg(m_options.hostTimeoutMs));
+        quit(1);
+        return;
+    }
     if (!m_selectionArrived && m_options.expect <= 0 && m_idleSince.isValid() &&
         m_idleSince.elapsed() >= kIdleGraceMs)
         selectionComplete();
@@ -158,7 +175,9 @@ void SgFacetorModeler::react(int code) {
         break;
     case Acknowledge:
         log(QStringLiteral("host read the returned geometry"));
+        SgFacetorCheckpoint::reach("return-acknowledged");
         m_link.releaseData();
+        SgFacetorCheckpoint::reach("return-released");
         m_returnInFlight = false;
         ++m_returned;
         startNextReturn();
@@ -186,6 +205,7 @@ void SgFacetorModeler::receiveNode() {
     SgExchangeNode node;
     QString error;
     if (m_link.readNode(node, error)) {
+        SgFacetorCheckpoint::reach("node-received");
         const QString path = m_workspace->writeNode(node);
         ++m_received;
         log(QStringLiteral("received %1 vertices=%2 facets=%3 materials=%4 file=%5")
@@ -207,6 +227,7 @@ void SgFacetorModeler::receiveNode() {
         log(QStringLiteral("error the node record cannot be read: %1").arg(error));
     }
     postOrQueue(Acknowledge);
+    SgFacetorCheckpoint::reach("node-acknowledged");
     if (!m_selectionArrived && m_options.expect > 0 && m_received >= m_options.expect)
         selectionComplete();
 }
@@ -257,6 +278,7 @@ void SgFacetorModeler::startNextReturn() {
     m_returnInFlight = true;
     log(QStringLiteral("returned %1 vertices=%2").arg(node.name).arg(node.vertexCount()));
     postOrQueue(Data);
+    SgFacetorCheckpoint::reach("return-announced");
 }
 
 void SgFacetorModeler::postOrQueue(int code) {

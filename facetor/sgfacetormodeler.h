@@ -28,6 +28,8 @@ struct SgFacetorOptions {
                                // host's idle notice is not followed by a node within 250 ms)
     QString logFile;           // one line per event ("" for standard error)
     int linkTimeoutMs = 30000; // give up when the host never sets the control segment up
+    int hostTimeoutMs = 10000; // quit when a linked host has sent nothing for this long (it
+                               // sends an idle notice every 500 ms while it lives)
     int pollMs = 2;            // how often the control record is polled
 };
 
@@ -77,6 +79,7 @@ private:
     QQueue<SgExchangeNode> m_returns;
     QHash<QString, QDateTime> m_writtenAt;
     QElapsedTimer m_idleSince;
+    QElapsedTimer m_heardFromHost;
     bool m_quitting = false;
     bool m_selectionArrived = false;
     bool m_returnInFlight = false;

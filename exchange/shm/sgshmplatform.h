@@ -65,6 +65,7 @@ public:
     static int lastError();
 
     // The name under which the kernel keeps the object `name` ("/name-u<uid>" on POSIX, where
-    // /dev/shm shows it without the slash; `name` itself on Windows).
+    // /dev/shm shows it without the slash, with "-<space>" appended when the environment
+    // variable SG_SHM_TEST_NAMESPACE is set to a space for tests; `name` itself on Windows).
     static std::string nativeName(const std::string &name);
 };

@@ -13,6 +13,7 @@
 #include <algorithm>
 #include <cerrno>
 #include <chrono>
+#include <cstdlib>
 #include <new>
 #include <thread>
 
@@ -259,5 +260,11 @@ int SgShmPlatform::lastError() {
 }
 
 std::string SgShmPlatform::nativeName(const std::string &name) {
-    return "/" + name + "-u" + std::to_string(geteuid());
+    // Tests that run from several build folders at once keep apart through a namespace of
+    // their own (the product never sets it); a child process inherits it.
+    static const std::string space = [] {
+        const char *value = std::getenv("SG_SHM_TEST_NAMESPACE");
+        return value && *value ? std::string("-") + value : std::string();
+    }();
+    return "/" + name + "-u" + std::to_string(geteuid()) + space;
 }

@@ -1,5 +1,7 @@
 #include "sharedsource/engine/sgmorphloader.h"
 
+#include "sharedsource/engine/sgdeltablock.h"
+
 #include "sharedsource/engine/sgmorphloadlog.h"
 
 #include "sgcore/app/sgapp.h"
@@ -109,9 +111,14 @@ std::unique_ptr<SgMorphDeltas> makeDeltas(const SgVertexMesh &base, const SgVert
     std::unique_ptr<SgMorphDeltas> deltas;
     size_t used = 0;
     bool invalid = false;
+    bool lastBlockAllMoved = false;
+    int blockVertices[kScanBlock];
+    SgVec3 blockDeltas[kScanBlock];
     for (size_t start = 0; start < n; start += kScanBlock) {
         const size_t end = std::min(start + kScanBlock, n);
-        if (end - start == kScanBlock) {
+        // After a block whose every vertex moved the next one most likely moves too: the scan
+        // would only read it twice.
+        if (end - start == kScanBlock && !lastBlockAllMoved) {
             // Most vertices of a morph target do not move: a branch-free pass over a full
             // block tells whether any component moved (or is not a number) at all.
             int moved = 0;
@@ -124,27 +131,19 @@ std::unique_ptr<SgMorphDeltas> makeDeltas(const SgVertexMesh &base, const SgVert
         }
         if (!deltas) {
             // Room for every vertex from here on (reserved, not yet written); each block with
-            // motion then extends the arrays while they are in the cache.
+            // motion is made in the cache and then appended.
             deltas = std::make_unique<SgMorphDeltas>();
             deltas->setVertCount(count);
             deltas->reserve(int(n - start));
         }
-        deltas->vertexArray().resize(used + (end - start));
-        deltas->deltaArray().resize(used + (end - start));
-        int *vertexOut = deltas->vertexArray().data();
-        SgVec3 *deltaOut = deltas->deltaArray().data();
-        // Every vertex is written; only a moved one advances the output (no branch to
-        // mispredict when about half of a block moves).
-        for (size_t i = start; i < end; ++i) {
-            const SgVec3 d = m[i] - b[i];
-            const bool moved =
-                !(std::fabs(d.x) <= kDeltaThreshold && std::fabs(d.y) <= kDeltaThreshold &&
-                  std::fabs(d.z) <= kDeltaThreshold);
-            invalid |= moved && !std::isfinite(d.x + d.y + d.z);
-            vertexOut[used] = int(i);
-            deltaOut[used] = d;
-            used += moved;
-        }
+        const size_t kept =
+            sgWriteDeltaBlock(mf + start * 3, bf + start * 3, start, end - start, blockVertices,
+                              reinterpret_cast<float *>(blockDeltas), kDeltaThreshold, invalid);
+        deltas->vertexArray().insert(deltas->vertexArray().end(), blockVertices,
+                                     blockVertices + kept);
+        deltas->deltaArray().insert(deltas->deltaArray().end(), blockDeltas, blockDeltas + kept);
+        used += kept;
+        lastBlockAllMoved = kept == end - start;
     }
     if (invalid) {
         outcome = DeltaOutcome::InvalidTarget;
@@ -156,8 +155,6 @@ std::unique_ptr<SgMorphDeltas> makeDeltas(const SgVertexMesh &base, const SgVert
     }
     std::vector<int> &vertices = deltas->vertexArray();
     std::vector<SgVec3> &values = deltas->deltaArray();
-    vertices.resize(used);
-    values.resize(used);
     if (used < vertices.capacity() / 2) {
         vertices.shrink_to_fit();
         values.shrink_to_fit();

@@ -5,6 +5,9 @@
 #include "sgcore/geometry/sgpolymesh.h"
 #include "sgcore/io/sgobjreader.h"
 
+#include "bridgetestsupport.h"
+#include "exchange/shm/sgcontrolrecord.h"
+
 #include <QDir>
 #include <QFile>
 #include <QProcess>
@@ -98,10 +101,8 @@ TEST(HeadlessDemo, RoundTripMakesMorphsAndExportsTheFigureAtValueOne) {
     }
     EXPECT_EQ(offset, result->getVertexCount());
     // Nothing of the bridge's segments is left behind.
-    EXPECT_TRUE(QDir(QStringLiteral("/dev/shm"))
-                    .entryList({QStringLiteral("sgsharedmemory-*")}, QDir::Files)
-                    .filter(QStringLiteral("464143")) // "FAC" in hexadecimal
-                    .isEmpty());
+    EXPECT_TRUE(bridgetest::segmentFiles(kSgControlSegmentKey).isEmpty());
+    EXPECT_TRUE(bridgetest::segmentFiles(kSgDataSegmentKey).isEmpty());
 }
 
 TEST(HeadlessDemo, ScriptFailuresAndArguments) {

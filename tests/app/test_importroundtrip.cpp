@@ -11,6 +11,7 @@
 #include "sgcore/geometry/sgpolymesh.h"
 #include "sgcore/geometry/sgpolyshape.h"
 #include "sgcore/io/sgobjreader.h"
+#include "sgcore/io/sgscenefile.h"
 #include "sgcore/materials/sgdefaultmaterial.h"
 #include "sgcore/morph/sgmorph.h"
 #include "sgcore/morph/sgmorphdeltas.h"
@@ -20,6 +21,7 @@
 
 #include <QAbstractButton>
 #include <QComboBox>
+#include <QElapsedTimer>
 #include <QFile>
 #include <QMainWindow>
 #include <QMessageBox>
@@ -167,6 +169,37 @@ TEST_F(ImportRoundTrip, EditedPropGetsAMorph) {
     EXPECT_EQ(scene()->getNodeCount(), 1);
 }
 
+TEST_F(ImportRoundTrip, ChangedVertexCountAsksAndYesMakesAProp) {
+    scene()->addNode(bridgetest::makeProp(QStringLiteral("Cup"), {1, 2, 3}));
+    SgNode *cup = scene()->findNodeByLabel(QStringLiteral("Cup"));
+    scene()->selectNode(cup);
+    int asked = 0;
+    // The modeler adds a fourth vertex (with a triangle over it): no morph can be made.
+    {
+        RoundTrip trip("extra=0,0,5");
+        answerChangedGeometry(QMessageBox::No, &asked);
+        ASSERT_TRUE(trip.run()) << trip.log().toStdString();
+    }
+    EXPECT_EQ(asked, 1);
+    EXPECT_EQ(scene()->getNodeCount(), 1);
+    EXPECT_EQ(modifierCount(cup), 0);
+    EXPECT_EQ(cup->getObject()->getCurrentShape()->getGeometry()->getVertexCount(), 3);
+
+    {
+        RoundTrip trip("extra=0,0,5");
+        answerChangedGeometry(QMessageBox::Yes, &asked);
+        ASSERT_TRUE(trip.run()) << trip.log().toStdString();
+    }
+    EXPECT_EQ(asked, 2);
+    EXPECT_EQ(modifierCount(cup), 0);
+    SgNode *prop = scene()->findNodeByLabel(QStringLiteral("Cup (1)"));
+    ASSERT_NE(prop, nullptr);
+    const SgVertexMesh *mesh = prop->getObject()->getCurrentShape()->getGeometry();
+    ASSERT_EQ(mesh->getVertexCount(), 4);
+    EXPECT_NEAR(mesh->getVertex(3).z, 50.0f, 1e-4);
+    EXPECT_EQ(scene()->getNodeCount(), 2);
+}
+
 TEST_F(ImportRoundTrip, SameLabelsAreTriedInSceneOrder) {
     // The first Cup in scene order has four vertices; the one sent has three.
     auto *first = new SgNode(QStringLiteral("Cup"));
@@ -229,4 +262,43 @@ TEST_F(ImportRoundTrip, DialogChoosesMaterialsOrMorphAndMaterials) {
     EXPECT_EQ(skin->getDiffuseColor(), QColor(0, 255, 0));
     EXPECT_EQ(modifierCount(cup), 1);
     EXPECT_EQ(scene()->getNodeCount(), 1);
+}
+
+TEST_F(ImportRoundTrip, ExampleFigureAndPropComeBackAsMorphsInTime) {
+    SgSceneFile file;
+    ASSERT_TRUE(file.load(QStringLiteral(SG_EXAMPLES_DIR "/demo/scene.json"), scene()))
+        << file.getErrorString().toStdString();
+    SgNode *figure = scene()->findNodeByLabel(QStringLiteral("Blobby"));
+    SgNode *box = scene()->findNodeByLabel(QStringLiteral("Box"));
+    ASSERT_NE(figure, nullptr);
+    ASSERT_NE(box, nullptr);
+    scene()->selectNode(figure);
+    scene()->selectNode(box, true);
+    RoundTrip trip("move=0,0.5,0");
+    qputenv("FACETOR_EXPECT", "2");
+    // From the send (the modeler's launch included) to each node's morph.
+    QElapsedTimer clock;
+    clock.start();
+    TestBridge bridge;
+    bridge.executeAction();
+    qint64 figureMs = -1;
+    qint64 boxMs = -1;
+    SgNode *hip = scene()->findNodeByLabel(QStringLiteral("hip"));
+    ASSERT_TRUE(bridgetest::waitUntil(
+        [&] {
+            if (figureMs < 0 && morphOn(hip))
+                figureMs = clock.elapsed();
+            if (boxMs < 0 && morphOn(box))
+                boxMs = clock.elapsed();
+            return !bridge.isActive();
+        },
+        30000))
+        << trip.log().toStdString();
+    ASSERT_GE(figureMs, 0) << trip.log().toStdString();
+    ASSERT_GE(boxMs, 0) << trip.log().toStdString();
+    for (SgBone *bone : static_cast<SgSkeleton *>(figure)->getAllBones())
+        EXPECT_NE(morphOn(bone), nullptr) << bone->getLabel().toStdString();
+    std::printf("round trip from send to morph: figure %lld ms, prop %lld ms (modeler launch "
+                "included)\n",
+                figureMs, boxMs);
 }

@@ -15,6 +15,8 @@
 
 #include <functional>
 
+#include <unistd.h>
+
 namespace bridgetest {
 
 // The host application, made by the test main before any test runs.
@@ -62,12 +64,21 @@ inline bool waitUntil(const std::function<bool()> &done, int timeoutMs) {
     return done();
 }
 
-// The files of a segment key in the shared-memory folder (data, "-ref" and "-lock" objects).
-// Looking at the folder, rather than opening the segment, leaves no handle behind.
+// The files of a segment key in the shared-memory folder (data, "-ref" and "-lock" objects)
+// of this user and of this test namespace (SG_SHM_TEST_NAMESPACE). Looking at the folder,
+// rather than opening the segment, leaves no handle behind.
 inline QStringList segmentFiles(const char *key) {
     const QString prefix =
         QStringLiteral("sgsharedmemory-") + QString::fromLatin1(QByteArray(key).toHex());
-    return QDir(QStringLiteral("/dev/shm")).entryList({prefix + QLatin1Char('*')}, QDir::Files);
+    const QByteArray space = qgetenv("SG_SHM_TEST_NAMESPACE");
+    const QString suffix = QStringLiteral("-u%1").arg(geteuid()) +
+                           (space.isEmpty() ? QString() : "-" + QString::fromUtf8(space));
+    QStringList files;
+    for (const QString &file :
+         QDir(QStringLiteral("/dev/shm")).entryList({prefix + QLatin1Char('*')}, QDir::Files))
+        if (file.endsWith(suffix))
+            files << file;
+    return files;
 }
 
 // Whether the data object of a segment key exists.

@@ -4,8 +4,11 @@
 #include "sharedsource/engine/sgmorphloader.h"
 
 #include <cmath>
+#include <cstdint>
 #include <limits>
 #include <memory>
+#include <utility>
+#include <vector>
 
 using namespace enginetest;
 
@@ -35,6 +38,43 @@ TEST_F(Deltas, ThresholdIsStrictlyAboveOneThousandth) {
     EXPECT_NEAR(deltas->getDelta(0).y, 0.0011f, 1e-6);
     EXPECT_EQ(deltas->getVertex(1), 199);
     EXPECT_NEAR(deltas->getDelta(1).y, -0.0011f, 1e-6);
+}
+
+TEST_F(Deltas, MatchAPlainLoopWhateverTheMixOfMovedAndQuietVertices) {
+    // Runs of fully moved blocks; after them blocks with one quiet vertex, with a random third
+    // quiet, or with a single moved vertex, at shifting positions; single moved axes at every
+    // position of a vertex; and a tail shorter than a block.
+    const int count = 64 * 40 + 23;
+    std::unique_ptr<SgPolyMesh> base(makeMesh(count));
+    std::unique_ptr<SgPolyMesh> morph(copyVertices(*base));
+    std::uint32_t seed = 7;
+    for (int i = 0; i < count; ++i) {
+        seed = seed * 1664525u + 1013904223u;
+        const int block = i / 64;
+        const bool marked = i % 64 == (block * 13) % 64;
+        const int kind = block % 5;
+        const bool moves = kind < 2 || (kind == 2 && !marked) ||
+                           (kind == 3 && (seed >> 8) % 3 != 0) || (kind == 4 && marked);
+        if (!moves)
+            continue;
+        SgVec3 move;
+        const float step = (seed >> 20) % 2 ? 0.5f : -0.0015f;
+        (i % 3 == 0 ? move.x : i % 3 == 1 ? move.y : move.z) = step;
+        morph->setVertex(i, base->getVertex(i) + move);
+    }
+    std::vector<std::pair<int, SgVec3>> expected;
+    for (int i = 0; i < count; ++i) {
+        const SgVec3 d = morph->getVertex(i) - base->getVertex(i);
+        if (std::fabs(d.x) > 0.001f || std::fabs(d.y) > 0.001f || std::fabs(d.z) > 0.001f)
+            expected.emplace_back(i, d);
+    }
+    std::unique_ptr<SgMorphDeltas> deltas(SgMorphLoader::computeDeltas(*base, *morph));
+    ASSERT_TRUE(deltas);
+    ASSERT_EQ(deltas->getNumEntries(), int(expected.size()));
+    for (int e = 0; e < int(expected.size()); ++e) {
+        EXPECT_EQ(deltas->getVertex(e), expected[size_t(e)].first) << e;
+        EXPECT_EQ(deltas->getDelta(e), expected[size_t(e)].second) << e;
+    }
 }
 
 TEST_F(Deltas, CountMismatchAndInvalidTargetsGiveNoTable) {

@@ -1,0 +1,299 @@
+// The reference modeler killed at named moments of an exchange, a segment's lock held at
+// several of them: the host keeps polling without standing still, the scene keeps nothing of
+// a broken exchange, a restarted modeler links and completes a round trip, and once both
+// sides have quit nothing of the two segments is left.
+
+#include "bridge/sgfacbridge.h"
+#include "bridgetestsupport.h"
+
+#include "exchange/shm/sgcontrolrecord.h"
+#include "sgcore/app/sgmessagesink.h"
+#include "sgcore/geometry/sgobject.h"
+#include "sgcore/morph/sgmorph.h"
+#include "sgcore/properties/sgfloatproperty.h"
+
+#include <QElapsedTimer>
+#include <QFile>
+#include <QProcess>
+#include <QTimer>
+
+#include <algorithm>
+#include <cerrno>
+#include <csignal>
+
+#include <gtest/gtest.h>
+
+namespace {
+
+class TestBridge : public SgFacBridge {
+public:
+    using SgFacBridge::executeAction;
+};
+
+// A poll step may wait 25 ms for the control lock and do a little work besides.
+constexpr qint64 kStepLimitMs = 30;
+
+// Times every poll step: the bridge's timer drives a timed call of its poll slot instead.
+class TimedPoll {
+public:
+    explicit TimedPoll(SgFacBridge &bridge) : m_bridge(bridge) {
+        QObject::disconnect(bridge.pollTimer(), &QTimer::timeout, &bridge,
+                            &SgFacBridge::checkSharedMap);
+        m_connection = QObject::connect(bridge.pollTimer(), &QTimer::timeout, [this] { step(); });
+    }
+    ~TimedPoll() { QObject::disconnect(m_connection); }
+    qint64 worstNs() const { return m_worstNs; }
+    int steps() const { return m_steps; }
+    // The slow steps of the moment being tested, "moment: n ms" each.
+    QStringList slowSteps() const { return m_slow; }
+    void setMoment(const QString &moment) { m_moment = moment; }
+
+private:
+    void step() {
+        QElapsedTimer clock;
+        clock.start();
+        m_bridge.checkSharedMap();
+        const qint64 ns = clock.nsecsElapsed();
+        ++m_steps;
+        m_worstNs = std::max(m_worstNs, ns);
+        if (ns > kStepLimitMs * 1000000)
+            m_slow << QStringLiteral("%1: %2 ms").arg(m_moment).arg(double(ns) / 1e6);
+    }
+
+    SgFacBridge &m_bridge;
+    QMetaObject::Connection m_connection;
+    QString m_moment;
+    QStringList m_slow;
+    qint64 m_worstNs = 0;
+    int m_steps = 0;
+};
+
+// One moment to kill the modeler at: its checkpoint; whether the host has imported the
+// returned geometry by then (the modeler is killed only once it has); how many nodes a
+// restarted modeler receives (the one sent before the kill, when the dead modeler never took
+// it, and the new one); whether the modeler's goodbye has reached the host.
+struct Moment {
+    const char *point;
+    bool imported;
+    int restartReceives;
+    bool goodbyeSeen;
+};
+
+// From start-up to goodbye, in the order the modeler passes them. "-locked" moments hold the
+// control segment's lock ("link", "take", "post-") or the data segment's lock ("node-locked",
+// "node-read-locked", "return-locked", "return-half-written").
+const Moment kMoments[] = {
+    {"unlinked", false, 2, false},
+    {"link-locked", false, 2, false},
+    {"linked", false, 2, false},
+    {"post-idle-locked", false, 2, false},
+    {"requested", false, 2, false},
+    {"take-locked", false, 2, false},
+    {"node-attached", false, 1, false},
+    {"node-locked", false, 1, false},
+    {"node-read-locked", false, 1, false},
+    {"node-read", false, 1, false},
+    {"node-detached", false, 1, false},
+    {"node-released", false, 1, false},
+    {"node-received", false, 1, false},
+    {"post-ack-locked", false, 1, false},
+    {"node-acknowledged", false, 1, false},
+    {"return-created", false, 1, false},
+    {"return-attached", false, 1, false},
+    {"return-locked", false, 1, false},
+    {"return-half-written", false, 1, false},
+    {"return-written", false, 1, false},
+    {"post-data-locked", false, 1, false},
+    {"return-announced", true, 1, false},
+    {"return-acknowledged", true, 1, false},
+    {"return-released", true, 1, false},
+    {"goodbye", true, 1, false},
+    {"post-quit-locked", true, 1, false},
+    {"goodbye-posted", true, 1, true},
+};
+
+// Whether the process has ended (a zombie that nobody has reaped yet counts as ended).
+bool processGone(qint64 pid) {
+    if (pid <= 0 || (::kill(pid_t(pid), 0) != 0 && errno == ESRCH))
+        return true;
+    QFile stat(QStringLiteral("/proc/%1/stat").arg(pid));
+    if (!stat.open(QIODevice::ReadOnly))
+        return true;
+    const QByteArray line = stat.readAll();
+    const qsizetype close = line.lastIndexOf(')');
+    return close > 0 && line.size() > close + 2 && line[close + 2] == 'Z';
+}
+
+// Kills a modeler for good when it goes out of scope, whatever the test asserted before.
+class ModelerKiller {
+public:
+    explicit ModelerKiller(qint64 pid) : m_pid(pid) {}
+    ~ModelerKiller() { kill(); }
+    bool kill() {
+        if (m_pid > 0)
+            ::kill(pid_t(m_pid), SIGKILL);
+        return bridgetest::waitUntil([this] { return processGone(m_pid); }, 5000);
+    }
+
+private:
+    qint64 m_pid;
+};
+
+QStringList leftovers() {
+    return bridgetest::segmentFiles(kSgControlSegmentKey) +
+           bridgetest::segmentFiles(kSgDataSegmentKey);
+}
+
+SgMorph *morphOn(SgNode *node) {
+    return node && node->getObject()
+               ? dynamic_cast<SgMorph *>(node->getObject()->findModifier(QStringLiteral("MyMorph")))
+               : nullptr;
+}
+
+int modifierCount(const SgNode *node) {
+    return node->getObject() ? node->getObject()->getModifierCount() : 0;
+}
+
+class ModelerKill : public ::testing::Test {
+protected:
+    void SetUp() override {
+        sgApp->getScene()->clear();
+        ASSERT_TRUE(leftovers().isEmpty()) << leftovers().join(' ').toStdString();
+        qputenv("FACETOR_INSTALL_PATH", FACETOR_BIN_DIR);
+        qputenv("FACETOR_WORKSPACE", m_dir.filePath("workspace").toUtf8());
+        qputenv("FACETOR_QUIT_WHEN_DONE", "1");
+        qputenv("FACETOR_EDIT", "move=0,0.5,0");
+        qputenv("FACETOR_LINK_TIMEOUT", "5000");
+    }
+    void TearDown() override {
+        for (const char *name :
+             {"FACETOR_INSTALL_PATH", "FACETOR_WORKSPACE", "FACETOR_QUIT_WHEN_DONE", "FACETOR_EDIT",
+              "FACETOR_LINK_TIMEOUT", "FACETOR_LOG", "FACETOR_EXPECT", "FACETOR_PAUSE_AT"})
+            qunsetenv(name);
+        sgApp->getScene()->clear();
+    }
+
+    // Selects `node` alone and sends it: the bridge launches a modeler when it is not linked;
+    // when it is, the user starts one (the bridge only collects the node). The modeler stops
+    // at `pauseAt` ("" for nowhere) and expects `expect` nodes. Returns its process id.
+    qint64 send(TestBridge &bridge, SgNode *node, const QByteArray &pauseAt, int expect) {
+        qputenv("FACETOR_PAUSE_AT", pauseAt);
+        qputenv("FACETOR_EXPECT", QByteArray::number(expect));
+        qputenv("FACETOR_LOG", newLog().toUtf8());
+        SgScene *scene = sgApp->getScene();
+        scene->selectNode(node);
+        if (!bridge.isActive()) {
+            bridge.executeAction();
+            return bridge.isActive() ? bridge.modelerProcessId() : 0;
+        }
+        bridge.executeAction();
+        qint64 pid = 0;
+        QProcess::startDetached(QStringLiteral(FACETOR_BIN_DIR "/Facetor"), {"-sgl"},
+                                QStringLiteral(FACETOR_BIN_DIR), &pid);
+        return pid;
+    }
+    QString newLog() {
+        m_log = m_dir.filePath(QStringLiteral("facetor-%1.log").arg(++m_logs));
+        return m_log;
+    }
+    QString log() const {
+        QFile file(m_log);
+        return file.open(QIODevice::ReadOnly) ? QString::fromUtf8(file.readAll()) : QString();
+    }
+
+    QTemporaryDir m_dir;
+    QString m_log;
+    int m_logs = 0;
+};
+
+} // namespace
+
+TEST_F(ModelerKill, HostStaysResponsiveAndARestartedModelerWorks) {
+    SgScene *scene = sgApp->getScene();
+    TestBridge bridge;
+    TimedPoll poll(bridge);
+    QElapsedTimer total;
+    total.start();
+    int round = 0;
+    for (const Moment &moment : kMoments) {
+        SCOPED_TRACE(moment.point);
+        poll.setMoment(QString::fromLatin1(moment.point));
+        ++round;
+        scene->addNode(bridgetest::makeProp(QStringLiteral("Cup%1").arg(round), {1, 2, 3}));
+        SgNode *cup = scene->getNode(scene->getNodeCount() - 1);
+
+        // The modeler stops at the moment; the host carries on meanwhile.
+        {
+            ModelerKiller modeler(send(bridge, cup, moment.point, 1));
+            ASSERT_TRUE(bridgetest::waitUntil(
+                [&] { return log().contains(QStringLiteral("paused %1\n").arg(moment.point)); },
+                5000))
+                << log().toStdString();
+            if (moment.imported) {
+                ASSERT_TRUE(bridgetest::waitUntil([&] { return morphOn(cup) != nullptr; }, 3000))
+                    << log().toStdString();
+            }
+            // A lock the modeler holds is held across a few poll steps before it dies.
+            if (QByteArray(moment.point).contains("locked"))
+                bridgetest::waitUntil([] { return false; }, 120);
+            const int nodes = scene->getNodeCount();
+            ASSERT_TRUE(modeler.kill());
+            bridgetest::waitUntil([] { return false; }, 250);
+
+            // The bridge polls on until a goodbye; the scene holds only what was imported.
+            EXPECT_EQ(bridge.isActive(), !moment.goodbyeSeen);
+            EXPECT_EQ(bridge.pollTimer()->isActive(), !moment.goodbyeSeen);
+            EXPECT_EQ(scene->getNodeCount(), nodes);
+            EXPECT_EQ(modifierCount(cup), moment.imported ? 1 : 0);
+        }
+
+        // A restarted modeler links and completes a round trip of a new node.
+        scene->addNode(bridgetest::makeProp(QStringLiteral("Mug%1").arg(round), {4, 5, 6}));
+        SgNode *mug = scene->getNode(scene->getNodeCount() - 1);
+        const int steps = poll.steps();
+        ModelerKiller restarted(send(bridge, mug, QByteArray(), moment.restartReceives));
+        ASSERT_TRUE(bridgetest::waitUntil([&] { return !bridge.isActive(); }, 10000))
+            << log().toStdString();
+        EXPECT_GT(poll.steps(), steps);
+        ASSERT_NE(morphOn(mug), nullptr) << log().toStdString();
+        morphOn(mug)->getValueChannel()->setValue(1.0f);
+        EXPECT_NEAR(mug->getObject()->getCachedGeom()->getVertex(0).y, 5.0f + 5.0f, 1e-4);
+        // The node of the broken exchange went to the restarted modeler when the dead one
+        // never had it, and came back once at most.
+        EXPECT_EQ(modifierCount(cup), moment.imported || moment.restartReceives == 2 ? 1 : 0);
+        EXPECT_EQ(bridge.sendList().count(), 0);
+        EXPECT_FALSE(bridge.isExchangeBusy());
+        EXPECT_TRUE(bridgetest::waitUntil([] { return leftovers().isEmpty(); }, 2000))
+            << leftovers().join(' ').toStdString();
+    }
+    EXPECT_TRUE(poll.slowSteps().isEmpty()) << poll.slowSteps().join('\n').toStdString();
+    std::printf("kill test: %d moments, %d poll steps, worst step %.2f ms, %lld ms in all\n", round,
+                poll.steps(), double(poll.worstNs()) / 1e6, total.elapsed());
+}
+
+TEST_F(ModelerKill, HostThatQuitsAfterAKilledModelerLeavesNothingBehind) {
+    SgScene *scene = sgApp->getScene();
+    scene->addNode(bridgetest::makeProp(QStringLiteral("Cup"), {1, 2, 3}));
+    SgNode *cup = scene->getNode(0);
+    // The modeler dies attached to the node record the host holds, and is never uncounted.
+    {
+        TestBridge bridge;
+        ModelerKiller modeler(send(bridge, cup, "node-locked", 1));
+        ASSERT_TRUE(bridgetest::waitUntil(
+            [&] { return log().contains(QStringLiteral("paused node-locked\n")); }, 5000))
+            << log().toStdString();
+        ASSERT_TRUE(modeler.kill());
+        EXPECT_TRUE(bridge.isExchangeBusy());
+        ASSERT_FALSE(leftovers().isEmpty());
+    }
+    EXPECT_TRUE(leftovers().isEmpty()) << leftovers().join(' ').toStdString();
+
+    // A host started afresh in the same process links a new modeler and gets its node back.
+    TestBridge bridge;
+    ModelerKiller modeler(send(bridge, cup, QByteArray(), 1));
+    ASSERT_TRUE(bridgetest::waitUntil([&] { return !bridge.isActive(); }, 10000))
+        << log().toStdString();
+    EXPECT_NE(morphOn(cup), nullptr) << log().toStdString();
+    EXPECT_TRUE(bridgetest::waitUntil([] { return leftovers().isEmpty(); }, 2000))
+        << leftovers().join(' ').toStdString();
+}
