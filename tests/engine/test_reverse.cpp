@@ -1,10 +1,12 @@
 #include "enginetestsupport.h"
 
+#include "sgcore/io/sgscenefile.h"
 #include "sgcore/morph/sgfigurejoint.h"
 #include "sgcore/morph/sgmorph.h"
 #include "sgcore/morph/sgmorphdeltas.h"
 #include "sgcore/morph/sgrigidskinbinding.h"
 #include "sgcore/properties/sgfloatproperty.h"
+#include "sgcore/scene/sgscene.h"
 #include "sgcore/script/sgscript.h"
 #include "sharedsource/engine/sgmorphloader.h"
 #include "sharedsource/engine/sgmorphloadlog.h"
@@ -154,4 +156,21 @@ TEST_F(ReverseDeformations, ScriptsAreCheckedBeforeTheyRunAndReportTheirErrors) 
         write("throws.js", "scene.setMorph('lower', 'Fix', 1);\nnoSuchCall();\n"), true));
     EXPECT_FALSE(script.execute());
     EXPECT_TRUE(logLines().last().contains("line 2")) << logLines().last().toStdString();
+}
+
+TEST_F(ReverseDeformations, ExamplePoseFileRunsOnTheExampleFigure) {
+    SgScene *scene = sgApp->getScene();
+    scene->clear();
+    SgSceneFile file;
+    ASSERT_TRUE(file.load(QStringLiteral(SG_EXAMPLES_DIR "/scenes/figure.json"), scene))
+        << file.getErrorString().toStdString();
+    SgScript script;
+    ASSERT_TRUE(
+        script.loadFromFile(QStringLiteral(SG_EXAMPLES_DIR "/poses/lean-and-turn.sgs"), true));
+    EXPECT_TRUE(script.execute()) << logLines().join('\n').toStdString();
+    EXPECT_EQ(logLines().last(), QStringLiteral("pose applied"));
+    EXPECT_FALSE(scene->findNodeByName(QStringLiteral("chest"))->getLocalRot().isIdentity());
+    EXPECT_FALSE(scene->findNodeByName(QStringLiteral("head"))->getLocalRot().isIdentity());
+    EXPECT_TRUE(scene->findNodeByName(QStringLiteral("hip"))->getLocalRot().isIdentity());
+    scene->clear();
 }
