@@ -216,6 +216,9 @@ public:
 } // namespace
 
 int main(int argc, char **argv) {
+    // The dialog is built but never shown: no display is needed.
+    if (qEnvironmentVariableIsEmpty("QT_QPA_PLATFORM"))
+        qputenv("QT_QPA_PLATFORM", "offscreen");
     QApplication qt(argc, argv);
     SgApp app;
     benchmark::Initialize(&argc, argv);
