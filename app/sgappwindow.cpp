@@ -14,6 +14,7 @@
 #include "sgcore/plugin/sgaction.h"
 #include "sgcore/scene/sgnode.h"
 #include "sgcore/scene/sgscene.h"
+#include "sharedsource/loaderui/sgmorphloaderdlg.h"
 
 #include <QDockWidget>
 #include <QFileDialog>
@@ -91,6 +92,11 @@ void SgAppWindow::buildMenus() {
     file->addSeparator();
     QAction *quit = file->addAction(tr("Quit"), this, &QWidget::close);
     quit->setShortcut(QKeySequence::Quit);
+
+    QMenu *tools = menuAt(tr("&Tools"));
+    QAction *importer =
+        tools->addAction(tr("Target Importer..."), this, &SgAppWindow::openTargetImporter);
+    importer->setObjectName(QStringLiteral("SgTargetImporterAction"));
 }
 
 QMenu *SgAppWindow::menuAt(const QString &path) {
@@ -186,6 +192,14 @@ void SgAppWindow::exportObjDialog() {
                                                       tr("Wavefront OBJ (*.obj)"));
     if (!path.isEmpty())
         exportSelection(path);
+}
+
+void SgAppWindow::openTargetImporter() {
+    SgScene *scene = sgApp->getScene();
+    SgMorphLoaderDlg dialog(this, true, nullptr, scene->getPrimarySelection());
+    dialog.exec();
+    // The run may have added morphs and control properties to the selection.
+    scene->update();
 }
 
 void SgAppWindow::primaryChanged() {

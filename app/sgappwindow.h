@@ -15,7 +15,8 @@ class SgSceneTree;
 // current geometry (centre), the property panel of the primary selection (right), the log pane
 // fed by the host log (bottom), the status line, and a progress dialog for the host's progress
 // runs. "File > Open Scene..." loads a scene file, "File > Export OBJ..." writes the primary
-// selection's current geometry. Plug-in actions are placed with `addPluginAction`.
+// selection's current geometry, "Tools > Target Importer..." loads morph targets from geometry
+// files onto the selection. Plug-in actions are placed with `addPluginAction`.
 // It registers itself as the host's main window (`sgApp->getInterface()`); `sgApp` must exist.
 class SgAppWindow : public QMainWindow {
     Q_OBJECT
@@ -46,6 +47,9 @@ public:
 private slots:
     void openSceneDialog();
     void exportObjDialog();
+    // "Tools > Target Importer...": the morph loader dialog in file mode on the current
+    // selection, so that many targets load in one run.
+    void openTargetImporter();
     void primaryChanged();
 
 private:

@@ -97,6 +97,11 @@ protected:
     // Imports `shape` against `node`, whose label equals the shape's name. True when the shape
     // has been dealt with for good, false when it should rather become a prop.
     bool importReturnedShape(SgPolyShape *shape, SgNode *node);
+    // The road of "FacetorBridgeTools" not 0: the "Target Importer" dialog in its bridge mode
+    // with the shape's geometry as its one source (file mode when the shape has no geometry),
+    // run modally on the main window; the dialog makes the morph itself, and this call then
+    // makes the prop or copies the materials when the chosen action asks for it.
+    void importThroughMorphLoader(SgPolyShape *shape, SgNode *node);
     // Adds `shape` to the scene as a new prop at the centre of its bounding box, with a label
     // made unique by " (1)", " (2)", ...; the scene takes the shape.
     void createPropFromShape(SgPolyShape *shape);

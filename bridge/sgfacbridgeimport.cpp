@@ -7,6 +7,7 @@
 
 #include "sharedsource/engine/sgmorphloader.h"
 #include "sharedsource/engine/sgmorphloadlog.h"
+#include "sharedsource/loaderui/sgmorphloaderdlg.h"
 
 #include "sgcore/app/sgapp.h"
 #include "sgcore/app/sgappsettings.h"
@@ -160,9 +161,8 @@ bool SgFacBridge::importReturnedShape(SgPolyShape *shape, SgNode *node) {
         loader.setMorphName(QStringLiteral("MyMorph"));
         loader.setMorphGroup(QStringLiteral("Morphs"));
     } else if (tools != 0) {
-        // The morph loader dialog in its bridge mode takes this road over: it shows the returned
-        // geometry as its one source and runs the morph creation itself. Until that dialog is
-        // part of the plug-in the shape is left alone here and counts as dealt with.
+        // The dialog makes the morph on this road; the bridge makes none of its own.
+        importThroughMorphLoader(shape, node);
         return dealtWith();
     } else {
         SgBridgeMorphDlg dialog(node->getLabel(), window, node);
@@ -211,4 +211,19 @@ bool SgFacBridge::importReturnedShape(SgPolyShape *shape, SgNode *node) {
     }
     undo.commit();
     return dealtWith();
+}
+
+void SgFacBridge::importThroughMorphLoader(SgPolyShape *shape, SgNode *node) {
+    if (shape == nullptr || node == nullptr)
+        return;
+    // The source refers to the geometry while the dialog lists it; the shape keeps owning it.
+    // A shape without geometry gives the dialog none, which opens it in its file mode.
+    SgMorphLoaderDlg dialog(sgApp->getInterface(), false, shape->getGeometry(), node);
+    if (dialog.exec() != QDialog::Accepted)
+        return;
+    const QString action = dialog.actionText();
+    if (action.contains(QLatin1String("Material")))
+        copyMaterials(shape, node);
+    else if (action.contains(QLatin1String("Prop")))
+        createPropFromShape(shape);
 }

@@ -386,8 +386,11 @@ void SgMorphLoader::createMorphForNodes(SgVertexMesh *geometry, const QList<SgNo
         return;
 
     MeshRef target(geometry);
-    if (m_scenaraExported && geometry) {
-        const SgBoneList bones = SgFigureWelder::getOrderedBones(nodes);
+    const SgBoneList bones =
+        m_scenaraExported && geometry ? SgFigureWelder::getOrderedBones(nodes) : SgBoneList();
+    // Without bones among the targets (a prop) the host exported the node's own geometry, not a
+    // welded figure: there is nothing to un-weld and the geometry is used as it is.
+    if (!bones.isEmpty()) {
         SgFigureWelder welder(bones, m_ignoredInvisibleNodes, m_weldedGeometry,
                               m_removedUnusedVertices, m_fourthWeldFlag, 0);
         SgVertexMesh *unwelded = welder.unWeld(geometry);

@@ -16,10 +16,13 @@
 #include "sgcore/scene/sgskeleton.h"
 
 #include <QApplication>
+#include <QDialog>
 #include <QDir>
 #include <QDoubleSpinBox>
 #include <QMenu>
 #include <QMenuBar>
+#include <QPushButton>
+#include <QTimer>
 #include <QToolBar>
 
 #include <gtest/gtest.h>
@@ -103,5 +106,40 @@ TEST(AppWindow, ShowsThePluginActionTheSceneAndItsProperties) {
     QDir().mkpath(artifacts);
     const QString shot = QDir(artifacts).filePath(QStringLiteral("scenara-window.png"));
     EXPECT_TRUE(window.grab().save(shot)) << shot.toStdString();
+    scene->clear();
+}
+
+TEST(AppWindow, ToolsMenuOpensTheTargetImporterInFileMode) {
+    SgAppWindow window;
+    SgScene *scene = sgApp->getScene();
+    auto *figure = new SgSkeleton(QStringLiteral("Blobby"));
+    scene->addNode(figure);
+    scene->selectNode(figure);
+
+    QMenu *tools = submenu(window.menuBar()->actions(), QStringLiteral("&Tools"));
+    ASSERT_NE(tools, nullptr);
+    QAction *importer = window.findChild<QAction *>(QStringLiteral("SgTargetImporterAction"));
+    ASSERT_NE(importer, nullptr);
+    EXPECT_TRUE(tools->actions().contains(importer));
+    EXPECT_EQ(importer->text(), QStringLiteral("Target Importer..."));
+
+    QString title;
+    bool fileMode = false;
+    QTimer answer;
+    QObject::connect(&answer, &QTimer::timeout, [&] {
+        auto *dialog = qobject_cast<QDialog *>(QApplication::activeModalWidget());
+        if (!dialog)
+            return;
+        answer.stop();
+        title = dialog->windowTitle();
+        fileMode =
+            dialog->findChild<QPushButton *>(QStringLiteral("MorphLoaderBrowseBtn")) != nullptr;
+        dialog->reject();
+    });
+    answer.start(10);
+    importer->trigger();
+    EXPECT_FALSE(answer.isActive()) << "the dialog never opened";
+    EXPECT_EQ(title, QStringLiteral("Target Importer"));
+    EXPECT_TRUE(fileMode);
     scene->clear();
 }

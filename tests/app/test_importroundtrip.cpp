@@ -4,6 +4,7 @@
 #include "app/sgobjexport.h"
 #include "bridge/sgfacbridge.h"
 #include "bridgetestsupport.h"
+#include "facetorroundtrip.h"
 
 #include "sgcore/app/sgmessagesink.h"
 #include "sgcore/geometry/sgobject.h"
@@ -29,49 +30,6 @@
 #include <gtest/gtest.h>
 
 namespace {
-
-class TestBridge : public SgFacBridge {
-public:
-    using SgFacBridge::executeAction;
-};
-
-// One round trip: the selected nodes go to the modeler, which applies `edit` (or returns the
-// OBJ files of `returns`) and quits once its returns have been read.
-class RoundTrip {
-public:
-    RoundTrip(const QByteArray &edit, const QStringList &returns = {}) {
-        qputenv("FACETOR_INSTALL_PATH", FACETOR_BIN_DIR);
-        qputenv("FACETOR_WORKSPACE", m_dir.filePath("workspace").toUtf8());
-        qputenv("FACETOR_LOG", m_dir.filePath("facetor.log").toUtf8());
-        qputenv("FACETOR_EXPECT", "1");
-        qputenv("FACETOR_QUIT_WHEN_DONE", "1");
-        qputenv("FACETOR_EDIT", edit);
-        qputenv("FACETOR_RETURN", returns.join(':').toUtf8());
-    }
-    ~RoundTrip() {
-        for (const char *name :
-             {"FACETOR_INSTALL_PATH", "FACETOR_WORKSPACE", "FACETOR_LOG", "FACETOR_EXPECT",
-              "FACETOR_QUIT_WHEN_DONE", "FACETOR_EDIT", "FACETOR_RETURN"})
-            qunsetenv(name);
-    }
-    // Sends the selection and runs the event loop until the modeler has quit.
-    bool run() {
-        TestBridge bridge;
-        bridge.executeAction();
-        if (!bridge.isActive())
-            return false;
-        return bridgetest::waitUntil([&] { return !bridge.isActive(); }, 30000);
-    }
-    QString log() const {
-        QFile file(m_dir.filePath("facetor.log"));
-        file.open(QIODevice::ReadOnly);
-        return QString::fromUtf8(file.readAll());
-    }
-    QString path(const QString &name) const { return m_dir.filePath(name); }
-
-private:
-    QTemporaryDir m_dir;
-};
 
 SgMorph *morphOn(SgNode *node, const QString &name = QStringLiteral("MyMorph")) {
     return node && node->getObject()

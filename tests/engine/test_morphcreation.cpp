@@ -335,3 +335,18 @@ TEST_F(MorphCreation, WeldedFigureTargetsBecomeOneLinkedMorphPerMovedBone) {
     }
     edited.release()->unref();
 }
+
+TEST_F(MorphCreation, ExportedGeometryOfAPropIsUsedAsItIs) {
+    // A prop's returned geometry is its own mesh, not a welded figure: with "Scenara Exported"
+    // on and no bone among the targets the morph is made from it directly.
+    Prop prop;
+    prop.loader.setScenaraExported(true);
+    SgPolyMesh *target = prop.target(2, SgVec3(0.25f, 0, 0));
+    target->ref();
+    prop.loader.createMorphForNodes(target, {prop.node}, prop.log);
+    target->unref();
+    EXPECT_FALSE(prop.log.hasProblems()) << prop.log.toHtml().toStdString();
+    SgMorph *morph = morphOn(prop.node, "Smile");
+    ASSERT_TRUE(morph);
+    EXPECT_EQ(morph->getDeltas()->getNumEntries(), 1);
+}
