@@ -9,11 +9,15 @@
 #include <QApplication>
 #include <QDir>
 #include <QElapsedTimer>
+#include <QFile>
 #include <QTemporaryDir>
 #include <QTimer>
 #include <QWidget>
 
 #include <functional>
+
+#include <cerrno>
+#include <csignal>
 
 #include <unistd.h>
 
@@ -53,6 +57,18 @@ inline int cancelPendingAnswers() {
         delete timer;
     }
     return count;
+}
+
+// Whether the process has ended (a zombie that nobody has reaped yet counts as ended).
+inline bool processGone(qint64 pid) {
+    if (pid <= 0 || (::kill(pid_t(pid), 0) != 0 && errno == ESRCH))
+        return true;
+    QFile stat(QStringLiteral("/proc/%1/stat").arg(pid));
+    if (!stat.open(QIODevice::ReadOnly))
+        return true;
+    const QByteArray line = stat.readAll();
+    const qsizetype close = line.lastIndexOf(')');
+    return close > 0 && line.size() > close + 2 && line[close + 2] == 'Z';
 }
 
 // Runs the event loop until `done` holds or `timeoutMs` passes; returns `done()`.

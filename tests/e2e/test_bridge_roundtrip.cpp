@@ -68,18 +68,6 @@ private:
     QTemporaryDir m_dir;
 };
 
-// Whether the process has ended (a zombie that nobody has reaped yet counts as ended).
-bool processGone(qint64 pid) {
-    if (pid <= 0 || (::kill(pid_t(pid), 0) != 0 && errno == ESRCH))
-        return true;
-    QFile stat(QStringLiteral("/proc/%1/stat").arg(pid));
-    if (!stat.open(QIODevice::ReadOnly))
-        return true;
-    const QByteArray line = stat.readAll();
-    const qsizetype close = line.lastIndexOf(')');
-    return close > 0 && line.size() > close + 2 && line[close + 2] == 'Z';
-}
-
 // Files in the shared-memory folder that belong to one of the bridge's two keys.
 QStringList leftovers() {
     return bridgetest::segmentFiles(kSgControlSegmentKey) +
@@ -155,7 +143,7 @@ TEST_F(BridgeRoundTrip, SelectedNodesArriveInOrderAndBothSidesCleanUp) {
         EXPECT_EQ(bridge.sendList().count(), 0);
         EXPECT_EQ(run.received(), sendOrder) << run.log().toStdString();
     }
-    ASSERT_TRUE(bridgetest::waitUntil([&] { return processGone(pid); }, 10000));
+    ASSERT_TRUE(bridgetest::waitUntil([&] { return bridgetest::processGone(pid); }, 10000));
     EXPECT_TRUE(bridgetest::waitUntil([] { return leftovers().isEmpty(); }, 2000))
         << leftovers().join(' ').toStdString();
 
@@ -203,7 +191,7 @@ TEST_F(BridgeRoundTrip, ReturnedGeometryWithAnUnknownNameBecomesAProp) {
     expectSamePoints(scenePoints(gizmo), expected, false);
     EXPECT_NEAR(gizmo->getOrigin().x, 25.0f, 1e-4f);
     EXPECT_NEAR(gizmo->getOrigin().y, 25.0f, 1e-4f);
-    ASSERT_TRUE(bridgetest::waitUntil([&] { return processGone(pid); }, 10000));
+    ASSERT_TRUE(bridgetest::waitUntil([&] { return bridgetest::processGone(pid); }, 10000));
     EXPECT_TRUE(bridgetest::waitUntil([] { return leftovers().isEmpty(); }, 2000))
         << leftovers().join(' ').toStdString();
 }

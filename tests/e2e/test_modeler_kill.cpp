@@ -116,18 +116,6 @@ const Moment kMoments[] = {
     {"goodbye-posted", true, 1, true},
 };
 
-// Whether the process has ended (a zombie that nobody has reaped yet counts as ended).
-bool processGone(qint64 pid) {
-    if (pid <= 0 || (::kill(pid_t(pid), 0) != 0 && errno == ESRCH))
-        return true;
-    QFile stat(QStringLiteral("/proc/%1/stat").arg(pid));
-    if (!stat.open(QIODevice::ReadOnly))
-        return true;
-    const QByteArray line = stat.readAll();
-    const qsizetype close = line.lastIndexOf(')');
-    return close > 0 && line.size() > close + 2 && line[close + 2] == 'Z';
-}
-
 // Kills a modeler for good when it goes out of scope, whatever the test asserted before.
 class ModelerKiller {
 public:
@@ -136,7 +124,7 @@ public:
     bool kill() {
         if (m_pid > 0)
             ::kill(pid_t(m_pid), SIGKILL);
-        return bridgetest::waitUntil([this] { return processGone(m_pid); }, 5000);
+        return bridgetest::waitUntil([this] { return bridgetest::processGone(m_pid); }, 5000);
     }
 
 private:
