@@ -5,6 +5,9 @@ function(sg_warnings target)
     target_compile_options(${target} PRIVATE -Wall -Wextra -Wpedantic -Werror)
 endfunction()
 
+# flock(1) makes a test's resource lock hold across build folders (see sg_add_gtest).
+find_program(SG_FLOCK flock)
+
 # sg_add_gtest(NAME name LABELS l1 [l2] SOURCES ... LIBS ... [ENV ...] [RESOURCE_LOCK lock] [TIMEOUT s])
 # Builds one GoogleTest executable and registers it as one CTest test with its labels.
 # Widget tests run headless through the offscreen platform.
@@ -22,7 +25,6 @@ function(sg_add_gtest)
     sg_warnings(${T_NAME})
     # A resource lock also holds across build folders: the segment keys of the modeler are
     # machine-wide, so two checkouts testing at once would meet in them.
-    find_program(SG_FLOCK flock)
     if(T_RESOURCE_LOCK AND SG_FLOCK)
         add_test(NAME ${T_NAME} COMMAND ${SG_FLOCK} --close /tmp/sg-test-${T_RESOURCE_LOCK}.lock
             $<TARGET_FILE:${T_NAME}>)

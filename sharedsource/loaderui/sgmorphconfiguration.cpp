@@ -99,7 +99,8 @@ QString SgMorphConfiguration::makeRelative(const QString &base, const QString &p
         return path.mid(folder.size());
     }
     warn(tr("Relative Path Warning"),
-         tr("The file, ") + path + tr(",is not in the relative path and will be saved as absolute."),
+         tr("The file, ") + path +
+             tr(",is not in the relative path and will be saved as absolute."),
          tr("Ok."));
     ok = false;
     return path;
@@ -123,16 +124,27 @@ void SgMorphConfiguration::appendRow(QDomDocument &document, QDomElement &parent
     parent.appendChild(element);
 }
 
+namespace {
+
+// Starts a configuration document: the root element with its version, and below it the
+// "FileType" element of `type` ("Object" or "Project"), which is returned to be filled.
+QDomElement beginDocument(QDomDocument &document, const QString &rootTag, const QString &type) {
+    QDomElement root = document.createElement(rootTag);
+    root.setAttribute(QStringLiteral("Version"), QStringLiteral("1"));
+    document.appendChild(root);
+    QDomElement fileType = document.createElement(QStringLiteral("FileType"));
+    fileType.setAttribute(QStringLiteral("Type"), type);
+    root.appendChild(fileType);
+    return fileType;
+}
+
+} // namespace
+
 QByteArray SgMorphConfiguration::objectDocument(SgMorphFileItem *source, const QString &base) {
     if (!source || source->childCount() == 0)
         return QByteArray();
     QDomDocument document;
-    QDomElement root = document.createElement(s_rootTag);
-    root.setAttribute(QStringLiteral("Version"), QStringLiteral("1"));
-    document.appendChild(root);
-    QDomElement fileType = document.createElement(QStringLiteral("FileType"));
-    fileType.setAttribute(QStringLiteral("Type"), QStringLiteral("Object"));
-    root.appendChild(fileType);
+    QDomElement fileType = beginDocument(document, s_rootTag, QStringLiteral("Object"));
     for (int i = 0; i < source->childCount(); ++i)
         if (SgMorphSourceItem *row = settingRow(source->child(i)))
             appendRow(document, fileType, row);
@@ -169,12 +181,7 @@ bool SgMorphConfiguration::saveProjectConfiguration(QString path) {
     path = withExtension(path);
     const QString projectFolder = SgFileIO::getFilePath(path);
     QDomDocument document;
-    QDomElement root = document.createElement(s_rootTag);
-    root.setAttribute(QStringLiteral("Version"), QStringLiteral("1"));
-    document.appendChild(root);
-    QDomElement fileType = document.createElement(QStringLiteral("FileType"));
-    fileType.setAttribute(QStringLiteral("Type"), QStringLiteral("Project"));
-    root.appendChild(fileType);
+    QDomElement fileType = beginDocument(document, s_rootTag, QStringLiteral("Project"));
     for (int i = 0; i < m_list->topLevelItemCount(); ++i) {
         QTreeWidgetItem *row = m_list->topLevelItem(i);
         const QString geometryPath = row->text(1);
@@ -197,8 +204,7 @@ bool SgMorphConfiguration::saveProjectConfiguration(QString path) {
 // ---------------------------------------------------------------------------------------------
 // Reading
 
-void SgMorphConfiguration::warn(const QString &title, const QString &text,
-                                const QString &button) {
+void SgMorphConfiguration::warn(const QString &title, const QString &text, const QString &button) {
     if (m_messageHandler) {
         m_messageHandler(title, text);
         return;
