@@ -1,6 +1,7 @@
-#include "app/sgobjwriter.h"
+#include "sgcore/io/sgobjwriter.h"
 
-#include <QSaveFile>
+#include "sgcore/geometry/sgpolymesh.h"
+#include "sgcore/io/sgfileio.h"
 
 #include <charconv>
 
@@ -41,6 +42,23 @@ void SgObjWriter::vertices(const float *xyz, std::size_t count) {
     }
 }
 
+void SgObjWriter::materialLibrary(const QString &fileName) {
+    m_text += "mtllib ";
+    m_text += fileName.toUtf8();
+    m_text += '\n';
+}
+
+void SgObjWriter::uvs(const float *uv, std::size_t count) {
+    m_text.reserve(m_text.size() + qsizetype(count) * 24);
+    for (std::size_t i = 0; i < count; ++i) {
+        m_text += "vt ";
+        appendFloat(uv[2 * i]);
+        m_text += ' ';
+        appendFloat(uv[2 * i + 1]);
+        m_text += '\n';
+    }
+}
+
 void SgObjWriter::group(const QString &name) {
     m_text += "g ";
     m_text += name.toUtf8();
@@ -62,12 +80,51 @@ void SgObjWriter::face(const int *indices, std::size_t count) {
     m_text += '\n';
 }
 
-bool SgObjWriter::save(const QString &path) {
-    QSaveFile file(path);
-    if (!file.open(QIODevice::WriteOnly) || file.write(m_text) != m_text.size() || !file.commit()) {
-        m_error = file.errorString();
-        return false;
+void SgObjWriter::face(const SgFaceCorner *corners, std::size_t count, int vertexBase, int uvBase,
+                       int uvCount) {
+    m_text += 'f';
+    for (std::size_t i = 0; i < count; ++i) {
+        m_text += ' ';
+        appendInt(static_cast<long long>(corners[i].vertex) + vertexBase + 1);
+        if (corners[i].uv >= 0 && corners[i].uv < uvCount) {
+            m_text += '/';
+            appendInt(static_cast<long long>(corners[i].uv) + uvBase + 1);
+        }
     }
+    m_text += '\n';
+}
+
+void SgObjWriter::facets(const SgPolyMesh &mesh, const QStringList &materials, int vertexBase,
+                         int uvBase, bool withGroups) {
+    const int uvCount = mesh.getUVCount();
+    int material = -1;
+    int group = -2;
+    auto one = [&](const SgFaceCorner *corners, int count, int facetMaterial, int facetGroup) {
+        if (withGroups && facetGroup != group) {
+            group = facetGroup;
+            if (group >= 0)
+                this->group(mesh.getFaceGroupName(group));
+            else
+                m_text += "g\n";
+        }
+        if (facetMaterial != material) {
+            material = facetMaterial;
+            this->material(material < materials.size()
+                               ? materials.at(material)
+                               : QStringLiteral("material%1").arg(material));
+        }
+        face(corners, size_t(count), vertexBase, uvBase, uvCount);
+    };
+    for (int i = 0; i < mesh.getTriangleCount(); ++i)
+        one(mesh.getTriangleCorners(i), 3, mesh.getTriangleMaterial(i), mesh.getTriangleGroup(i));
+    for (int i = 0; i < mesh.getQuadCount(); ++i)
+        one(mesh.getQuadCorners(i), 4, mesh.getQuadMaterial(i), mesh.getQuadGroup(i));
+    for (int i = 0; i < mesh.getPolygonCount(); ++i)
+        one(mesh.getPolygonCorners(i), mesh.getPolygonCornerCount(i), mesh.getPolygonMaterial(i),
+            mesh.getPolygonGroup(i));
+}
+
+bool SgObjWriter::save(const QString &path) {
     m_error.clear();
-    return true;
+    return SgFileIO::writeWholeFile(path, m_text, &m_error);
 }
