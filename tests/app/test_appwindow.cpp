@@ -304,3 +304,54 @@ TEST(AppWindow, PreferencesHoldTheModelerPathAndTheImportRoad) {
     settings.remove(QStringLiteral("FacetorBridgeTools"));
     settings.remove(QStringLiteral("FacetorInstallPath"));
 }
+
+// The picture of the window at its default size after a round trip: the figure with its morph
+// at 1 and its control property in the panel, and a returned prop over the figure.
+TEST(AppWindow, PictureAtTheDefaultSize) {
+    sgApp->getMessageSink()->clear();
+    SgPluginHost plugins;
+    ASSERT_EQ(plugins.loadFolder(QStringLiteral(FACBRIDGE_PLUGIN_DIR)), 1);
+    SgAppWindow window;
+    window.addPluginAction(plugins.actions().first());
+    window.show();
+    QApplication::processEvents();
+    EXPECT_EQ(window.size(), QSize(1180, 680));
+    SgScene *scene = sgApp->getScene();
+    ASSERT_TRUE(window.openScene(QStringLiteral(SG_EXAMPLES_DIR "/demo/scene.json"), true));
+    auto *figure = static_cast<SgSkeleton *>(scene->findNodeByLabel(QStringLiteral("Blobby")));
+    auto *control = new SgFloatProperty(QStringLiteral("MyMorph"));
+    control->setPath(QStringLiteral("Morphs"));
+    control->setMin(-1);
+    control->setMax(1);
+    control->setIsClamped(true);
+    control->setValue(1);
+    figure->addProperty(control);
+    for (SgBone *bone : figure->getAllBones()) {
+        const SgVertexMesh *base = bone->getObject()->getCurrentShape()->getGeometry();
+        auto *deltas = new SgMorphDeltas;
+        deltas->setVertCount(base->getVertexCount());
+        for (int v = 0; v < base->getVertexCount(); ++v)
+            deltas->addDelta(v, SgVec3(base->getVertex(v).x * 0.25f, 0, 0), false);
+        auto *morph = new SgMorph(QStringLiteral("MyMorph"), deltas);
+        morph->setLabel(QStringLiteral("p_MyMorph"));
+        morph->getValueChannel()->insertController(
+            new SgERCLink(SgERCLink::DeltaAdd, control, 1, 0));
+        bone->getObject()->addModifier(morph);
+    }
+    SgNode *box = scene->findNodeByLabel(QStringLiteral("Box"));
+    SgVertexMesh *boxMesh = box->getObject()->getCurrentShape()->getGeometry();
+    const SgVec3 centre = boxMesh->getBoundingBox().getCenter();
+    for (SgVec3 &p : boxMesh->vertices())
+        p = (p - centre) * 2.5f + SgVec3(1, 9, 0);
+    box->setLabel(QStringLiteral("Blobby (1)"));
+    scene->selectNode(figure);
+    scene->update();
+    window.meshView()->frameAll();
+    QApplication::processEvents();
+
+    const QString artifacts = qEnvironmentVariable("SG_TEST_ARTIFACTS", QDir::tempPath());
+    QDir().mkpath(artifacts);
+    const QString shot = QDir(artifacts).filePath(QStringLiteral("scenara-main-window.png"));
+    EXPECT_TRUE(window.grab().save(shot)) << shot.toStdString();
+    scene->clear();
+}
