@@ -13,6 +13,7 @@
 #include "sgcore/app/sgmessagesink.h"
 #include "sgcore/io/sgscenefile.h"
 #include "sgcore/plugin/sgaction.h"
+#include "sgcore/scene/sgbone.h"
 #include "sgcore/scene/sgnode.h"
 #include "sgcore/scene/sgscene.h"
 #include "sharedsource/loaderui/sgmorphloaderdlg.h"
@@ -25,6 +26,8 @@
 #include <QMessageBox>
 #include <QStatusBar>
 #include <QToolBar>
+
+#include <algorithm>
 
 SgAppWindow::SgAppWindow(QWidget *parent) : QMainWindow(parent) {
     setObjectName(QStringLiteral("SgAppWindow"));
@@ -113,6 +116,11 @@ void SgAppWindow::buildMenus() {
     file->addSeparator();
     QAction *quit = file->addAction(tr("Quit"), this, &QWidget::close);
     quit->setShortcut(QKeySequence::Quit);
+
+    QMenu *edit = menuAt(tr("&Edit"));
+    QAction *remove = edit->addAction(tr("Delete"), this, [this] { deleteSelection(); });
+    remove->setObjectName(QStringLiteral("SgDeleteAction"));
+    remove->setShortcut(QKeySequence::Delete);
 
     QMenu *view = menuAt(tr("&View"));
     QAction *frame = view->addAction(tr("Frame Selection"), m_view, &SgMeshView::frameSelection);
@@ -242,6 +250,43 @@ void SgAppWindow::closeEvent(QCloseEvent *event) {
         event->accept();
     else
         event->ignore();
+}
+
+int SgAppWindow::deleteSelection(bool ask) {
+    SgScene *scene = sgApp->getScene();
+    const SgNodeList selected = scene->getSelectedNodes();
+    auto chosen = [&](const SgNode *node) {
+        return std::find(selected.begin(), selected.end(), node) != selected.end() &&
+               dynamic_cast<const SgBone *>(node) == nullptr;
+    };
+    // A node that goes with a chosen ancestor is not removed a second time.
+    SgNodeList doomed;
+    QStringList labels;
+    for (SgNode *node : selected) {
+        if (!chosen(node))
+            continue;
+        bool underChosen = false;
+        for (SgNode *up = node->getParent(); up && !underChosen; up = up->getParent())
+            underChosen = chosen(up);
+        if (!underChosen) {
+            doomed.push_back(node);
+            labels.append(node->getLabel());
+        }
+    }
+    if (doomed.empty()) {
+        sgApp->statusLine(tr("Select a prop or a figure to delete (a bone goes with its figure)."));
+        return 0;
+    }
+    if (ask && QMessageBox::question(sgApp->getDialogParent(), tr("Delete"),
+                                     tr("Delete %1?").arg(labels.join(QStringLiteral(", "))),
+                                     QMessageBox::Yes | QMessageBox::No,
+                                     QMessageBox::Yes) != QMessageBox::Yes)
+        return 0;
+    for (SgNode *node : doomed)
+        scene->removeNode(node);
+    sgApp->log(QStringLiteral("Deleted %1.").arg(labels.join(QStringLiteral(", "))));
+    scene->update();
+    return int(doomed.size());
 }
 
 void SgAppWindow::preferencesDialog() {

@@ -19,8 +19,8 @@ class SgSceneTree;
 // Menus: "File > Open Scene...", "Save Scene", "Save Scene As..." (scene files with the user's
 // morphs, control properties, props and materials), "Export OBJ..." (the primary selection's
 // current geometry with an MTL file), "Preferences...", "Quit"; "View > Frame Selection",
-// "Frame All"; "Tools > Target Importer..." (morph targets from geometry files onto the
-// selection).
+// "Frame All"; "Edit > Delete" (the selected props and figures); "Tools > Target Importer..."
+// (morph targets from geometry files onto the selection).
 //
 // Unsaved changes: any change to the scene (nodes added or removed, scene updates, values set
 // in the property panel) marks the scene modified ("*" in the title). Closing the window or
@@ -52,6 +52,10 @@ public:
     // caller may go on (nothing to save, saved, or discarded), false on "Cancel" or a failed
     // or cancelled save.
     bool maybeSaveChanges();
+    // Removes the selected nodes other than bones (a bone goes only with its figure) through the
+    // scene, with their descendants, so that every holder of a node hears of it. With `ask`
+    // the user confirms first. Returns how many selected nodes were removed.
+    int deleteSelection(bool ask = true);
     // Writes the primary selection's current geometry to `path`; false with a log line when
     // there is nothing selected or the file cannot be written.
     bool exportSelection(const QString &path, bool quiet = false);

@@ -355,3 +355,36 @@ TEST(AppWindow, PictureAtTheDefaultSize) {
     EXPECT_TRUE(window.grab().save(shot)) << shot.toStdString();
     scene->clear();
 }
+
+TEST(AppWindow, DeleteRemovesSelectedPropsAndFiguresButNoLoneBone) {
+    SgAppWindow window;
+    SgScene *scene = sgApp->getScene();
+    ASSERT_TRUE(window.openScene(QStringLiteral(SG_EXAMPLES_DIR "/demo/scene.json"), true));
+    const int nodes = scene->getNodeCount();
+    SgNode *box = scene->findNodeByLabel(QStringLiteral("Box"));
+    SgNode *hip = scene->findNodeByLabel(QStringLiteral("hip"));
+    scene->selectNode(hip);
+    EXPECT_EQ(window.deleteSelection(false), 0);
+    EXPECT_EQ(scene->getNodeCount(), nodes);
+
+    // The prop goes after the question; the bone selected with it stays.
+    scene->selectNode(box, true);
+    ASSERT_EQ(window.propertyPanel()->node(), box);
+    QString question;
+    uitest::answerMessageBox(&question, QStringLiteral("&Yes"));
+    QAction *remove = actionNamed(window, "SgDeleteAction");
+    ASSERT_NE(remove, nullptr);
+    remove->trigger();
+    EXPECT_EQ(question, QStringLiteral("Delete Box?"));
+    EXPECT_EQ(scene->findNodeByLabel(QStringLiteral("Box")), nullptr);
+    EXPECT_EQ(window.sceneTree()->itemOf(box), nullptr);
+    EXPECT_EQ(window.propertyPanel()->node(), hip); // the primary selection now
+    EXPECT_EQ(scene->getNodeCount(), nodes - 1);
+    EXPECT_TRUE(window.isSceneModified());
+
+    // A figure goes with its bones.
+    scene->selectNode(scene->findNodeByLabel(QStringLiteral("Blobby")));
+    scene->selectNode(hip, true);
+    EXPECT_EQ(window.deleteSelection(false), 1);
+    EXPECT_EQ(scene->getNodeCount(), 0);
+}
