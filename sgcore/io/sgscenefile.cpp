@@ -5,6 +5,7 @@
 #include "sgcore/geometry/sgobject.h"
 #include "sgcore/geometry/sgpolymesh.h"
 #include "sgcore/geometry/sgpolyshape.h"
+#include "sgcore/io/sgmorphdeltafile.h"
 #include "sgcore/io/sgobjreader.h"
 #include "sgcore/io/sgscenefilewriter.h"
 #include "sgcore/materials/sgdefaultmaterial.h"
@@ -643,7 +644,7 @@ private:
             if (!label.isEmpty()) {
                 morph->setLabel(label);
             }
-            if (m.contains(QStringLiteral("vertices"))) {
+            if (m.contains(QStringLiteral("deltas"))) {
                 morph->setDeltas(loadDeltas(m, node, at));
             }
             const QJsonValue channel = m.value(QStringLiteral("channel"));
@@ -657,9 +658,10 @@ private:
         }
     }
 
-    // Deltas as parallel arrays: "vertices" (ascending indices below "vertexCount", which is
-    // the vertex count of the node's geometry) and "deltas" (x, y, z per vertex).
-    static SgMorphDeltas *loadDeltas(const QJsonObject &m, SgNode *node, const QString &at) {
+    // Deltas from a deltas file ("deltas" names it), or as parallel arrays: "vertices"
+    // (ascending indices below "vertexCount", which is the vertex count of the node's geometry)
+    // and "deltas" (x, y, z per vertex).
+    SgMorphDeltas *loadDeltas(const QJsonObject &m, SgNode *node, const QString &at) const {
         const SgVertexMesh *geometry = node->getObject()->getCurrentShape()->getGeometry();
         const int meshCount = geometry ? geometry->getVertexCount() : 0;
         const double count = optionalNumber(m, "vertexCount", meshCount, at);
@@ -670,6 +672,15 @@ private:
         }
         const QJsonValue vertices = m.value(QStringLiteral("vertices"));
         const QJsonValue deltas = m.value(QStringLiteral("deltas"));
+        if (deltas.isString()) {
+            QString error;
+            SgMorphDeltas *read = SgMorphDeltaFile::read(
+                QDir::cleanPath(resolvePath(deltas.toString())), meshCount, error);
+            if (!read) {
+                fail(at, error);
+            }
+            return read;
+        }
         if (!vertices.isArray() || !deltas.isArray() ||
             deltas.toArray().size() != 3 * vertices.toArray().size()) {
             fail(at, QStringLiteral("\"vertices\" and \"deltas\" must be arrays of n indices "

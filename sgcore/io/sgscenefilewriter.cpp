@@ -4,6 +4,7 @@
 #include "sgcore/geometry/sgpolymesh.h"
 #include "sgcore/geometry/sgshape.h"
 #include "sgcore/io/sgfileio.h"
+#include "sgcore/io/sgmorphdeltafile.h"
 #include "sgcore/io/sgobjwriter.h"
 #include "sgcore/materials/sgdefaultmaterial.h"
 #include "sgcore/materials/sgtexture.h"
@@ -159,10 +160,10 @@ QJsonObject SgSceneFileWriter::figureEntry(SgSkeleton *figure) {
     return o;
 }
 
-QString SgSceneFileWriter::freeGeometryName(const QString &stem) {
-    QString name = stem + QStringLiteral(".obj");
+QString SgSceneFileWriter::freeFileName(const QString &stem, const QString &suffix) {
+    QString name = stem + suffix;
     for (int n = 2; m_usedNames.contains(name.toLower()); ++n)
-        name = QStringLiteral("%1-%2.obj").arg(stem).arg(n);
+        name = QStringLiteral("%1-%2%3").arg(stem).arg(n).arg(suffix);
     m_usedNames.insert(name.toLower());
     return name;
 }
@@ -192,7 +193,7 @@ void SgSceneFileWriter::writeGeometry(SgNode *node, const QString &stem, QJsonOb
     if (const SgMap *uvs = mesh->getUVList())
         writer.uvs(reinterpret_cast<const float *>(uvs->values().data()), uvs->values().size());
     writer.facets(*mesh, materialNames, 0, 0, true);
-    const QString name = freeGeometryName(stem);
+    const QString name = freeFileName(stem, QStringLiteral(".obj"));
     const QString path = m_geometryFolder.filePath(name);
     if (!writer.save(path))
         throw SaveError{QStringLiteral("cannot write %1 (%2)").arg(path, writer.errorString())};
@@ -201,7 +202,7 @@ void SgSceneFileWriter::writeGeometry(SgNode *node, const QString &stem, QJsonOb
     const QJsonArray materialList = materials(shape);
     if (!materialList.isEmpty())
         o.insert(QStringLiteral("materials"), materialList);
-    const QJsonArray morphList = morphs(node);
+    const QJsonArray morphList = morphs(node, name.chopped(4));
     if (!morphList.isEmpty())
         o.insert(QStringLiteral("morphs"), morphList);
 }
@@ -233,32 +234,29 @@ QJsonArray SgSceneFileWriter::materials(const SgShape *shape) const {
     return out;
 }
 
-QJsonArray SgSceneFileWriter::morphs(SgNode *node) const {
+QJsonArray SgSceneFileWriter::morphs(SgNode *node, const QString &stem) {
     QJsonArray out;
     for (const SgModifier *modifier : node->getObject()->getModifiers())
         if (const auto *morph = dynamic_cast<const SgMorph *>(modifier))
-            out.append(morphEntry(morph));
+            out.append(morphEntry(morph, stem));
     return out;
 }
 
-QJsonObject SgSceneFileWriter::morphEntry(const SgMorph *morph) const {
+QJsonObject SgSceneFileWriter::morphEntry(const SgMorph *morph, const QString &stem) {
     QJsonObject o;
     o.insert(QStringLiteral("name"), morph->getName());
     if (morph->getLabel() != morph->getName())
         o.insert(QStringLiteral("label"), morph->getLabel());
     if (const SgMorphDeltas *deltas = morph->getDeltas()) {
+        const QString name = freeFileName(stem + QLatin1Char('.') + fileStem(morph->getName()),
+                                          QStringLiteral(".deltas"));
+        const QString path = m_geometryFolder.filePath(name);
+        QString error;
+        if (!SgMorphDeltaFile::write(path, *deltas, error))
+            throw SaveError{QStringLiteral("cannot write %1 (%2)").arg(path, error)};
+        m_written.append(path);
         o.insert(QStringLiteral("vertexCount"), deltas->getVertCount());
-        QJsonArray vertices;
-        QJsonArray offsets;
-        for (int i = 0; i < deltas->getNumEntries(); ++i) {
-            vertices.append(deltas->getVertex(i));
-            const SgVec3 &d = deltas->getDelta(i);
-            offsets.append(double(d.x));
-            offsets.append(double(d.y));
-            offsets.append(double(d.z));
-        }
-        o.insert(QStringLiteral("vertices"), vertices);
-        o.insert(QStringLiteral("deltas"), offsets);
+        o.insert(QStringLiteral("deltas"), m_geometryFolderName + QLatin1Char('/') + name);
     }
     o.insert(QStringLiteral("channel"), propertyEntry(morph->getValueChannel()));
     return o;

@@ -21,7 +21,8 @@ class SgSkeleton;
 // property groups; each node's base geometry (its current shape, before any modifier) as an OBJ
 // file in the folder "<scene base name>-geometry" beside the scene file, with its UVs, face
 // groups and material order; materials with colours, strengths and maps; morphs with their
-// deltas, their value channel and its ERC links to control properties.
+// deltas (a ".deltas" file each in the same folder), their value channel and its ERC links to
+// control properties.
 //
 // What is not written: shapes other than the current one, modifiers other than morphs (skin
 // bindings and joints), node rotations and translations, object and shape properties, and
@@ -48,13 +49,15 @@ private:
     void writeCommon(SgNode *node, QJsonObject &o);
     void writeGeometry(SgNode *node, const QString &fileStem, QJsonObject &o);
     QJsonArray materials(const SgShape *shape) const;
-    QJsonArray morphs(SgNode *node) const;
-    QJsonObject morphEntry(const SgMorph *morph) const;
+    QJsonArray morphs(SgNode *node, const QString &stem);
+    QJsonObject morphEntry(const SgMorph *morph, const QString &stem);
     QJsonArray properties(const SgElement *element) const;
     QJsonObject propertyEntry(const SgProperty *property) const;
     QJsonArray links(const SgNumericProperty *property) const;
     QString filePath(const QString &file) const;
-    QString freeGeometryName(const QString &stem);
+    // A file name in the geometry folder not used yet by this save: "<stem><suffix>", else
+    // "<stem>-2<suffix>", ...
+    QString freeFileName(const QString &stem, const QString &suffix);
 
     QDir m_sceneFolder;
     QDir m_geometryFolder;

@@ -189,25 +189,38 @@ TEST(HostSceneSave, AFailedSaveLeavesTheFileAndABadMorphIsRefusedWhole) {
     // and nothing is added.
     const QJsonObject root = QJsonDocument::fromJson(saved).object();
     using Edit = std::function<void(QJsonObject &)>;
-    const Edit edits[] = {[](QJsonObject &m) { m.insert(QStringLiteral("vertexCount"), 11); },
-                          [](QJsonObject &m) {
-                              m.insert(QStringLiteral("vertices"), QJsonArray{4, 1});
-                          },
-                          [](QJsonObject &m) {
-                              m.insert(QStringLiteral("vertices"), QJsonArray{1, 10});
-                          },
-                          [](QJsonObject &m) {
-                              m.insert(QStringLiteral("deltas"), QJsonArray{1, 2, 3});
-                          },
-                          [](QJsonObject &m) {
-                              QJsonObject channel = m.value(QStringLiteral("channel")).toObject();
-                              QJsonArray links = channel.value(QStringLiteral("links")).toArray();
-                              QJsonObject link = links.at(0).toObject();
-                              link.insert(QStringLiteral("property"), QStringLiteral("Nothing"));
-                              links.replace(0, link);
-                              channel.insert(QStringLiteral("links"), links);
-                              m.insert(QStringLiteral("channel"), channel);
-                          }};
+    auto deltasFile = [](const char *name, const QByteArray &text) {
+        QFile file(sgTestPath(QString::fromLatin1(name)));
+        file.open(QIODevice::WriteOnly);
+        file.write(text);
+        return file.fileName();
+    };
+    const QString descending = deltasFile("descending.deltas", "deltas 10\n4 0 0 0\n1 0 0 0\n");
+    const QString outside = deltasFile("outside.deltas", "deltas 10\n10 0 0 0\n");
+    const QString shortLine = deltasFile("short.deltas", "deltas 10\n1 0.5 0\n");
+    const Edit edits[] = {
+        [](QJsonObject &m) { m.insert(QStringLiteral("vertexCount"), 11); },
+        [&](QJsonObject &m) { m.insert(QStringLiteral("deltas"), descending); },
+        [&](QJsonObject &m) { m.insert(QStringLiteral("deltas"), outside); },
+        [&](QJsonObject &m) { m.insert(QStringLiteral("deltas"), shortLine); },
+        [](QJsonObject &m) { m.insert(QStringLiteral("deltas"), QStringLiteral("missing")); },
+        [](QJsonObject &m) {
+            m.insert(QStringLiteral("vertices"), QJsonArray{1, 4});
+            m.insert(QStringLiteral("deltas"), QJsonArray{1, 2, 3});
+        },
+        [](QJsonObject &m) {
+            m.insert(QStringLiteral("vertices"), QJsonArray{4, 1});
+            m.insert(QStringLiteral("deltas"), QJsonArray{1, 2, 3, 4, 5, 6});
+        },
+        [](QJsonObject &m) {
+            QJsonObject channel = m.value(QStringLiteral("channel")).toObject();
+            QJsonArray links = channel.value(QStringLiteral("links")).toArray();
+            QJsonObject link = links.at(0).toObject();
+            link.insert(QStringLiteral("property"), QStringLiteral("Nothing"));
+            links.replace(0, link);
+            channel.insert(QStringLiteral("links"), links);
+            m.insert(QStringLiteral("channel"), channel);
+        }};
     for (const Edit &edit : edits) {
         QJsonArray nodes = root.value(QStringLiteral("nodes")).toArray();
         QJsonObject figure = nodes.at(0).toObject();
