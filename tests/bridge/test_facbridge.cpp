@@ -87,7 +87,7 @@ public:
         QFile program(folder.filePath(QStringLiteral("Facetor")));
         if (!program.exists()) {
             program.open(QIODevice::WriteOnly);
-            program.write("#!/bin/sh\nexec sleep 10\n");
+            program.write("#!/bin/sh\nexec sleep 10 </dev/null >/dev/null 2>&1\n");
             program.close();
             program.setPermissions(QFile::ReadOwner | QFile::WriteOwner | QFile::ExeOwner);
         }
