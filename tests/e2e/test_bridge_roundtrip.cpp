@@ -137,7 +137,8 @@ TEST_F(BridgeRoundTrip, SelectedNodesArriveInOrderAndBothSidesCleanUp) {
         EXPECT_EQ(sendOrder, (QStringList{"Cup", "Body", "Plate"}));
         pid = bridge.modelerProcessId();
         // The modeler's goodbye stops the poll.
-        ASSERT_TRUE(bridgetest::waitUntil([&] { return !bridge.isActive(); }, 20000))
+        ASSERT_TRUE(bridgetest::waitUntil(
+            [&] { return !bridge.isActive() && bridge.pendingImports() == 0; }, 20000))
             << run.log().toStdString();
         EXPECT_FALSE(bridge.pollTimer()->isActive());
         EXPECT_EQ(bridge.sendList().count(), 0);
@@ -179,7 +180,8 @@ TEST_F(BridgeRoundTrip, ReturnedGeometryWithAnUnknownNameBecomesAProp) {
         TestBridge bridge;
         bridge.executeAction();
         pid = bridge.modelerProcessId();
-        ASSERT_TRUE(bridgetest::waitUntil([&] { return !bridge.isActive(); }, 20000))
+        ASSERT_TRUE(bridgetest::waitUntil(
+            [&] { return !bridge.isActive() && bridge.pendingImports() == 0; }, 20000))
             << run.log().toStdString();
     }
     EXPECT_TRUE(run.log().contains("host read the returned geometry")) << run.log().toStdString();
