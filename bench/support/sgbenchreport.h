@@ -79,6 +79,8 @@ public:
             const double total =
                 m_clock == CpuTime ? run.cpu_accumulated_time : run.real_accumulated_time;
             m_samples[nameOf(run)].push_back(total / double(run.iterations));
+            for (const auto &[counter, value] : run.counters)
+                m_counters[nameOf(run) + "#" + counter].push_back(value.value);
         }
         ConsoleReporter::ReportRuns(runs);
     }
@@ -90,6 +92,11 @@ public:
     }
     double median(const std::string &name) const { return sgMedian(samples(name)); }
     double fastest(const std::string &name) const { return sgFastest(samples(name)); }
+    // The median over the repetitions of a benchmark's user counter (state.counters[counter]).
+    double counterMedian(const std::string &name, const std::string &counter) const {
+        const auto found = m_counters.find(name + "#" + counter);
+        return found == m_counters.end() ? 0.0 : sgMedian(found->second);
+    }
 
 private:
     static std::string nameOf(const Run &run) {
@@ -99,4 +106,5 @@ private:
 
     Clock m_clock;
     std::map<std::string, std::vector<double>> m_samples;
+    std::map<std::string, std::vector<double>> m_counters;
 };
