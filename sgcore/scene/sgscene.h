@@ -43,7 +43,7 @@ public:
     // Removes `node` and its descendants from the scene and deletes them; they leave the
     // selection, and figures that followed a removed figure follow none.
     void removeNode(SgNode *node);
-    // Removes and deletes every node.
+    // Removes and deletes every node; emits nodeRemoved for each, as removeNode does.
     void clear();
 
     // Selection. `selectNode` with `add` false replaces the selection; the node becomes the
@@ -62,6 +62,9 @@ public:
 
 signals:
     void nodeAdded(SgNode *node);
+    // Emitted for every node that leaves the scene, whatever removed it (removeNode, clear,
+    // loading another scene, the scene's destruction), after it has left the node list and
+    // the selection and before it is deleted: a holder of the pointer drops it here.
     void nodeRemoved(SgNode *node);
     void selectionChanged();
     void sceneUpdated();
