@@ -158,6 +158,9 @@ void SgScene::clear() {
     std::vector<SgNode *> nodes;
     nodes.swap(m_nodes);
     for (SgNode *n : nodes) {
+        emit nodeRemoved(n);
+    }
+    for (SgNode *n : nodes) {
         n->setParent(nullptr);
     }
     for (SgNode *n : nodes) {

@@ -169,3 +169,33 @@ TEST(HeadlessDemo, ScriptFailuresAndArguments) {
     EXPECT_TRUE(args.out.contains(QStringLiteral("script=one,two\n")));
     EXPECT_TRUE(args.out.contains(QStringLiteral("classes=function\n")));
 }
+
+TEST(HeadlessDemo, AClosedBoxDoesNotEndTheScriptAndADeclinedReturnSaysSo) {
+    QTemporaryDir dir;
+    // The modeler returns the prop with a vertex more: no morph can be made, and the script
+    // declines the prop that the host offers instead.
+    const ScenaraRun run = runScenara(
+        {QStringLiteral("--script"),
+         writeScript(dir, QStringLiteral("declined.js"),
+                     "var bridge = app.action('Send to Facetor...');\n"
+                     "app.onQuestion(function (title) { app.print('asked ' + title);"
+                     " return 'No'; });\n"
+                     "bridge.trigger();\n" // nothing selected: "Launch Facetor", answered No
+                     "app.later(200, function () {\n"
+                     "    app.print('still running');\n"
+                     "    selection.select('Box');\n"
+                     "    bridge.trigger();\n"
+                     "    app.waitForBridge(bridge, 30000, function (outcome) {\n"
+                     "        app.print('outcome ' + outcome);\n"
+                     "        app.exit(outcome === 'declined' ? 3 : 4);\n"
+                     "    });\n"
+                     "});\n"),
+         QStringLiteral(SG_EXAMPLES_DIR "/demo/scene.json")},
+        environmentIn(dir, QStringLiteral("extra=0,0,5")));
+    const qsizetype asked = run.out.indexOf(QStringLiteral("asked Launch Facetor\n"));
+    EXPECT_GE(asked, 0) << run.out.toStdString() << run.err.toStdString();
+    EXPECT_GT(run.out.indexOf(QStringLiteral("still running\n")), asked);
+    EXPECT_TRUE(run.out.contains(QStringLiteral("asked Changed Geometry\n")));
+    EXPECT_TRUE(run.out.contains(QStringLiteral("outcome declined\n")));
+    EXPECT_EQ(run.status, 3);
+}
