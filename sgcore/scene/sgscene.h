@@ -45,6 +45,10 @@ public:
     void removeNode(SgNode *node);
     // Removes and deletes every node; emits nodeRemoved for each, as removeNode does.
     void clear();
+    // Moves every node of `other` to the end of this scene, in `other`'s scene order (nodes
+    // with their hierarchy; `other` ends empty, without selection). Emits nodeAdded for each.
+    // Lets a caller load a file into a scratch scene and keep the user's scene when it fails.
+    void takeNodesFrom(SgScene &other);
 
     // Selection. `selectNode` with `add` false replaces the selection; the node becomes the
     // primary selection. Nodes outside the scene are ignored.

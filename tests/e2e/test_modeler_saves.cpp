@@ -196,6 +196,9 @@ TEST_F(ModelerSaves, EverySaveStyleGivesExactlyOneCompleteReturn) {
     bridge.closing();
     ASSERT_TRUE(bridgetest::waitUntil(
         [&] { return !bridge.isActive() && bridge.pendingImports() == 0; }, 10000));
+    EXPECT_TRUE(bridgetest::waitUntil(
+        [&] { return run.log().contains(QStringLiteral("quit: the host closed the link")); }, 5000))
+        << run.log().toStdString();
 }
 
 TEST_F(ModelerSaves, TheSettingsFileSetsUpALaunchedModelerAndTheEnvironmentOverridesIt) {
@@ -305,9 +308,10 @@ TEST(ModelerRelease, AReturnReleasedInFlightComesAgain) {
     }
     EXPECT_EQ(announcements, 2) << readAll(dir.filePath(QStringLiteral("log"))).toStdString();
     EXPECT_EQ(vertices, 3);
-    while (!post(SgHostMessage::ShuttingDown))
-        QThread::msleep(5);
+    // A signal ends it too, and its log says which.
+    modeler.terminate();
     EXPECT_TRUE(modeler.waitForFinished(5000));
+    EXPECT_TRUE(readAll(dir.filePath(QStringLiteral("log"))).contains("quit: signal SIGTERM"));
     control.detach();
     control.remove(SgSharedMemory::kRemoveUnlocked);
 }
