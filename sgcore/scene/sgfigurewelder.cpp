@@ -13,6 +13,7 @@
 
 #include <bit>
 #include <cstring>
+#include <numeric>
 #include <unordered_set>
 
 // What the welder remembers of one bone.
@@ -429,6 +430,40 @@ std::vector<int32_t> SgFigureWelder::getWeldCounts() const {
 }
 
 SgVertexMesh *SgFigureWelder::unWeld(const SgVertexMesh *edited) const {
+    SgPolyMesh *out = unWeldVertices(edited);
+    if (!out) {
+        return nullptr;
+    }
+    const SgPolyMesh *welded = getGeometry();
+    if (const SgMap *uvs = welded->getUVList()) {
+        out->setUVList(new SgMap(*uvs));
+    }
+    reserveFor(*out, m_slices);
+    for (const BoneSlice &s : m_slices) {
+        const int32_t group = out->addFaceGroup(s.bone->getName());
+        appendFacets(*out, *s.base, s.materialMap, group, s.uvOffset,
+                     [&](int32_t v) { return v + s.outStart; });
+        appendCarriers(*out, s.unused, s.outStart, group);
+    }
+    return out;
+}
+
+SgVertexMesh *SgFigureWelder::unWeldVerticesAndGroups(const SgVertexMesh *edited) const {
+    SgPolyMesh *out = unWeldVertices(edited);
+    if (!out) {
+        return nullptr;
+    }
+    std::vector<int32_t> all;
+    for (const BoneSlice &s : m_slices) {
+        const int32_t group = out->addFaceGroup(s.bone->getName());
+        all.resize(s.weldIndex.size());
+        std::iota(all.begin(), all.end(), 0);
+        appendCarriers(*out, all, s.outStart, group);
+    }
+    return out;
+}
+
+SgPolyMesh *SgFigureWelder::unWeldVertices(const SgVertexMesh *edited) const {
     const SgPolyMesh *welded = getGeometry();
     if (!edited || edited->getVertexCount() != welded->getVertexCount()) {
         return nullptr;
@@ -458,16 +493,6 @@ SgVertexMesh *SgFigureWelder::unWeld(const SgVertexMesh *edited) const {
             }
             std::copy(temp.vertices().begin(), temp.vertices().end(), block);
         }
-    }
-    if (const SgMap *uvs = welded->getUVList()) {
-        out->setUVList(new SgMap(*uvs));
-    }
-    reserveFor(*out, m_slices);
-    for (const BoneSlice &s : m_slices) {
-        const int32_t group = out->addFaceGroup(s.bone->getName());
-        appendFacets(*out, *s.base, s.materialMap, group, s.uvOffset,
-                     [&](int32_t v) { return v + s.outStart; });
-        appendCarriers(*out, s.unused, s.outStart, group);
     }
     return out;
 }
