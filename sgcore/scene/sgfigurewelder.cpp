@@ -131,32 +131,24 @@ SgFaceCorner remapCorner(const SgFaceCorner &c, int32_t vertex, int32_t uvCount,
     return out;
 }
 
-// Grows `v` by `n` default elements and returns a pointer to the first new one.
-template <typename T> T *grow(std::vector<T> &v, size_t n) {
-    const size_t old = v.size();
-    v.resize(old + n);
-    return v.data() + old;
-}
-
 // Appends `bone`'s facets to `out` with vertex indices mapped by `vertexOf`.
 template <typename V>
 void appendFacets(SgPolyMesh &out, const SgPolyMesh &bone, const std::vector<uint8_t> &materialMap,
                   int32_t group, int32_t uvOffset, V &&vertexOf) {
     const int32_t uvCount = bone.getUVCount();
+    // Appended one by one into the room reserveFor made: each byte is written once (a resize
+    // would write every new element twice).
     auto copyCorners = [&](const std::vector<SgFaceCorner> &from, std::vector<SgFaceCorner> &to) {
-        SgFaceCorner *dst = grow(to, from.size());
         for (const SgFaceCorner &c : from) {
-            *dst++ = remapCorner(c, vertexOf(c.vertex), uvCount, uvOffset);
+            to.push_back(remapCorner(c, vertexOf(c.vertex), uvCount, uvOffset));
         }
     };
     auto copyFacets = [&](const std::vector<uint8_t> &mats, std::vector<uint8_t> &toMats,
                           std::vector<int32_t> &toGroups) {
-        uint8_t *m = grow(toMats, mats.size());
         for (uint8_t local : mats) {
-            *m++ = local < materialMap.size() ? materialMap[local] : uint8_t(255);
+            toMats.push_back(local < materialMap.size() ? materialMap[local] : uint8_t(255));
         }
-        int32_t *g = grow(toGroups, mats.size());
-        std::fill(g, g + mats.size(), group);
+        toGroups.insert(toGroups.end(), mats.size(), group);
     };
     copyCorners(bone.triangleCorners(), out.triangleCorners());
     copyFacets(bone.triangleMaterials(), out.triangleMaterials(), out.triangleGroups());
