@@ -92,6 +92,7 @@ SgCreatePropertyDlg::SgCreatePropertyDlg(QWidget *parent, const QString &name, b
     buildEnumPage();
     buildAdditionalOptionsPage();
     buildButtonRow();
+    alignLabelColumns();
     setModal(true);
     restoreDefaults();
     updateDisplay();
@@ -121,9 +122,13 @@ QLabel *SgCreatePropertyDlg::addRow(QGridLayout *grid, int row, const QString &t
                                     const QString &labelName, QWidget *widget) {
     auto *label = new QLabel(text, grid->parentWidget());
     label->setObjectName(labelName);
-    label->setFixedWidth(LabelWidth);
+    // At least the common label width, wider when the text (or its translation) needs it.
+    label->setMinimumWidth(LabelWidth);
     grid->addWidget(label, row, 0);
-    grid->addWidget(widget, row, 1);
+    // A widget of fixed width (the yes/no buttons) sits at the start of its column.
+    const bool fixed = widget->sizePolicy().horizontalPolicy() == QSizePolicy::Fixed;
+    grid->addWidget(widget, row, 1, fixed ? Qt::AlignLeft : Qt::Alignment());
+    m_labels.append(label);
     return label;
 }
 
@@ -382,11 +387,11 @@ void SgCreatePropertyDlg::buildButtonRow() {
     row->addWidget(new QWidget(m_buttonRow), 1);
     auto *create = new QPushButton(tr("Create"), m_buttonRow);
     create->setObjectName(QStringLiteral("SgCreatePropButton"));
-    create->setFixedWidth(LabelWidth);
+    create->setMinimumWidth(LabelWidth);
     create->setDefault(true);
     auto *cancel = new QPushButton(tr("Cancel"), m_buttonRow);
     cancel->setObjectName(QStringLiteral("SgCancelCreatePropButton"));
-    cancel->setFixedWidth(LabelWidth);
+    cancel->setMinimumWidth(LabelWidth);
     buttons->addButton(create);
     buttons->addButton(cancel);
     row->addWidget(create);
@@ -394,6 +399,15 @@ void SgCreatePropertyDlg::buildButtonRow() {
     connect(create, &QPushButton::clicked, this, &SgCreatePropertyDlg::acceptButtonClicked);
     connect(cancel, &QPushButton::clicked, this, &SgCreatePropertyDlg::resetValues);
     m_mainLayout->addWidget(m_buttonRow);
+}
+
+void SgCreatePropertyDlg::alignLabelColumns() {
+    // Every page's labels share one column width, so the editing widgets of all pages line up.
+    int width = LabelWidth;
+    for (const QLabel *label : std::as_const(m_labels))
+        width = qMax(width, label->sizeHint().width());
+    for (QLabel *label : std::as_const(m_labels))
+        label->setMinimumWidth(width);
 }
 
 bool SgCreatePropertyDlg::eventFilter(QObject *watched, QEvent *event) {
@@ -467,6 +481,7 @@ void SgCreatePropertyDlg::updateDisplay() {
         m_defaultNodeLabel->setText(tr("Default Node:"));
         m_nodePage->setTitle(tr("Node Attributes"));
     }
+    alignLabelColumns();
     fillChoosers();
     m_nodeMenu->setCurrentNode(nullptr);
     m_defaultNodeMenu->setCurrentNode(nullptr);
@@ -587,7 +602,9 @@ void SgCreatePropertyDlg::setPathReadOnly(bool readOnly) {
 }
 
 void SgCreatePropertyDlg::setCreationNodes(SgNodeList &list) {
-    m_creationNodes = list;
+    m_creationNodes.clear();
+    for (SgNode *node : list)
+        insertCreationNode(node);
 }
 
 void SgCreatePropertyDlg::insertCreationNode(SgNode *node) {

@@ -89,7 +89,7 @@ public slots:
     void setDefaultPath(QString path);
     // Hides (true) or shows the path edit and its label; the path defaults box stays.
     void setPathReadOnly(bool readOnly);
-    // Replaces the creation nodes by `list`, in order.
+    // Replaces the creation nodes by `list`, in order, without null entries and repeats.
     void setCreationNodes(SgNodeList &list);
     // Appends `node` unless it is null or already a creation node.
     void insertCreationNode(SgNode *node);
@@ -162,6 +162,7 @@ private:
     void buildEnumPage();
     void buildAdditionalOptionsPage();
     void buildButtonRow();
+    void alignLabelColumns();
 
     // State.
     void restoreDefaults();
@@ -219,6 +220,7 @@ private:
     SgBoolButton *m_hidden = nullptr, *m_locked = nullptr, *m_canAnimate = nullptr;
     QLineEdit *m_pathEdit = nullptr, *m_nameEdit = nullptr, *m_labelEdit = nullptr;
     QLabel *m_pathLabel = nullptr;
+    QList<QLabel *> m_labels;
 
     SavedValues m_saved;
 };

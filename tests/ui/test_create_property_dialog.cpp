@@ -386,6 +386,9 @@ TEST_F(CreatePropertyDialog, CreatesOnEveryNodeAndWarnsForARefusingOne) {
     dialog->insertCreationNode(third);
     dialog->setCreationNode(nullptr);
     EXPECT_EQ(dialog->getCreationNodes(), QList<SgNode *>({first, refusing, third}));
+    // A list with a null entry (a node gone from the scene) must not crash "Create" later.
+    SgNodeList withNull{first, nullptr, refusing, third};
+    dialog->setCreationNodes(withNull);
     setText(*dialog, "SgPropertyInternalNameAttrib", "wink");
     setText(*dialog, "SgPropertyLabelAttrib", "Wink");
     EXPECT_EQ(clickCreate(*dialog, true), "Unable to add property to refusing node");
