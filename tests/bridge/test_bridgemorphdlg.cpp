@@ -93,6 +93,19 @@ TEST(BridgeMorphDlg, OnlyMorphActionsEnableTheMorphSettings) {
         EXPECT_EQ(morphControlsEnabled(), expected[index]) << index;
         EXPECT_EQ(dlg.getActionText(), actionCombo(dlg)->itemText(index));
     }
+
+    // A blank morph name cannot be taken for a morph action; the other actions need none.
+    QPushButton *ok = dlg.buttonBox()->button(QDialogButtonBox::Ok);
+    nameEdit(dlg)->setText("  ");
+    EXPECT_FALSE(ok->isEnabled());
+    QTest::keyClick(&dlg, Qt::Key_Return);
+    EXPECT_TRUE(dlg.isVisible());
+    pickAction(dlg, 3);
+    EXPECT_TRUE(ok->isEnabled());
+    pickAction(dlg, 0);
+    EXPECT_FALSE(ok->isEnabled());
+    QTest::keyClicks(nameEdit(dlg), "x");
+    EXPECT_TRUE(ok->isEnabled());
 }
 
 TEST(BridgeMorphDlg, TypedValuesComeBackWithForwardSlashes) {
