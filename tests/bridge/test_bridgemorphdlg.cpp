@@ -6,6 +6,7 @@
 #include "sgcore/app/sghelpmgr.h"
 #include "sgcore/properties/sgfloatproperty.h"
 #include "sgcore/scene/sgnode.h"
+#include "tests/support/sgwidgetfit.h"
 
 #include <QCheckBox>
 #include <QComboBox>
@@ -82,6 +83,8 @@ TEST(BridgeMorphDlg, OnlyMorphActionsEnableTheMorphSettings) {
     bridgetest::app();
     SgBridgeMorphDlg dlg(QStringLiteral("Hat"), nullptr, nullptr);
     dlg.show();
+    // At its default size every text of the dialog is whole.
+    EXPECT_EQ(sgCutTexts(&dlg), QStringList());
     const auto morphControlsEnabled = [&] {
         return groupCombo(dlg)->isEnabled() + nameEdit(dlg)->isEnabled() +
                overrideBox(dlg)->isEnabled();
