@@ -362,10 +362,11 @@ struct TwoBones {
             v[i] = baseOf(swapped ? b : a)->getVertex(i);
             v[count + i] = baseOf(swapped ? a : b)->getVertex(i);
         }
-        const int groups[2] = {target->addFaceGroup(swapped ? "b" : "a"),
-                               target->addFaceGroup(swapped ? "a" : "b")};
+        // The groups keep their indices; only the halves they cover change.
+        const int a = target->addFaceGroup("a");
+        const int b = target->addFaceGroup("b");
         for (int half = 0; half < 2; ++half) {
-            target->setActiveFaceGroup(groups[half]);
+            target->setActiveFaceGroup((half == 0) != swapped ? a : b);
             for (int i = 0; i + 2 < count; ++i) {
                 target->startFace();
                 for (int k : {0, 1, 2})
@@ -382,15 +383,15 @@ struct TwoBones {
 TEST_F(MorphCreation, ATargetThatFailsOnOneBoneMakesNoMorphOnAny) {
     const float nan = std::numeric_limits<float>::quiet_NaN();
     const float inf = std::numeric_limits<float>::infinity();
-    SgMorphLoader loader;
-    loader.setMorphName("Sculpt");
-    auto *controls = new SgNode("Controls");
-    scene()->addNode(controls);
-    loader.setControlNode(controls);
     // Bone a moves validly; bone b's part of the target is broken in a full scan block (vertex
     // 10), in the tail (vertex 129), or only in the block after a block that moved throughout.
     for (int bad : {10, TwoBones::count - 1, 64}) {
         TwoBones bones;
+        auto *controls = new SgNode("Controls");
+        scene()->addNode(controls);
+        SgMorphLoader loader;
+        loader.setMorphName("Sculpt");
+        loader.setControlNode(controls);
         const SgVec3 at = bones.target->getVertex(3);
         bones.target->setVertex(3, at + SgVec3(0, 1, 0));
         if (bad == 64) // every vertex of b's first block moves, then the fault
@@ -409,13 +410,12 @@ TEST_F(MorphCreation, ATargetThatFailsOnOneBoneMakesNoMorphOnAny) {
         EXPECT_EQ(bones.b->getObject()->getModifierCount(), 0) << bad;
         EXPECT_EQ(controls->getPropertyCount(), 0) << bad;
         scene()->clear();
-        controls = new SgNode("Controls");
-        scene()->addNode(controls);
-        loader.setControlNode(controls);
     }
 
     // A broken node mesh is named as such; one node alone says the same.
     TwoBones bones;
+    SgMorphLoader loader;
+    loader.setMorphName("Sculpt");
     bones.target->setVertex(3, bones.target->getVertex(3) + SgVec3(0, 1, 0));
     baseOf(bones.b)->setVertex(5, SgVec3(nan, 0, 0));
     SgMorphLoadLog log;
