@@ -12,6 +12,7 @@
 #include "sgcore/plugin/sgaction.h"
 
 #include <QApplication>
+#include <QFileInfo>
 #include <QTimer>
 
 #include <cstdio>
@@ -26,7 +27,19 @@ QStringList argumentList(int argc, char **argv) {
     return list;
 }
 
+// A user who starts the application from its build or install folder finds the modeler beside
+// it: the install path defaults to that folder until the user sets one ("Preferences...").
+void defaultModelerPath() {
+    SgAppSettings settings;
+    const QString key = QStringLiteral("FacetorInstallPath");
+    const QString here = QCoreApplication::applicationDirPath();
+    if (!settings.contains(key) && qEnvironmentVariableIsEmpty("FACETOR_INSTALL_PATH") &&
+        QFileInfo(here + QStringLiteral("/Facetor")).isExecutable())
+        settings.setString(key, here);
+}
+
 int runWindow(const SgCommandLine &line, SgPluginHost &plugins) {
+    defaultModelerPath();
     auto window = std::make_unique<SgAppWindow>();
     for (SgAction *action : plugins.actions())
         window->addPluginAction(action);

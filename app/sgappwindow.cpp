@@ -3,6 +3,7 @@
 #include "app/sglogpane.h"
 #include "app/sgmeshview.h"
 #include "app/sgobjexport.h"
+#include "app/sgpreferencesdlg.h"
 #include "app/sgprogressview.h"
 #include "app/sgpropertypanel.h"
 #include "app/sgscenetree.h"
@@ -12,10 +13,12 @@
 #include "sgcore/app/sgmessagesink.h"
 #include "sgcore/io/sgscenefile.h"
 #include "sgcore/plugin/sgaction.h"
+#include "sgcore/scene/sgbone.h"
 #include "sgcore/scene/sgnode.h"
 #include "sgcore/scene/sgscene.h"
 #include "sharedsource/loaderui/sgmorphloaderdlg.h"
 
+#include <QCloseEvent>
 #include <QDockWidget>
 #include <QFileDialog>
 #include <QFileInfo>
@@ -23,6 +26,8 @@
 #include <QMessageBox>
 #include <QStatusBar>
 #include <QToolBar>
+
+#include <algorithm>
 
 SgAppWindow::SgAppWindow(QWidget *parent) : QMainWindow(parent) {
     setObjectName(QStringLiteral("SgAppWindow"));
@@ -68,10 +73,18 @@ SgAppWindow::SgAppWindow(QWidget *parent) : QMainWindow(parent) {
     });
     connect(scene, &SgScene::sceneUpdated, m_panel, &SgPropertyPanel::refresh);
     connect(m_panel, &SgPropertyPanel::valueEdited, m_view, qOverload<>(&QWidget::update));
+    for (auto signal : {&SgScene::nodeAdded, &SgScene::nodeRemoved})
+        connect(scene, signal, this, &SgAppWindow::markModified);
+    connect(scene, &SgScene::sceneUpdated, this, &SgAppWindow::markModified);
+    connect(m_panel, &SgPropertyPanel::valueEdited, this, &SgAppWindow::markModified);
 
     buildMenus();
     statusBar()->showMessage(tr("Ready"));
-    resize(1100, 720);
+    // Fits a 1280 x 800 screen with room for a task bar and the window frame.
+    resize(1180, 680);
+    resizeDocks({treeDock, panelDock}, {210, 300}, Qt::Horizontal);
+    resizeDocks({logDock}, {150}, Qt::Vertical);
+    updateTitle();
     sgApp->setInterface(this);
 }
 
@@ -86,12 +99,36 @@ void SgAppWindow::buildMenus() {
     QAction *open = file->addAction(tr("Open Scene..."), this, &SgAppWindow::openSceneDialog);
     open->setObjectName(QStringLiteral("SgOpenSceneAction"));
     open->setShortcut(QKeySequence::Open);
+    QAction *save = file->addAction(tr("Save Scene"), this, [this] { saveScene(); });
+    save->setObjectName(QStringLiteral("SgSaveSceneAction"));
+    save->setShortcut(QKeySequence::Save);
+    QAction *saveAs =
+        file->addAction(tr("Save Scene As..."), this, &SgAppWindow::saveSceneAsDialog);
+    saveAs->setObjectName(QStringLiteral("SgSaveSceneAsAction"));
+    saveAs->setShortcut(QKeySequence::SaveAs);
     QAction *exportObj = file->addAction(tr("Export OBJ..."), this, &SgAppWindow::exportObjDialog);
     exportObj->setObjectName(QStringLiteral("SgExportObjAction"));
     exportObj->setShortcut(QKeySequence(Qt::CTRL | Qt::Key_E));
     file->addSeparator();
+    QAction *preferences =
+        file->addAction(tr("Preferences..."), this, &SgAppWindow::preferencesDialog);
+    preferences->setObjectName(QStringLiteral("SgPreferencesAction"));
+    file->addSeparator();
     QAction *quit = file->addAction(tr("Quit"), this, &QWidget::close);
     quit->setShortcut(QKeySequence::Quit);
+
+    QMenu *edit = menuAt(tr("&Edit"));
+    QAction *remove = edit->addAction(tr("Delete"), this, [this] { deleteSelection(); });
+    remove->setObjectName(QStringLiteral("SgDeleteAction"));
+    remove->setShortcut(QKeySequence::Delete);
+
+    QMenu *view = menuAt(tr("&View"));
+    QAction *frame = view->addAction(tr("Frame Selection"), m_view, &SgMeshView::frameSelection);
+    frame->setObjectName(QStringLiteral("SgFrameSelectionAction"));
+    frame->setShortcut(QKeySequence(Qt::Key_F));
+    QAction *frameAll = view->addAction(tr("Frame All"), m_view, &SgMeshView::frameAll);
+    frameAll->setObjectName(QStringLiteral("SgFrameAllAction"));
+    frameAll->setShortcut(QKeySequence(Qt::Key_A));
 
     QMenu *tools = menuAt(tr("&Tools"));
     QAction *importer =
@@ -140,9 +177,11 @@ bool SgAppWindow::openScene(const QString &path, bool quiet) {
     m_panel->showNode(nullptr);
     m_panelNode = nullptr;
     scene->clear();
+    m_scenePath.clear();
     SgSceneFile file;
     if (!file.load(path, scene)) {
         sgApp->log(QStringLiteral("Could not open the scene: %1").arg(file.getErrorString()));
+        setModified(false);
         if (!quiet)
             QMessageBox::warning(this, tr("Open Scene"), file.getErrorString(), QMessageBox::Ok);
         return false;
@@ -151,9 +190,125 @@ bool SgAppWindow::openScene(const QString &path, bool quiet) {
                    .arg(QFileInfo(path).fileName())
                    .arg(file.getAddedNodeCount()));
     sgApp->statusLine(tr("Opened %1").arg(QFileInfo(path).fileName()));
-    setWindowTitle(QStringLiteral("Scenara - %1").arg(QFileInfo(path).fileName()));
     scene->update();
+    m_scenePath = QFileInfo(path).absoluteFilePath();
+    setModified(false);
+    m_view->frameAll();
     return true;
+}
+
+bool SgAppWindow::saveScene(const QString &path, bool quiet) {
+    const QString target = path.isEmpty() ? m_scenePath : path;
+    if (target.isEmpty())
+        return quiet ? false : saveSceneAsDialog();
+    SgSceneFile file;
+    if (!file.save(target, sgApp->getScene())) {
+        sgApp->log(QStringLiteral("Could not save the scene: %1").arg(file.getErrorString()));
+        if (!quiet)
+            QMessageBox::warning(this, tr("Save Scene"), file.getErrorString(), QMessageBox::Ok);
+        return false;
+    }
+    sgApp->log(QStringLiteral("Saved %1 (%2 nodes).")
+                   .arg(QFileInfo(target).fileName())
+                   .arg(sgApp->getScene()->getNodeCount()));
+    sgApp->statusLine(tr("Saved %1").arg(QFileInfo(target).fileName()));
+    m_scenePath = QFileInfo(target).absoluteFilePath();
+    setModified(false);
+    return true;
+}
+
+bool SgAppWindow::saveSceneAsDialog() {
+    SgAppSettings settings(QStringLiteral("Scenara"));
+    const QString start =
+        m_scenePath.isEmpty() ? settings.getString(QStringLiteral("SceneDirectory")) : m_scenePath;
+    QString path = QFileDialog::getSaveFileName(this, tr("Save Scene As"), start,
+                                                tr("Scenes (*.json);;All files (*)"));
+    if (path.isEmpty())
+        return false;
+    if (QFileInfo(path).suffix().isEmpty())
+        path += QStringLiteral(".json");
+    settings.setString(QStringLiteral("SceneDirectory"), QFileInfo(path).absolutePath());
+    return saveScene(path);
+}
+
+bool SgAppWindow::maybeSaveChanges() {
+    if (!m_modified)
+        return true;
+    const QString name =
+        m_scenePath.isEmpty() ? tr("The scene") : QFileInfo(m_scenePath).fileName();
+    const auto answer = QMessageBox::question(
+        this, tr("Unsaved Changes"),
+        tr("%1 has unsaved changes.\nDo you want to save them?").arg(name),
+        QMessageBox::Save | QMessageBox::Discard | QMessageBox::Cancel, QMessageBox::Save);
+    if (answer == QMessageBox::Save)
+        return saveScene();
+    return answer == QMessageBox::Discard;
+}
+
+void SgAppWindow::closeEvent(QCloseEvent *event) {
+    if (maybeSaveChanges())
+        event->accept();
+    else
+        event->ignore();
+}
+
+int SgAppWindow::deleteSelection(bool ask) {
+    SgScene *scene = sgApp->getScene();
+    const SgNodeList selected = scene->getSelectedNodes();
+    auto chosen = [&](const SgNode *node) {
+        return std::find(selected.begin(), selected.end(), node) != selected.end() &&
+               dynamic_cast<const SgBone *>(node) == nullptr;
+    };
+    // A node that goes with a chosen ancestor is not removed a second time.
+    SgNodeList doomed;
+    QStringList labels;
+    for (SgNode *node : selected) {
+        if (!chosen(node))
+            continue;
+        bool underChosen = false;
+        for (SgNode *up = node->getParent(); up && !underChosen; up = up->getParent())
+            underChosen = chosen(up);
+        if (!underChosen) {
+            doomed.push_back(node);
+            labels.append(node->getLabel());
+        }
+    }
+    if (doomed.empty()) {
+        sgApp->statusLine(tr("Select a prop or a figure to delete (a bone goes with its figure)."));
+        return 0;
+    }
+    if (ask && QMessageBox::question(sgApp->getDialogParent(), tr("Delete"),
+                                     tr("Delete %1?").arg(labels.join(QStringLiteral(", "))),
+                                     QMessageBox::Yes | QMessageBox::No,
+                                     QMessageBox::Yes) != QMessageBox::Yes)
+        return 0;
+    for (SgNode *node : doomed)
+        scene->removeNode(node);
+    sgApp->log(QStringLiteral("Deleted %1.").arg(labels.join(QStringLiteral(", "))));
+    scene->update();
+    return int(doomed.size());
+}
+
+void SgAppWindow::preferencesDialog() {
+    SgPreferencesDlg dialog(this);
+    dialog.exec();
+}
+
+void SgAppWindow::markModified() {
+    setModified(true);
+}
+
+void SgAppWindow::setModified(bool modified) {
+    if (m_modified == modified)
+        return;
+    m_modified = modified;
+    updateTitle();
+}
+
+void SgAppWindow::updateTitle() {
+    const QString name = m_scenePath.isEmpty() ? tr("Untitled") : QFileInfo(m_scenePath).fileName();
+    setWindowTitle(
+        QStringLiteral("Scenara - %1%2").arg(name, m_modified ? QStringLiteral("*") : QString()));
 }
 
 bool SgAppWindow::exportSelection(const QString &path, bool quiet) {
@@ -170,6 +325,8 @@ bool SgAppWindow::exportSelection(const QString &path, bool quiet) {
 }
 
 void SgAppWindow::openSceneDialog() {
+    if (!maybeSaveChanges())
+        return;
     SgAppSettings settings(QStringLiteral("Scenara"));
     const QString path = QFileDialog::getOpenFileName(
         this, tr("Open Scene"), settings.getString(QStringLiteral("SceneDirectory")),

@@ -5,7 +5,8 @@
 class SgNode;
 
 // "File > Export OBJ...": writes a node's current geometry, that is its shape with the object's
-// modifier stack applied (morphs at their current values, poses), as a Wavefront OBJ file.
+// modifier stack applied (morphs at their current values, poses), as a Wavefront OBJ file with
+// its UVs, and the node's materials as an MTL file of the same base name beside it ("mtllib").
 // A figure is written bone by bone, each bone's geometry as a face group named after the bone,
 // in the figure's bone order; any other node as one group named after its label. Vertex order
 // inside each group is the node's own, so the file can be compared vertex by vertex.

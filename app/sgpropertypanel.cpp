@@ -17,9 +17,13 @@ constexpr double kUnclampedLimit = 1.0e6;
 
 SgPropertyPanel::SgPropertyPanel(QWidget *parent) : QTreeWidget(parent) {
     setObjectName(QStringLiteral("SgPropertyPanel"));
-    setColumnCount(3);
-    setHeaderLabels({tr("Property"), tr("Value"), tr("Group")});
-    header()->setSectionResizeMode(0, QHeaderView::Stretch);
+    setColumnCount(2);
+    setHeaderLabels({tr("Property"), tr("Value")});
+    // Labels are shown whole: the label column takes its contents' width, the value column
+    // the rest.
+    header()->setStretchLastSection(true);
+    header()->setSectionResizeMode(0, QHeaderView::ResizeToContents);
+    setTextElideMode(Qt::ElideNone);
     setRootIsDecorated(true);
 }
 
@@ -51,8 +55,14 @@ void SgPropertyPanel::addRows(QTreeWidgetItem *section, SgElement *element) {
         auto *numeric = dynamic_cast<SgNumericProperty *>(property);
         if (numeric == nullptr)
             continue;
-        auto *row =
-            new QTreeWidgetItem(section, {numeric->getLabel(), QString(), numeric->getPath()});
+        auto *row = new QTreeWidgetItem(section, {numeric->getLabel()});
+        // The tooltip gives the property's full path in its group tree and its name.
+        const QString path = numeric->getPath().isEmpty()
+                                 ? numeric->getLabel()
+                                 : numeric->getPath() + QLatin1Char('/') + numeric->getLabel();
+        row->setToolTip(0, numeric->getName() == numeric->getLabel()
+                               ? path
+                               : tr("%1 (name: %2)").arg(path, numeric->getName()));
         if (numeric->isHidden())
             row->setForeground(0, palette().color(QPalette::Disabled, QPalette::Text));
         auto *spin = new QDoubleSpinBox(this);
@@ -64,7 +74,7 @@ void SgPropertyPanel::addRows(QTreeWidgetItem *section, SgElement *element) {
         else
             spin->setRange(-kUnclampedLimit, kUnclampedLimit);
         spin->setValue(numeric->getValue());
-        spin->setToolTip(numeric->getName());
+        spin->setToolTip(row->toolTip(0));
         connect(spin, &QDoubleSpinBox::valueChanged, this,
                 [this, numeric](double value) { setValue(numeric, value); });
         setItemWidget(row, 1, spin);

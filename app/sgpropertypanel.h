@@ -8,7 +8,8 @@ class SgNode;
 
 // The property panel: every numeric property of one node, grouped by where it lives (the node,
 // its object, each modifier of its object; a morph's value channel shows under the morph), each
-// with a spin box that sets its value. Setting a value emits `valueEdited`, so that views
+// with a spin box that sets its value. Labels are shown whole; a row's tooltip gives the
+// property's group path and name. Setting a value emits `valueEdited`, so that views
 // redraw the node's current geometry; controllers and clamping apply when the value is read.
 class SgPropertyPanel : public QTreeWidget {
     Q_OBJECT

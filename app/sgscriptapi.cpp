@@ -208,6 +208,17 @@ bool SgScriptScene::load(const QString &path) {
     return true;
 }
 
+bool SgScriptScene::save(const QString &path) {
+    SgSceneFile file;
+    if (!file.save(path, sgApp->getScene())) {
+        m_error = file.getErrorString();
+        sgApp->log(QStringLiteral("Could not save the scene: %1").arg(m_error));
+        return false;
+    }
+    m_error.clear();
+    return true;
+}
+
 QStringList SgScriptScene::labels() const {
     QStringList out;
     for (SgNode *node : sgApp->getScene()->getNodes())

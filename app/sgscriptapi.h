@@ -78,6 +78,8 @@ public:
 
     // Replaces the scene with the file's nodes; false (reason in `lastError`) on failure.
     Q_INVOKABLE bool load(const QString &path);
+    // Saves the scene as a scene file (geometry beside it); false (reason in `lastError`).
+    Q_INVOKABLE bool save(const QString &path);
     Q_INVOKABLE QString lastError() const { return m_error; }
     // Every node's label in scene order, and the labels of the figures.
     Q_INVOKABLE QStringList labels() const;

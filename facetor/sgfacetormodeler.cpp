@@ -1,18 +1,20 @@
 #include "facetor/sgfacetormodeler.h"
 
 #include "facetor/sgfacetorcheckpoint.h"
+#include "facetor/sgfacetorobjfile.h"
 #include "facetor/sgfacetorreturn.h"
+#include "facetor/sgfacetorsavesettler.h"
 
 #include <QCoreApplication>
 #include <QElapsedTimer>
 #include <QFile>
 #include <QFileInfo>
-#include <QFileSystemWatcher>
 #include <QTextStream>
 #include <QThread>
 #include <QTimer>
 
 #include <atomic>
+#include <csignal>
 
 namespace {
 
@@ -20,6 +22,18 @@ namespace {
 enum Code { Idle = 0, Data = 1, Quit = 2, Acknowledge = 3, Release = 4 };
 
 std::atomic<bool> s_quitRequested{false};
+std::atomic<int> s_quitSignal{0};
+
+QString signalName(int signal) {
+    switch (signal) {
+    case SIGINT:
+        return QStringLiteral("SIGINT (the user asked)");
+    case SIGTERM:
+        return QStringLiteral("SIGTERM");
+    default:
+        return QStringLiteral("%1").arg(signal);
+    }
+}
 
 // How long quitting keeps trying to post its goodbye while the host has not taken the last
 // message (the host takes one message per 50 ms poll).
@@ -39,7 +53,8 @@ SgFacetorModeler::SgFacetorModeler(const SgFacetorOptions &options, QObject *par
 
 SgFacetorModeler::~SgFacetorModeler() = default;
 
-void SgFacetorModeler::requestQuit() {
+void SgFacetorModeler::requestQuit(int signal) {
+    s_quitSignal = signal;
     s_quitRequested = true;
 }
 
@@ -75,17 +90,16 @@ bool SgFacetorModeler::start() {
     }
     for (const QString &path : m_options.returnFiles) {
         SgExchangeNode node;
-        if (!SgFacetorWorkspace::readObj(path, QString(), node, error)) {
+        if (!SgFacetorObjFile::read(path, QString(), node, error)) {
             log(QStringLiteral("error %1").arg(error));
             return false;
         }
         m_returns.enqueue(node);
     }
     if (m_options.watch) {
-        auto *watcher = new QFileSystemWatcher(this);
-        watcher->setObjectName(QStringLiteral("workspaceWatcher"));
-        connect(watcher, &QFileSystemWatcher::fileChanged, this,
-                &SgFacetorModeler::workspaceFileChanged);
+        m_settler = new SgFacetorSaveSettler(m_options.settleMs, this);
+        connect(m_settler, &SgFacetorSaveSettler::settled, this,
+                &SgFacetorModeler::workspaceFileSaved);
     }
     SgFacetorCheckpoint::setReporter([this](const QString &line) { log(line); });
     log(QStringLiteral("workspace %1").arg(m_workspace->folder().absolutePath()));
@@ -94,7 +108,7 @@ bool SgFacetorModeler::start() {
     return true;
 }
 
-void SgFacetorModeler::quit(int exitCode) {
+void SgFacetorModeler::quit(int exitCode, const QString &reason) {
     if (m_quitting)
         return;
     m_quitting = true;
@@ -111,13 +125,13 @@ void SgFacetorModeler::quit(int exitCode) {
     }
     m_link.releaseData();
     m_link.unlink();
-    log(QStringLiteral("quit %1").arg(exitCode));
+    log(QStringLiteral("quit: %1 (exit code %2)").arg(reason).arg(exitCode));
     QCoreApplication::exit(exitCode);
 }
 
 void SgFacetorModeler::poll() {
     if (s_quitRequested) {
-        quit(0);
+        quit(0, QStringLiteral("signal %1").arg(signalName(s_quitSignal)));
         return;
     }
     if (m_link.isLinked()) {
@@ -133,7 +147,7 @@ void SgFacetorModeler::poll() {
         SgFacetorCheckpoint::reach("requested");
     } else if (QDateTime::currentDateTimeUtc() > m_linkDeadline) {
         log(QStringLiteral("error the host never set the control segment up"));
-        quit(1);
+        quit(1, QStringLiteral("the host never set the link up"));
     }
 }
 
@@ -150,7 +164,7 @@ void SgFacetorModeler::pollLinked() {
         // segments for good.
         log(QStringLiteral("error the host has sent nothing for %1 ms")
                 .arg(m_options.hostTimeoutMs));
-        quit(1);
+        quit(1, QStringLiteral("the host has gone silent"));
         return;
     }
     if (!m_selectionArrived && m_options.expect <= 0 && m_idleSince.isValid() &&
@@ -171,7 +185,7 @@ void SgFacetorModeler::react(int code) {
         break;
     case Quit:
         log(QStringLiteral("host closing"));
-        quit(0);
+        quit(0, QStringLiteral("the host closed the link"));
         break;
     case Acknowledge:
         log(QStringLiteral("host read the returned geometry"));
@@ -179,12 +193,19 @@ void SgFacetorModeler::react(int code) {
         m_link.releaseData();
         SgFacetorCheckpoint::reach("return-released");
         m_returnInFlight = false;
+        m_inFlight = SgExchangeNode();
         ++m_returned;
         startNextReturn();
         break;
     case Release:
         log(QStringLiteral("host asks to release the data segment"));
         m_link.releaseData();
+        if (m_returnInFlight) {
+            // The host never read it: it goes out again first, once the host is free.
+            log(QStringLiteral("return of %1 put back").arg(m_inFlight.name));
+            m_returns.prepend(std::move(m_inFlight));
+            m_inFlight = SgExchangeNode();
+        }
         m_returnInFlight = false;
         postOrQueue(Idle);
         break;
@@ -214,11 +235,8 @@ void SgFacetorModeler::receiveNode() {
                 .arg(node.facets.size())
                 .arg(node.materials.size())
                 .arg(path));
-        if (!path.isEmpty()) {
-            m_writtenAt.insert(path, QFileInfo(path).lastModified());
-            if (auto *watcher = findChild<QFileSystemWatcher *>(QStringLiteral("workspaceWatcher")))
-                watcher->addPath(path);
-        }
+        if (!path.isEmpty() && m_settler)
+            m_settler->watch(path);
         if (!m_edit.isEmpty()) {
             m_edit.apply(node);
             queueReturn(node);
@@ -232,19 +250,11 @@ void SgFacetorModeler::receiveNode() {
         selectionComplete();
 }
 
-void SgFacetorModeler::workspaceFileChanged(const QString &path) {
-    auto *watcher = findChild<QFileSystemWatcher *>(QStringLiteral("workspaceWatcher"));
-    // Editors often save by replacing the file, which ends the watch: watch the new file.
-    if (watcher && QFileInfo::exists(path) && !watcher->files().contains(path))
-        watcher->addPath(path);
-    const QDateTime modified = QFileInfo(path).lastModified();
-    if (!QFileInfo::exists(path) || m_writtenAt.value(path) == modified)
-        return;
-    m_writtenAt.insert(path, modified);
+void SgFacetorModeler::workspaceFileSaved(const QString &path) {
     SgExchangeNode node;
     QString error;
-    if (!SgFacetorWorkspace::readObj(path, m_workspace->nodeNameOf(path), node, error)) {
-        log(QStringLiteral("error %1").arg(error));
+    if (!SgFacetorObjFile::read(path, m_workspace->nodeNameOf(path), node, error)) {
+        log(QStringLiteral("error %1; %2 not returned").arg(error, path));
         return;
     }
     log(QStringLiteral("saved %1").arg(path));
@@ -264,19 +274,21 @@ void SgFacetorModeler::startNextReturn() {
     // acknowledgement; a return waits for it to go.
     if (m_link.dataSegmentExists())
         return;
-    const SgExchangeNode node = m_returns.head();
+    SgExchangeNode &node = m_returns.head();
     if (!m_link.writeRecord(SgFacetorReturn::encode(node))) {
         // A segment that is still being torn down by the host is tried again at the next poll;
         // any other failure drops this return so that the rest can go.
         if (m_link.dataSegmentBusy())
             return;
-        m_returns.dequeue();
         log(QStringLiteral("error cannot write the returned geometry of %1").arg(node.name));
+        m_returns.dequeue();
         return;
     }
-    m_returns.dequeue();
+    m_inFlight = m_returns.dequeue();
     m_returnInFlight = true;
-    log(QStringLiteral("returned %1 vertices=%2").arg(node.name).arg(node.vertexCount()));
+    log(QStringLiteral("returned %1 vertices=%2")
+            .arg(m_inFlight.name)
+            .arg(m_inFlight.vertexCount()));
     postOrQueue(Data);
     SgFacetorCheckpoint::reach("return-announced");
 }
@@ -290,5 +302,5 @@ void SgFacetorModeler::postOrQueue(int code) {
 void SgFacetorModeler::maybeFinish() {
     if (m_options.quitWhenDone && !m_quitting && m_selectionArrived && !m_returnInFlight &&
         m_returns.isEmpty() && m_outbox.isEmpty())
-        quit(0);
+        quit(0, QStringLiteral("done, every return read"));
 }

@@ -16,13 +16,15 @@
 
 class QFile;
 class QTimer;
+class SgFacetorSaveSettler;
 
-// What the modeler is asked to do, from its command line and environment.
+// What the modeler is asked to do, from its command line, environment and settings file.
 struct SgFacetorOptions {
     QString workspace;         // where received nodes are written
     QString editScript;        // a scripted edit: every received node is returned with it
     QStringList returnFiles;   // OBJ files returned once the selection has arrived
     bool watch = false;        // return a workspace OBJ file whenever it is saved
+    int settleMs = 300;        // a saved file is returned once it has not changed for this long
     bool quitWhenDone = false; // quit once the selection has arrived and every return is read
     int expect = 0;            // the selection is complete after this many nodes (0: when the
                                // host's idle notice is not followed by a node within 250 ms)
@@ -47,15 +49,16 @@ public:
     bool start();
 
     // Posts message 2 (trying for up to 100 ms), lets go of both segments and ends the event
-    // loop with `exitCode`.
-    void quit(int exitCode = 0);
+    // loop with `exitCode`; the log says "quit: <reason>".
+    void quit(int exitCode, const QString &reason);
 
-    // Set from a signal handler: the next poll quits.
-    static void requestQuit();
+    // Set from a signal handler: the next poll quits, naming the signal.
+    static void requestQuit(int signal = 0);
 
 private slots:
     void poll();
-    void workspaceFileChanged(const QString &path);
+    // A watched workspace file has settled after a save: it is returned if it reads whole.
+    void workspaceFileSaved(const QString &path);
 
 private:
     void pollLinked();
@@ -77,7 +80,8 @@ private:
     QDateTime m_linkDeadline;
     QQueue<int> m_outbox;
     QQueue<SgExchangeNode> m_returns;
-    QHash<QString, QDateTime> m_writtenAt;
+    SgExchangeNode m_inFlight; // the return the host has been told about and not yet read
+    SgFacetorSaveSettler *m_settler = nullptr;
     QElapsedTimer m_idleSince;
     QElapsedTimer m_heardFromHost;
     bool m_quitting = false;

@@ -2,15 +2,12 @@
 
 #include <QFile>
 #include <QFileInfo>
-#include <QHash>
 #include <QSaveFile>
 #include <QTextStream>
 
 #include <cmath>
 
 namespace {
-
-constexpr int kMaxPolygonCorners = 255;
 
 QString number(float value) {
     return QString::number(double(value), 'g', 9);
@@ -78,49 +75,6 @@ bool writeObj(const QString &path, const QString &mtlName, const SgExchangeNode 
     return file.commit();
 }
 
-// Resolves an OBJ index (1-based, or negative from the end) against `count` items.
-bool resolveIndex(const QStringView text, int count, int32_t &index) {
-    bool ok = false;
-    const int value = text.toInt(&ok);
-    if (!ok || value == 0)
-        return false;
-    const int64_t resolved = value > 0 ? int64_t(value) - 1 : int64_t(count) + value;
-    if (resolved < 0 || resolved >= count)
-        return false;
-    index = int32_t(resolved);
-    return true;
-}
-
-QHash<QString, SgExchangeNode::Material> readMtl(const QString &path) {
-    QHash<QString, SgExchangeNode::Material> materials;
-    QFile file(path);
-    if (!file.open(QIODevice::ReadOnly | QIODevice::Text))
-        return materials;
-    QTextStream in(&file);
-    QString current;
-    while (!in.atEnd()) {
-        const QString line = in.readLine().trimmed();
-        const QStringList parts = line.split(QLatin1Char(' '), Qt::SkipEmptyParts);
-        if (parts.isEmpty())
-            continue;
-        if (parts[0] == QLatin1String("newmtl") && parts.size() > 1) {
-            current = line.mid(7).trimmed();
-            materials[current].name = current;
-        } else if (!current.isEmpty() && parts[0] == QLatin1String("Kd") && parts.size() >= 4) {
-            for (int i = 0; i < 3; ++i)
-                materials[current].diffuse[i] = parts[i + 1].toFloat();
-        } else if (!current.isEmpty() && parts[0] == QLatin1String("Ks") && parts.size() >= 4) {
-            for (int i = 0; i < 3; ++i)
-                materials[current].specular[i] = parts[i + 1].toFloat();
-        } else if (!current.isEmpty() && parts[0] == QLatin1String("d") && parts.size() >= 2) {
-            materials[current].opacity = parts[1].toFloat();
-        } else if (!current.isEmpty() && parts[0] == QLatin1String("map_Kd") && parts.size() >= 2) {
-            materials[current].diffuseImageCopy = parts.last();
-        }
-    }
-    return materials;
-}
-
 } // namespace
 
 SgFacetorWorkspace::SgFacetorWorkspace(const QString &folder) : m_folder(folder) {
@@ -150,85 +104,4 @@ QString SgFacetorWorkspace::writeNode(const SgExchangeNode &node) {
 
 QString SgFacetorWorkspace::nodeNameOf(const QString &objPath) const {
     return m_nodeByPath.value(QFileInfo(objPath).absoluteFilePath());
-}
-
-bool SgFacetorWorkspace::readObj(const QString &path, const QString &name, SgExchangeNode &node,
-                                 QString &error) {
-    node = SgExchangeNode();
-    QFile file(path);
-    if (!file.open(QIODevice::ReadOnly | QIODevice::Text)) {
-        error = QStringLiteral("Cannot open %1.").arg(path);
-        return false;
-    }
-    SgExchangeNode result;
-    result.name = name.isEmpty() ? QFileInfo(path).completeBaseName() : name;
-    QHash<QString, SgExchangeNode::Material> library;
-    QHash<QString, int> materialIndex;
-    int activeMaterial = -1;
-    QTextStream in(&file);
-    int lineNumber = 0;
-    while (!in.atEnd()) {
-        const QString line = in.readLine();
-        ++lineNumber;
-        const QStringList parts = line.split(QLatin1Char(' '), Qt::SkipEmptyParts);
-        if (parts.isEmpty() || parts[0].startsWith(QLatin1Char('#')))
-            continue;
-        const QString &key = parts[0];
-        if (key == QLatin1String("v") && parts.size() >= 4) {
-            for (int i = 1; i <= 3; ++i)
-                result.vertices.push_back(parts[i].toFloat());
-        } else if (key == QLatin1String("vt") && parts.size() >= 3) {
-            result.uvs.push_back(parts[1].toFloat());
-            result.uvs.push_back(parts[2].toFloat());
-        } else if (key == QLatin1String("o") && name.isEmpty() && parts.size() > 1) {
-            result.name = line.trimmed().mid(2).trimmed();
-        } else if (key == QLatin1String("mtllib") && parts.size() > 1) {
-            library = readMtl(QFileInfo(path).dir().filePath(line.trimmed().mid(7).trimmed()));
-        } else if (key == QLatin1String("usemtl") && parts.size() > 1) {
-            const QString materialName = line.trimmed().mid(7).trimmed();
-            if (!materialIndex.contains(materialName)) {
-                SgExchangeNode::Material material = library.value(materialName);
-                material.name = materialName;
-                materialIndex.insert(materialName, int(result.materials.size()));
-                result.materials.append(material);
-            }
-            activeMaterial = materialIndex.value(materialName);
-        } else if (key == QLatin1String("f")) {
-            const int cornerCount = int(parts.size()) - 1;
-            if (cornerCount < 3 || cornerCount > kMaxPolygonCorners) {
-                error = QStringLiteral("Line %1: a face with %2 corners.")
-                            .arg(lineNumber)
-                            .arg(cornerCount);
-                return false;
-            }
-            if (activeMaterial < 0) {
-                SgExchangeNode::Material material;
-                material.name = QStringLiteral("default");
-                materialIndex.insert(material.name, int(result.materials.size()));
-                activeMaterial = int(result.materials.size());
-                result.materials.append(material);
-            }
-            SgExchangeNode::Facet facet;
-            facet.type = cornerCount == 3 ? 'T' : cornerCount == 4 ? 'Q' : 'P';
-            facet.material = uint32_t(activeMaterial);
-            facet.firstCorner = uint32_t(result.corners.size());
-            facet.cornerCount = uint32_t(cornerCount);
-            for (int c = 1; c <= cornerCount; ++c) {
-                const QStringList indices = parts[c].split(QLatin1Char('/'));
-                SgExchangeNode::Corner corner;
-                corner.uv = -1;
-                corner.third = -1;
-                if (!resolveIndex(indices[0], result.vertexCount(), corner.vertex) ||
-                    (indices.size() > 1 && !indices[1].isEmpty() &&
-                     !resolveIndex(indices[1], result.uvCount(), corner.uv))) {
-                    error = QStringLiteral("Line %1: a corner refers to nothing.").arg(lineNumber);
-                    return false;
-                }
-                result.corners.push_back(corner);
-            }
-            result.facets.push_back(facet);
-        }
-    }
-    node = std::move(result);
-    return true;
 }

@@ -6,13 +6,14 @@ ROOT=$PWD
 BUILD=${SG_BUILD_DIR:-$ROOT/build}
 JOBS=${SG_JOBS:-$(nproc)}
 
-bash scripts/setup-deps.sh
+bash scripts/setup-deps.sh --tests
 
 export CCACHE_BASEDIR=$ROOT
 launcher=()
 command -v ccache >/dev/null && launcher=(-DCMAKE_CXX_COMPILER_LAUNCHER=ccache -DCMAKE_C_COMPILER_LAUNCHER=ccache)
 
-cmake -S . -B "$BUILD" -G Ninja -DCMAKE_BUILD_TYPE=RelWithDebInfo "${launcher[@]}"
+cmake -S . -B "$BUILD" -G Ninja -DCMAKE_BUILD_TYPE=RelWithDebInfo \
+    -DSG_BUILD_TESTS=ON -DSG_BUILD_BENCH=ON -DSG_REQUIRE_TEST_TOOLS=ON "${launcher[@]}"
 cmake --build "$BUILD" -j "$JOBS"
 
 export QT_QPA_PLATFORM=offscreen

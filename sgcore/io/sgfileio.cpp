@@ -2,6 +2,7 @@
 
 #include <QDir>
 #include <QFileInfo>
+#include <QSaveFile>
 
 namespace {
 QString normalised(const QString &path) {
@@ -38,4 +39,13 @@ bool SgFileIO::pathExists(const QString &path, bool create) {
         return info.isDir();
     }
     return create && QDir().mkpath(path);
+}
+
+bool SgFileIO::writeWholeFile(const QString &path, const QByteArray &bytes, QString *error) {
+    QSaveFile file(path);
+    if (file.open(QIODevice::WriteOnly) && file.write(bytes) == bytes.size() && file.commit())
+        return true;
+    if (error)
+        *error = file.errorString();
+    return false;
 }

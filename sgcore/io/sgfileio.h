@@ -1,5 +1,6 @@
 #pragma once
 
+#include <QByteArray>
 #include <QString>
 
 // File name helpers of the host. Paths use "/" separators.
@@ -16,4 +17,8 @@ public:
     // Whether the folder `path` exists; with `create` a missing folder is made (with its
     // parents) first. False when the path names a file or cannot be made.
     static bool pathExists(const QString &path, bool create = false);
+    // Writes `bytes` to `path` in one step: readers see the old file or the whole new one,
+    // never a part. False, with `error` set (when given), when the file cannot be written.
+    static bool writeWholeFile(const QString &path, const QByteArray &bytes,
+                               QString *error = nullptr);
 };

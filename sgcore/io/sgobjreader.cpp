@@ -377,6 +377,12 @@ private:
             }
             return useMaterial(name);
         }
+        if (key == "o") {
+            if (m_owner.m_objectName.isEmpty()) {
+                m_owner.m_objectName = restOfLine();
+            }
+            return true;
+        }
         if (key == "mtllib") {
             const QString name = restOfLine();
             if (!name.isEmpty()) {
@@ -452,6 +458,7 @@ void SgObjReader::reset() {
     m_mesh = nullptr;
     m_materials.clear();
     m_libraries.clear();
+    m_objectName.clear();
     m_error.clear();
     m_errorLine = 0;
 }
@@ -462,6 +469,7 @@ bool SgObjReader::readBuffer(const char *data, size_t size, const QString &sourc
     if (!parser.run()) {
         m_materials.clear();
         m_libraries.clear();
+        m_objectName.clear();
         return false;
     }
     return true;

@@ -20,7 +20,8 @@ class SgPolyShape;
 //   line counts); `g` alone ends the group.
 // - `usemtl name`: the following faces use that material; material indices follow the order
 //   in which names are first used. Faces before any `usemtl` use a material "default".
-// - `o`, `s`, `mtllib` (recorded), `l`, `p` and the other statements of the format are
+// - `o` (the first name recorded), `s`, `mtllib` (recorded), `l`, `p` and the other statements of
+// the format are
 //   accepted and ignored; an unknown statement is an error.
 // Errors stop reading; the message names the file and the line: "<file>:<line>: <what>".
 // Cost: one pass over the bytes, O(size); the file is memory-mapped, not copied.
@@ -47,6 +48,8 @@ public:
     // Material names in index order, and the material libraries named by `mtllib`.
     QStringList getMaterialNames() const { return m_materials; }
     QStringList getMaterialLibraries() const { return m_libraries; }
+    // The name of the file's first `o` statement ("" without one).
+    QString getObjectName() const { return m_objectName; }
 
     // "<file>:<line>: <what>" for the last failure (line 0 when it concerns the whole file).
     QString getErrorString() const { return m_error; }
@@ -59,6 +62,7 @@ private:
     SgPolyMesh *m_mesh = nullptr;
     QStringList m_materials;
     QStringList m_libraries;
+    QString m_objectName;
     QString m_error;
     int m_errorLine = 0;
 };

@@ -5,8 +5,13 @@
 #include "sgcore/geometry/sgobject.h"
 #include "sgcore/geometry/sgpolymesh.h"
 #include "sgcore/geometry/sgpolyshape.h"
+#include "sgcore/io/sgmorphdeltafile.h"
 #include "sgcore/io/sgobjreader.h"
+#include "sgcore/io/sgscenefilewriter.h"
 #include "sgcore/materials/sgdefaultmaterial.h"
+#include "sgcore/morph/sgerclink.h"
+#include "sgcore/morph/sgmorph.h"
+#include "sgcore/morph/sgmorphdeltas.h"
 #include "sgcore/properties/sgboolproperty.h"
 #include "sgcore/properties/sgcolorproperty.h"
 #include "sgcore/properties/sgenumproperty.h"
@@ -49,6 +54,9 @@ public:
     Loader(const QString &baseDir, SgScene *scene) : m_baseDir(baseDir), m_scene(scene) {}
 
     ~Loader() {
+        for (const auto &entry : m_links) {
+            delete entry.second;
+        }
         // Nodes not handed to the scene (a failed load) are deleted, leaves first.
         for (auto it = m_created.rbegin(); it != m_created.rend(); ++it) {
             delete *it;
@@ -70,6 +78,10 @@ public:
         }
         for (const auto &resolve : m_deferred) {
             resolve();
+        }
+        for (auto &[channel, link] : m_links) {
+            channel->insertController(link);
+            link = nullptr;
         }
         for (SgNode *n : m_created) {
             if (!n->getParent() || n->getParent()->getScene() == m_scene) {
@@ -169,7 +181,7 @@ private:
                      QStringLiteral("\"%1\" components must be 0 to 255").arg(QLatin1String(key)));
             }
         }
-        return QColor(int(n[0]), int(n[1]), int(n[2]));
+        return QColor::fromRgbF(float(n[0] / 255.0), float(n[1] / 255.0), float(n[2] / 255.0));
     }
 
     QString resolvePath(const QString &file) const {
@@ -359,6 +371,7 @@ private:
                 object->addShape(shape);
                 node->setObject(object);
                 applyMaterials(shape, o, where);
+                loadMorphs(node, o, where);
             }
         } else {
             fail(where, QStringLiteral("unknown kind \"%1\"").arg(kind));
@@ -410,6 +423,8 @@ private:
                 object->addShape(shape);
                 bone->setObject(object);
                 applyMaterials(shape, o, where);
+                applyMaterials(shape, b, at);
+                loadMorphs(bone, b, at);
             }
         }
         const QString follow = optionalString(o, "followTarget", where);
@@ -492,14 +507,17 @@ private:
             auto *f = new SgFloatProperty(name);
             p.reset(f);
             setNumeric(f, o, at);
+            loadLinks(f, o, at);
         } else if (type == QLatin1String("int")) {
             auto *n = new SgIntProperty(name);
             p.reset(n);
             setNumeric(n, o, at);
+            loadLinks(n, o, at);
         } else if (type == QLatin1String("numericNode")) {
             auto *n = new SgNumericNodeProperty(name);
             p.reset(n);
             setNumeric(n, o, at);
+            loadLinks(n, o, at);
             n->setMustHaveNode(optionalBool(o, "mustHaveNode", false, at));
             deferNode(o, "node", at, [n](SgNode *node) {
                 n->setNode(node);
@@ -548,6 +566,11 @@ private:
         } else {
             fail(at, QStringLiteral("unknown property type \"%1\"").arg(type));
         }
+        applyCommon(p.get(), o, at);
+        return p.release();
+    }
+
+    static void applyCommon(SgProperty *p, const QJsonObject &o, const QString &at) {
         const QString label = optionalString(o, "label", at);
         if (!label.isEmpty()) {
             p->setLabel(label);
@@ -557,13 +580,147 @@ private:
         p->lock(optionalBool(o, "locked", false, at));
         p->setCanAnimate(optionalBool(o, "canAnimate", true, at));
         p->setIsUserProperty(optionalBool(o, "user", false, at));
-        return p.release();
+    }
+
+    // ERC links on a numeric property, resolved once every node of the file exists. The link
+    // is made only then, so that a failed load leaves no controller behind.
+    void loadLinks(SgNumericProperty *channel, const QJsonObject &o, const QString &where) {
+        const QJsonValue v = o.value(QStringLiteral("links"));
+        if (v.isUndefined()) {
+            return;
+        }
+        if (!v.isArray()) {
+            fail(where, QStringLiteral("\"links\" must be an array"));
+        }
+        const QJsonArray list = v.toArray();
+        for (qsizetype i = 0; i < list.size(); ++i) {
+            const QString at = where + QStringLiteral(".links[%1]").arg(i);
+            const QJsonObject l = objectAt(list.at(i), at);
+            const QString nodeName = requiredString(l, "node", at);
+            const QString morphName = optionalString(l, "morph", at);
+            const QString propertyName = requiredString(l, "property", at);
+            const double type = optionalNumber(l, "type", int(SgERCLink::DeltaAdd), at);
+            if (type != double(int(type)) || type < int(SgERCLink::DeltaAdd) ||
+                type > int(SgERCLink::Add)) {
+                fail(at, QStringLiteral("\"type\" must be a link type from 0 to 5"));
+            }
+            const float scale = float(optionalNumber(l, "scale", 1.0, at));
+            const float offset = float(optionalNumber(l, "offset", 0.0, at));
+            m_deferred.push_back([=, this] {
+                SgNumericProperty *control = findControl(nodeName, morphName, propertyName);
+                if (!control) {
+                    fail(at, QStringLiteral("unknown control property \"%1\" on \"%2\"")
+                                 .arg(propertyName, nodeName));
+                }
+                m_links.push_back({channel, new SgERCLink(int(type), control, scale, offset)});
+            });
+        }
+    }
+
+    SgNumericProperty *findControl(const QString &nodeName, const QString &morphName,
+                                   const QString &propertyName) const {
+        SgNode *node = findNode(nodeName);
+        SgElement *owner = node;
+        if (node && !morphName.isEmpty()) {
+            SgObject *object = node->getObject();
+            owner = object ? dynamic_cast<SgMorph *>(object->findModifier(morphName)) : nullptr;
+        }
+        return owner ? dynamic_cast<SgNumericProperty *>(owner->findProperty(propertyName))
+                     : nullptr;
+    }
+
+    void loadMorphs(SgNode *node, const QJsonObject &o, const QString &where) {
+        const QJsonValue v = o.value(QStringLiteral("morphs"));
+        if (v.isUndefined()) {
+            return;
+        }
+        if (!v.isArray()) {
+            fail(where, QStringLiteral("\"morphs\" must be an array"));
+        }
+        const QJsonArray list = v.toArray();
+        for (qsizetype i = 0; i < list.size(); ++i) {
+            const QString at = where + QStringLiteral(".morphs[%1]").arg(i);
+            const QJsonObject m = objectAt(list.at(i), at);
+            auto *morph = new SgMorph(requiredString(m, "name", at));
+            node->getObject()->addModifier(morph);
+            const QString label = optionalString(m, "label", at);
+            if (!label.isEmpty()) {
+                morph->setLabel(label);
+            }
+            if (m.contains(QStringLiteral("deltas"))) {
+                morph->setDeltas(loadDeltas(m, node, at));
+            }
+            const QJsonValue channel = m.value(QStringLiteral("channel"));
+            if (!channel.isUndefined()) {
+                const QString channelAt = at + QStringLiteral(".channel");
+                const QJsonObject c = objectAt(channel, channelAt);
+                setNumeric(morph->getValueChannel(), c, channelAt);
+                applyCommon(morph->getValueChannel(), c, channelAt);
+                loadLinks(morph->getValueChannel(), c, channelAt);
+            }
+        }
+    }
+
+    // Deltas from a deltas file ("deltas" names it), or as parallel arrays: "vertices"
+    // (ascending indices below "vertexCount", which is the vertex count of the node's geometry)
+    // and "deltas" (x, y, z per vertex).
+    SgMorphDeltas *loadDeltas(const QJsonObject &m, SgNode *node, const QString &at) const {
+        const SgVertexMesh *geometry = node->getObject()->getCurrentShape()->getGeometry();
+        const int meshCount = geometry ? geometry->getVertexCount() : 0;
+        const double count = optionalNumber(m, "vertexCount", meshCount, at);
+        if (count != meshCount) {
+            fail(at, QStringLiteral("\"vertexCount\" %1 does not match the geometry's %2 vertices")
+                         .arg(count)
+                         .arg(meshCount));
+        }
+        const QJsonValue vertices = m.value(QStringLiteral("vertices"));
+        const QJsonValue deltas = m.value(QStringLiteral("deltas"));
+        if (deltas.isString()) {
+            QString error;
+            SgMorphDeltas *read = SgMorphDeltaFile::read(
+                QDir::cleanPath(resolvePath(deltas.toString())), meshCount, error);
+            if (!read) {
+                fail(at, error);
+            }
+            return read;
+        }
+        if (!vertices.isArray() || !deltas.isArray() ||
+            deltas.toArray().size() != 3 * vertices.toArray().size()) {
+            fail(at, QStringLiteral("\"vertices\" and \"deltas\" must be arrays of n indices "
+                                    "and 3 n numbers"));
+        }
+        auto result = std::make_unique<SgMorphDeltas>();
+        result->setVertCount(meshCount);
+        const QJsonArray v = vertices.toArray();
+        const QJsonArray d = deltas.toArray();
+        result->reserve(int(v.size()));
+        int last = -1;
+        for (qsizetype i = 0; i < v.size(); ++i) {
+            const double index = v.at(i).toDouble(-1);
+            if (!v.at(i).isDouble() || index != double(int(index)) || index <= last ||
+                index >= meshCount) {
+                fail(at, QStringLiteral("\"vertices\"[%1] must be a vertex index above the one "
+                                        "before it and below %2")
+                             .arg(i)
+                             .arg(meshCount));
+            }
+            last = int(index);
+            const QJsonValue x = d.at(3 * i), y = d.at(3 * i + 1), z = d.at(3 * i + 2);
+            if (!x.isDouble() || !y.isDouble() || !z.isDouble()) {
+                fail(at, QStringLiteral("\"deltas\" must hold numbers only"));
+            }
+            result->addDelta(
+                last, SgVec3(float(x.toDouble()), float(y.toDouble()), float(z.toDouble())), false);
+        }
+        return result.release();
     }
 
     QString m_baseDir;
     SgScene *m_scene;
     std::vector<SgNode *> m_created;
     std::vector<std::function<void()>> m_deferred;
+    // Links made by the deferred steps, attached to their channels once every step passed.
+    std::vector<std::pair<SgNumericProperty *, SgERCLink *>> m_links;
     std::map<QString, std::unique_ptr<SgObjReader>> m_readers;
 };
 
@@ -600,6 +757,17 @@ bool SgSceneFile::loadFromData(const QByteArray &json, const QString &baseDir, S
         m_added = loader.load(doc.object());
     } catch (const LoadError &e) {
         m_error = sourceName + QStringLiteral(": ") + e.text;
+        return false;
+    }
+    return true;
+}
+
+bool SgSceneFile::save(const QString &path, const SgScene *scene) {
+    SgSceneFileWriter writer;
+    m_added = 0;
+    m_error.clear();
+    if (!writer.save(scene, path)) {
+        m_error = writer.getErrorString();
         return false;
     }
     return true;

@@ -4,21 +4,38 @@
 
 #include "app/sgappwindow.h"
 #include "app/sglogpane.h"
+#include "app/sgmeshview.h"
 #include "app/sgpluginhost.h"
+#include "app/sgpreferencesdlg.h"
 #include "app/sgpropertypanel.h"
 #include "app/sgscenetree.h"
 
 #include "sgcore/app/sgapp.h"
+#include "sgcore/app/sgappsettings.h"
 #include "sgcore/app/sgmessagesink.h"
+#include "sgcore/geometry/sgobject.h"
+#include "sgcore/geometry/sgshape.h"
+#include "sgcore/geometry/sgvertexmesh.h"
+#include "sgcore/io/sgscenefile.h"
+#include "sgcore/morph/sgerclink.h"
+#include "sgcore/morph/sgmorph.h"
+#include "sgcore/morph/sgmorphdeltas.h"
 #include "sgcore/plugin/sgaction.h"
 #include "sgcore/properties/sgfloatproperty.h"
+#include "sgcore/scene/sgbone.h"
 #include "sgcore/scene/sgscene.h"
 #include "sgcore/scene/sgskeleton.h"
+#include "tests/support/sgtestmain.h"
+#include "tests/ui/uitesthelpers.h"
 
 #include <QApplication>
+#include <QCheckBox>
 #include <QDialog>
 #include <QDir>
 #include <QDoubleSpinBox>
+#include <QFile>
+#include <QFileDialog>
+#include <QLineEdit>
 #include <QMenu>
 #include <QMenuBar>
 #include <QPushButton>
@@ -34,6 +51,44 @@ QMenu *submenu(const QList<QAction *> &actions, const QString &title) {
         if (action->menu() && action->text() == title)
             return action->menu();
     return nullptr;
+}
+
+// Answers the next file dialog with `path` (or cancels it when empty).
+void answerFileDialog(const QString &path) {
+    uitest::onNextModal([path](QWidget *modal) {
+        auto *dialog = qobject_cast<QFileDialog *>(modal);
+        ASSERT_NE(dialog, nullptr) << modal->metaObject()->className();
+        if (path.isEmpty()) {
+            dialog->reject();
+            return;
+        }
+        dialog->selectFile(path);
+        QMetaObject::invokeMethod(dialog, "accept");
+    });
+}
+
+QAction *actionNamed(const SgAppWindow &window, const char *name) {
+    return window.findChild<QAction *>(QLatin1String(name));
+}
+
+// A morph of the figure's first bone driven by a control property "Grow" on the figure, as the
+// bridge makes them.
+SgFloatProperty *addMorph(SgSkeleton *figure) {
+    auto *control = new SgFloatProperty(QStringLiteral("Grow"));
+    control->setPath(QStringLiteral("Morphs"));
+    control->setMin(-1);
+    control->setMax(1);
+    control->setIsClamped(true);
+    figure->addProperty(control);
+    SgBone *bone = figure->getAllBones().front();
+    auto *deltas = new SgMorphDeltas;
+    deltas->setVertCount(bone->getObject()->getCurrentShape()->getGeometry()->getVertexCount());
+    deltas->addDelta(0, SgVec3(0, 50, 0), true);
+    auto *morph = new SgMorph(QStringLiteral("Grow"), deltas);
+    morph->getValueChannel()->insertController(new SgERCLink(SgERCLink::DeltaAdd, control, 1, 0));
+    bone->getObject()->addModifier(morph);
+    figure->getScene()->update();
+    return control;
 }
 
 } // namespace
@@ -142,4 +197,194 @@ TEST(AppWindow, ToolsMenuOpensTheTargetImporterInFileMode) {
     EXPECT_EQ(title, QStringLiteral("Target Importer"));
     EXPECT_TRUE(fileMode);
     scene->clear();
+}
+
+TEST(AppWindow, SavesReopensAndNeverLosesChangesSilently) {
+    SgAppWindow window;
+    window.show();
+    SgScene *scene = sgApp->getScene();
+    ASSERT_TRUE(window.openScene(QStringLiteral(SG_EXAMPLES_DIR "/demo/scene.json"), true));
+    EXPECT_FALSE(window.isSceneModified());
+    EXPECT_EQ(window.windowTitle(), QStringLiteral("Scenara - scene.json"));
+    auto *figure = static_cast<SgSkeleton *>(scene->findNodeByLabel(QStringLiteral("Blobby")));
+    SgFloatProperty *grow = addMorph(figure);
+    EXPECT_TRUE(window.isSceneModified());
+    EXPECT_EQ(window.windowTitle(), QStringLiteral("Scenara - scene.json*"));
+
+    // The view keeps its framing while the morph moves; "Frame Selection" reframes.
+    SgMeshView *view = window.meshView();
+    view->frameAll();
+    const SgBox3 framed = view->framedBox();
+    scene->selectNode(figure);
+    window.propertyPanel()->setValue(grow, 1.0);
+    QApplication::processEvents();
+    EXPECT_EQ(view->framedBox().max, framed.max);
+    actionNamed(window, "SgFrameSelectionAction")->trigger();
+    EXPECT_GT(view->framedBox().max.y, framed.max.y); // the grown figure alone
+
+    // Closing asks; "Cancel" keeps the window and the changes.
+    QString question;
+    uitest::answerMessageBox(&question, QStringLiteral("Cancel"));
+    EXPECT_FALSE(window.close());
+    EXPECT_TRUE(question.contains(QStringLiteral("scene.json has unsaved changes")));
+    EXPECT_TRUE(window.isVisible());
+
+    // "Save Scene As..." writes the scene and its geometry and makes it the current file.
+    const QString saved = sgTestPath(QStringLiteral("session/work.json"));
+    QDir().mkpath(sgTestPath(QStringLiteral("session")));
+    answerFileDialog(saved);
+    actionNamed(window, "SgSaveSceneAsAction")->trigger();
+    EXPECT_TRUE(QFile::exists(saved));
+    EXPECT_TRUE(QFile::exists(sgTestPath(QStringLiteral("session/work-geometry/Blobby-hip.obj"))));
+    EXPECT_FALSE(window.isSceneModified());
+    EXPECT_EQ(window.windowTitle(), QStringLiteral("Scenara - work.json"));
+
+    // Opening another scene with changes asks first; "Discard" goes on to the file dialog.
+    window.propertyPanel()->setValue(grow, 0.25);
+    uitest::answerMessageBox(nullptr, QStringLiteral("Discard"));
+    answerFileDialog(QString());
+    actionNamed(window, "SgOpenSceneAction")->trigger();
+    QApplication::processEvents();
+    EXPECT_EQ(scene->findNodeByLabel(QStringLiteral("Blobby")), figure) << "cancelled: kept";
+
+    // The saved file reopens with the morph at its saved control value.
+    ASSERT_TRUE(window.openScene(saved, true));
+    figure = static_cast<SgSkeleton *>(scene->findNodeByLabel(QStringLiteral("Blobby")));
+    auto *reopened = static_cast<SgFloatProperty *>(figure->findProperty(QStringLiteral("Grow")));
+    ASSERT_NE(reopened, nullptr);
+    EXPECT_EQ(reopened->getValue(), 1.0f);
+    SgObject *hip = figure->getAllBones().front()->getObject();
+    EXPECT_EQ(hip->getCachedGeom()->getVertex(0).y,
+              hip->getCurrentShape()->getGeometry()->getVertex(0).y + 50.0f);
+
+    // Export writes the MTL beside the OBJ.
+    scene->selectNode(scene->findNodeByLabel(QStringLiteral("Box")));
+    ASSERT_TRUE(window.exportSelection(sgTestPath(QStringLiteral("session/box.obj")), true));
+    QFile mtl(sgTestPath(QStringLiteral("session/box.mtl")));
+    ASSERT_TRUE(mtl.open(QIODevice::ReadOnly));
+    EXPECT_TRUE(mtl.readAll().contains("newmtl "));
+
+    // Changed again, closing with "Save" saves to the current file and closes.
+    window.propertyPanel()->setValue(reopened, -0.5);
+    uitest::answerMessageBox(nullptr, QStringLiteral("Save"));
+    EXPECT_TRUE(window.close());
+    SgScene check;
+    SgSceneFile file;
+    ASSERT_TRUE(file.load(saved, &check));
+    EXPECT_EQ(
+        static_cast<SgFloatProperty *>(
+            check.findNodeByLabel(QStringLiteral("Blobby"))->findProperty(QStringLiteral("Grow")))
+            ->getValue(),
+        -0.5f);
+    scene->clear();
+}
+
+TEST(AppWindow, PreferencesHoldTheModelerPathAndTheImportRoad) {
+    SgAppWindow window;
+    uitest::onNextModal([](QWidget *modal) {
+        auto *dialog = qobject_cast<SgPreferencesDlg *>(modal);
+        ASSERT_NE(dialog, nullptr);
+        EXPECT_EQ(dialog->windowTitle(), QStringLiteral("Preferences"));
+        dialog->installPathEdit()->setText(QStringLiteral("/opt/facetor"));
+        dialog->bridgeToolsBox()->setChecked(true);
+        dialog->accept();
+    });
+    actionNamed(window, "SgPreferencesAction")->trigger();
+    SgAppSettings settings;
+    EXPECT_EQ(settings.getString(QStringLiteral("FacetorInstallPath")),
+              QStringLiteral("/opt/facetor"));
+    EXPECT_EQ(settings.getInt(QStringLiteral("FacetorBridgeTools")), 1);
+    // Shown again as stored; "Cancel" keeps them.
+    SgPreferencesDlg again(&window);
+    EXPECT_EQ(again.installPathEdit()->text(), QStringLiteral("/opt/facetor"));
+    EXPECT_TRUE(again.bridgeToolsBox()->isChecked());
+    again.bridgeToolsBox()->setChecked(false);
+    again.reject();
+    EXPECT_EQ(settings.getInt(QStringLiteral("FacetorBridgeTools")), 1);
+    settings.remove(QStringLiteral("FacetorBridgeTools"));
+    settings.remove(QStringLiteral("FacetorInstallPath"));
+}
+
+// The picture of the window at its default size after a round trip: the figure with its morph
+// at 1 and its control property in the panel, and a returned prop over the figure.
+TEST(AppWindow, PictureAtTheDefaultSize) {
+    sgApp->getMessageSink()->clear();
+    SgPluginHost plugins;
+    ASSERT_EQ(plugins.loadFolder(QStringLiteral(FACBRIDGE_PLUGIN_DIR)), 1);
+    SgAppWindow window;
+    window.addPluginAction(plugins.actions().first());
+    window.show();
+    QApplication::processEvents();
+    EXPECT_EQ(window.size(), QSize(1180, 680));
+    SgScene *scene = sgApp->getScene();
+    ASSERT_TRUE(window.openScene(QStringLiteral(SG_EXAMPLES_DIR "/demo/scene.json"), true));
+    auto *figure = static_cast<SgSkeleton *>(scene->findNodeByLabel(QStringLiteral("Blobby")));
+    auto *control = new SgFloatProperty(QStringLiteral("MyMorph"));
+    control->setPath(QStringLiteral("Morphs"));
+    control->setMin(-1);
+    control->setMax(1);
+    control->setIsClamped(true);
+    control->setValue(1);
+    figure->addProperty(control);
+    for (SgBone *bone : figure->getAllBones()) {
+        const SgVertexMesh *base = bone->getObject()->getCurrentShape()->getGeometry();
+        auto *deltas = new SgMorphDeltas;
+        deltas->setVertCount(base->getVertexCount());
+        for (int v = 0; v < base->getVertexCount(); ++v)
+            deltas->addDelta(v, SgVec3(base->getVertex(v).x * 0.25f, 0, 0), false);
+        auto *morph = new SgMorph(QStringLiteral("MyMorph"), deltas);
+        morph->setLabel(QStringLiteral("p_MyMorph"));
+        morph->getValueChannel()->insertController(
+            new SgERCLink(SgERCLink::DeltaAdd, control, 1, 0));
+        bone->getObject()->addModifier(morph);
+    }
+    SgNode *box = scene->findNodeByLabel(QStringLiteral("Box"));
+    SgVertexMesh *boxMesh = box->getObject()->getCurrentShape()->getGeometry();
+    const SgVec3 centre = boxMesh->getBoundingBox().getCenter();
+    for (SgVec3 &p : boxMesh->vertices())
+        p = (p - centre) * 2.5f + SgVec3(1, 9, 0);
+    box->setLabel(QStringLiteral("Blobby (1)"));
+    scene->selectNode(figure);
+    scene->update();
+    window.meshView()->frameAll();
+    QApplication::processEvents();
+
+    const QString artifacts = qEnvironmentVariable("SG_TEST_ARTIFACTS", QDir::tempPath());
+    QDir().mkpath(artifacts);
+    const QString shot = QDir(artifacts).filePath(QStringLiteral("scenara-main-window.png"));
+    EXPECT_TRUE(window.grab().save(shot)) << shot.toStdString();
+    scene->clear();
+}
+
+TEST(AppWindow, DeleteRemovesSelectedPropsAndFiguresButNoLoneBone) {
+    SgAppWindow window;
+    SgScene *scene = sgApp->getScene();
+    ASSERT_TRUE(window.openScene(QStringLiteral(SG_EXAMPLES_DIR "/demo/scene.json"), true));
+    const int nodes = scene->getNodeCount();
+    SgNode *box = scene->findNodeByLabel(QStringLiteral("Box"));
+    SgNode *hip = scene->findNodeByLabel(QStringLiteral("hip"));
+    scene->selectNode(hip);
+    EXPECT_EQ(window.deleteSelection(false), 0);
+    EXPECT_EQ(scene->getNodeCount(), nodes);
+
+    // The prop goes after the question; the bone selected with it stays.
+    scene->selectNode(box, true);
+    ASSERT_EQ(window.propertyPanel()->node(), box);
+    QString question;
+    uitest::answerMessageBox(&question, QStringLiteral("&Yes"));
+    QAction *remove = actionNamed(window, "SgDeleteAction");
+    ASSERT_NE(remove, nullptr);
+    remove->trigger();
+    EXPECT_EQ(question, QStringLiteral("Delete Box?"));
+    EXPECT_EQ(scene->findNodeByLabel(QStringLiteral("Box")), nullptr);
+    EXPECT_EQ(window.sceneTree()->itemOf(box), nullptr);
+    EXPECT_EQ(window.propertyPanel()->node(), hip); // the primary selection now
+    EXPECT_EQ(scene->getNodeCount(), nodes - 1);
+    EXPECT_TRUE(window.isSceneModified());
+
+    // A figure goes with its bones.
+    scene->selectNode(scene->findNodeByLabel(QStringLiteral("Blobby")));
+    scene->selectNode(hip, true);
+    EXPECT_EQ(window.deleteSelection(false), 1);
+    EXPECT_EQ(scene->getNodeCount(), 0);
 }

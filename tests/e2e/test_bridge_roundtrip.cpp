@@ -5,7 +5,7 @@
 #include "bridgetestsupport.h"
 
 #include "exchange/shm/sgcontrolrecord.h"
-#include "facetor/sgfacetorworkspace.h"
+#include "facetor/sgfacetorobjfile.h"
 #include "sgcore/app/sgmessagesink.h"
 #include "sgcore/scene/sgbone.h"
 #include "sgcore/scene/sgskeleton.h"
@@ -151,7 +151,7 @@ TEST_F(BridgeRoundTrip, SelectedNodesArriveInOrderAndBothSidesCleanUp) {
     QString error;
     for (const char *label : {"Cup", "Plate"}) {
         SgExchangeNode copy;
-        ASSERT_TRUE(SgFacetorWorkspace::readObj(
+        ASSERT_TRUE(SgFacetorObjFile::read(
             QDir(run.workspace()).filePath(QString::fromLatin1(label) + ".obj"), QString(), copy,
             error))
             << error.toStdString();
@@ -160,8 +160,8 @@ TEST_F(BridgeRoundTrip, SelectedNodesArriveInOrderAndBothSidesCleanUp) {
         EXPECT_EQ(copy.facets.size(), 1u);
     }
     SgExchangeNode figure;
-    ASSERT_TRUE(SgFacetorWorkspace::readObj(QDir(run.workspace()).filePath("Body.obj"), QString(),
-                                            figure, error));
+    ASSERT_TRUE(SgFacetorObjFile::read(QDir(run.workspace()).filePath("Body.obj"), QString(),
+                                       figure, error));
     std::vector<Point> bones = scenePoints(scene->findNodeByLabel("hip"));
     const std::vector<Point> thigh = scenePoints(scene->findNodeByLabel("thigh"));
     bones.insert(bones.end(), thigh.begin(), thigh.end());

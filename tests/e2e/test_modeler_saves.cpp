@@ -1,0 +1,311 @@
+// The reference modeler watching its workspace while an editor saves: every way of saving gives
+// the host exactly one return of the complete file; a file still incomplete when it settles is
+// reported and not sent. The modeler is set up through its settings file. A return that the
+// host asks the modeler to release (code 4) comes again instead of being lost.
+
+#include "bridge/sgfacbridge.h"
+#include "bridgetestsupport.h"
+
+#include "exchange/sgexchangereader.h"
+#include "exchange/shm/sgcontrolrecord.h"
+#include "exchange/shm/sgsharedmemory.h"
+#include "sgcore/app/sgmessagesink.h"
+#include "sgcore/geometry/sgpolyshape.h"
+#include "sgcore/morph/sgmorph.h"
+#include "sgcore/morph/sgmorphdeltas.h"
+
+#include <QDir>
+#include <QFile>
+#include <QProcess>
+#include <QTemporaryDir>
+#include <QThread>
+
+#include <gtest/gtest.h>
+
+#include <cstring>
+#include <memory>
+
+namespace {
+
+constexpr int kSettleMs = 300;
+
+class TestBridge : public SgFacBridge {
+public:
+    using SgFacBridge::closing;
+    using SgFacBridge::executeAction;
+};
+
+// A prop whose OBJ copy is long enough to be written in several chunks: a grid of quads.
+SgNode *makeGridProp(const QString &name, int side) {
+    auto *mesh = new SgPolyMesh;
+    mesh->beginEdit(true);
+    SgVec3 *v = mesh->setVertexArray(side * side);
+    for (int y = 0; y < side; ++y)
+        for (int x = 0; x < side; ++x)
+            v[y * side + x] = SgVec3(float(x), float(y), 0.5f);
+    mesh->activateMaterial(0);
+    for (int y = 0; y + 1 < side; ++y)
+        for (int x = 0; x + 1 < side; ++x) {
+            mesh->startFace();
+            for (int corner :
+                 {y * side + x, y * side + x + 1, (y + 1) * side + x + 1, (y + 1) * side + x})
+                mesh->addFaceEdge(corner);
+            mesh->finishFace();
+        }
+    mesh->finishEdit();
+    auto *object = new SgObject(name);
+    object->addShape(bridgetest::makeShape(name, mesh));
+    auto *node = new SgNode(name);
+    node->setObject(object);
+    return node;
+}
+
+QByteArray readAll(const QString &path) {
+    QFile file(path);
+    return file.open(QIODevice::ReadOnly) ? file.readAll() : QByteArray();
+}
+
+// The text with the first vertex line moved by `dx` along x (the modeler's units).
+QByteArray withFirstVertexMoved(const QByteArray &obj, float dx) {
+    const qsizetype start = obj.indexOf("\nv ") + 1;
+    const qsizetype end = obj.indexOf('\n', start);
+    QList<QByteArray> parts = obj.mid(start, end - start).split(' ');
+    parts[1] = QByteArray::number(parts[1].toDouble() + dx, 'g', 9);
+    return obj.left(start) + parts.join(' ') + obj.mid(end);
+}
+
+int morphsMade() {
+    return int(sgApp->getMessageSink()->logLines().filter(QStringLiteral("Created morph")).size());
+}
+
+// Everything the modeler needs, in its settings file under a private configuration folder;
+// nothing through its environment but that folder.
+class SettingsRun {
+public:
+    explicit SettingsRun(const QString &extra = QString()) {
+        QDir(m_dir.path()).mkpath(QStringLiteral("config/Facetor"));
+        QFile ini(m_dir.filePath(QStringLiteral("config/Facetor/Facetor.ini")));
+        ini.open(QIODevice::WriteOnly);
+        ini.write(QStringLiteral("[General]\nworkspace=%1\nwatch=true\nsettleTime=%2\n"
+                                 "log=%3\nhostTimeout=10000\n%4")
+                      .arg(workspace())
+                      .arg(kSettleMs)
+                      .arg(logPath(), extra)
+                      .toUtf8());
+        qputenv("XDG_CONFIG_HOME", m_dir.filePath(QStringLiteral("config")).toUtf8());
+        qputenv("FACETOR_INSTALL_PATH", FACETOR_BIN_DIR);
+    }
+    ~SettingsRun() {
+        qunsetenv("XDG_CONFIG_HOME");
+        qunsetenv("FACETOR_INSTALL_PATH");
+    }
+    QString workspace() const { return m_dir.filePath(QStringLiteral("workspace")); }
+    QString logPath() const { return m_dir.filePath(QStringLiteral("facetor.log")); }
+    QString log() const { return QString::fromUtf8(readAll(logPath())); }
+
+private:
+    QTemporaryDir m_dir;
+};
+
+class ModelerSaves : public ::testing::Test {
+protected:
+    void SetUp() override {
+        bridgetest::app();
+        sgApp->getScene()->clear();
+        sgApp->getMessageSink()->clear();
+    }
+    void TearDown() override { sgApp->getScene()->clear(); }
+};
+
+} // namespace
+
+TEST_F(ModelerSaves, EverySaveStyleGivesExactlyOneCompleteReturn) {
+    SgScene *scene = sgApp->getScene();
+    scene->addNode(makeGridProp(QStringLiteral("Grid"), 20));
+    scene->selectNode(scene->findNodeByLabel(QStringLiteral("Grid")));
+    SettingsRun run;
+    TestBridge bridge;
+    bridge.executeAction();
+    const QString obj = QDir(run.workspace()).filePath(QStringLiteral("Grid.obj"));
+    ASSERT_TRUE(bridgetest::waitUntil([&] { return QFile::exists(obj); }, 20000))
+        << run.log().toStdString();
+    ASSERT_TRUE(bridgetest::waitUntil(
+        [&] { return run.log().contains(QStringLiteral("selection arrived")); }, 10000));
+    const QByteArray original = readAll(obj);
+    ASSERT_GT(original.size(), 6000);
+
+    // Each style moves the first vertex one step further; the host makes one morph per return,
+    // whose one delta is that step (ten host units per modeler unit).
+    auto expectOneReturn = [&](const char *style, float step, auto save) {
+        const int before = morphsMade();
+        save(withFirstVertexMoved(original, step));
+        EXPECT_TRUE(bridgetest::waitUntil([&] { return morphsMade() > before; }, 10000))
+            << style << "\n"
+            << run.log().toStdString();
+        bridgetest::waitUntil([] { return false; }, 3 * kSettleMs); // a second would come now
+        EXPECT_EQ(morphsMade(), before + 1) << style << "\n" << run.log().toStdString();
+        SgObject *object = scene->findNodeByLabel(QStringLiteral("Grid"))->getObject();
+        auto *morph = dynamic_cast<SgMorph *>(object->findModifier(QStringLiteral("MyMorph")));
+        ASSERT_NE(morph, nullptr) << style;
+        ASSERT_EQ(morph->getDeltas()->getNumEntries(), 1) << style;
+        EXPECT_EQ(morph->getDeltas()->getVertex(0), 0) << style;
+        EXPECT_NEAR(morph->getDeltas()->getDelta(0).x, 10 * step, 1e-3f) << style;
+        object->removeModifier(morph); // the next return makes "MyMorph" anew
+    };
+    expectOneReturn("in place, one write", 1.0f, [&](const QByteArray &text) {
+        QFile file(obj);
+        ASSERT_TRUE(file.open(QIODevice::WriteOnly | QIODevice::Truncate));
+        file.write(text);
+    });
+    expectOneReturn("in place, chunks with pauses", 2.0f, [&](const QByteArray &text) {
+        QFile file(obj);
+        ASSERT_TRUE(file.open(QIODevice::WriteOnly | QIODevice::Truncate));
+        const qsizetype third = text.size() / 3 + 7; // cut inside a line
+        for (qsizetype at = 0; at < text.size(); at += third) {
+            file.write(text.mid(at, third));
+            file.flush();
+            bridgetest::waitUntil([] { return false; }, kSettleMs / 3);
+        }
+    });
+    expectOneReturn("temporary file renamed over", 3.0f, [&](const QByteArray &text) {
+        const QString temporary = obj + QStringLiteral(".part");
+        QFile file(temporary);
+        ASSERT_TRUE(file.open(QIODevice::WriteOnly));
+        file.write(text);
+        file.close();
+        ASSERT_EQ(std::rename(qPrintable(temporary), qPrintable(obj)), 0);
+    });
+
+    // A file that stops changing half written is reported, not sent; finished, it is sent once.
+    const int before = morphsMade();
+    const QByteArray text = withFirstVertexMoved(original, 4.0f);
+    {
+        QFile file(obj);
+        ASSERT_TRUE(file.open(QIODevice::WriteOnly | QIODevice::Truncate));
+        file.write(text.left(text.indexOf("\nf ") + 4)); // "f 1" ends the write
+    }
+    EXPECT_TRUE(bridgetest::waitUntil(
+        [&] { return run.log().contains(QStringLiteral("not returned")); }, 5000))
+        << run.log().toStdString();
+    EXPECT_EQ(morphsMade(), before);
+    expectOneReturn("finished after a stall", 4.0f, [&](const QByteArray &finished) {
+        QFile file(obj);
+        ASSERT_TRUE(file.open(QIODevice::WriteOnly | QIODevice::Truncate));
+        file.write(finished);
+    });
+    bridge.closing();
+    ASSERT_TRUE(bridgetest::waitUntil([&] { return !bridge.isActive(); }, 10000));
+}
+
+TEST_F(ModelerSaves, TheSettingsFileSetsUpALaunchedModelerAndTheEnvironmentOverridesIt) {
+    SgScene *scene = sgApp->getScene();
+    scene->addNode(bridgetest::makeProp(QStringLiteral("Cup"), {10, 20, 30}));
+    scene->selectNode(scene->findNodeByLabel(QStringLiteral("Cup")));
+    SettingsRun run(QStringLiteral("edit=move=1,0,0\nwatch=false\n"));
+    QTemporaryDir other;
+    qputenv("FACETOR_WORKSPACE", other.path().toUtf8());
+    qputenv("FACETOR_QUIT_WHEN_DONE", "1");
+    qputenv("FACETOR_EXPECT", "1");
+    {
+        TestBridge bridge;
+        bridge.executeAction();
+        EXPECT_TRUE(bridgetest::waitUntil([&] { return !bridge.isActive(); }, 20000))
+            << run.log().toStdString();
+    }
+    qunsetenv("FACETOR_WORKSPACE");
+    qunsetenv("FACETOR_QUIT_WHEN_DONE");
+    qunsetenv("FACETOR_EXPECT");
+    // The log file and the scripted edit came from the settings file, the workspace from the
+    // environment; the modeler says why it quit.
+    EXPECT_TRUE(QFile::exists(QDir(other.path()).filePath(QStringLiteral("Cup.obj"))));
+    EXPECT_FALSE(QFile::exists(run.workspace()));
+    EXPECT_EQ(morphsMade(), 1) << run.log().toStdString();
+    EXPECT_TRUE(run.log().contains(QStringLiteral("quit: done"))) << run.log().toStdString();
+}
+
+// The test plays the host by hand: it takes the modeler's return announcement (code 1) and
+// answers with code 4, as a host that needs the data segment for a node of its own does.
+TEST(ModelerRelease, AReturnReleasedInFlightComesAgain) {
+    QTemporaryDir dir;
+    const QString returned = dir.filePath(QStringLiteral("shape.obj"));
+    QFile shape(returned);
+    ASSERT_TRUE(shape.open(QIODevice::WriteOnly));
+    shape.write("o Shape\nv 0 0 0\nv 1 0 0\nv 0 1 0\nf 1 2 3\n");
+    shape.close();
+
+    SgSharedMemory control(kSgControlSegmentKey);
+    ASSERT_TRUE(control.create(sizeof(SgControlRecord)));
+    ASSERT_TRUE(control.attach(SgSharedMemory::kReadWrite));
+    const SgControlRecord fresh = SgControlRecord::fresh();
+    std::memcpy(control.data(), &fresh, sizeof fresh);
+    auto take = [&](int &code) {
+        if (!control.tryLock(25))
+            return false;
+        auto *record = reinterpret_cast<SgControlRecord *>(control.data());
+        const bool waiting = record->toHostFlag == 0;
+        if (waiting) {
+            code = record->toHostCode;
+            record->toHostFlag = 1;
+        }
+        control.unlock();
+        return waiting;
+    };
+    auto post = [&](int code) {
+        if (!control.tryLock(25))
+            return false;
+        auto *record = reinterpret_cast<SgControlRecord *>(control.data());
+        const bool free = record->toModelerFlag == 1;
+        if (free) {
+            record->toModelerCode = std::uint8_t(code);
+            record->toModelerFlag = 0;
+        }
+        control.unlock();
+        return free;
+    };
+
+    QProcess modeler;
+    modeler.setProgram(QStringLiteral(FACETOR_BIN_DIR "/Facetor"));
+    modeler.setArguments({QStringLiteral("-sgl"), QStringLiteral("--return"), returned,
+                          QStringLiteral("--workspace"), dir.filePath(QStringLiteral("ws")),
+                          QStringLiteral("--log"), dir.filePath(QStringLiteral("log"))});
+    modeler.start();
+    ASSERT_TRUE(modeler.waitForStarted());
+
+    // Idle notices until the return is announced (the selection is empty).
+    int announcements = 0;
+    int vertices = 0;
+    QElapsedTimer clock;
+    clock.start();
+    while (vertices == 0 && clock.elapsed() < 15000) {
+        int code = -1;
+        if (take(code) && code == SgModelerGeometryWritten) {
+            if (++announcements == 1) {
+                // The first announcement is answered by asking the modeler to let go.
+                while (!post(SgHostSegmentBusy))
+                    QThread::msleep(5);
+                continue;
+            }
+            SgSharedMemory data(kSgDataSegmentKey);
+            ASSERT_TRUE(data.attach(SgSharedMemory::kReadWrite));
+            data.lock();
+            QString trailer;
+            std::unique_ptr<SgPolyShape> read(
+                SgExchangeReader(data.data(), size_t(data.size())).readShape(trailer));
+            data.unlock();
+            data.detach();
+            ASSERT_NE(read, nullptr);
+            vertices = read->getGeometry()->getVertexCount();
+            while (!post(SgHostGeometryRead))
+                QThread::msleep(5);
+        }
+        post(SgHostIdle);
+        QThread::msleep(20);
+    }
+    EXPECT_EQ(announcements, 2) << readAll(dir.filePath(QStringLiteral("log"))).toStdString();
+    EXPECT_EQ(vertices, 3);
+    while (!post(SgHostShuttingDown))
+        QThread::msleep(5);
+    EXPECT_TRUE(modeler.waitForFinished(5000));
+    control.detach();
+    control.remove(SgSharedMemory::kRemoveUnlocked);
+}
