@@ -142,3 +142,7 @@ float SgDefaultMaterial::getBumpStrength() const {
     const SgFloatProperty *p = getBumpControl();
     return p ? p->getValue() : 0.0f;
 }
+SgTexture *SgDefaultMaterial::getBumpMap() const {
+    const SgFloatProperty *p = getBumpControl();
+    return p ? p->getMapValue() : nullptr;
+}

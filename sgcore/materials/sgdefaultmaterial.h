@@ -34,6 +34,8 @@ public:
     float getOpacityStrength() const;
     void setBumpStrength(float value);
     float getBumpStrength() const;
+    // The image "Bump Strength" is mapped to, or null.
+    SgTexture *getBumpMap() const;
 
     // The five properties (null only if a caller removed them).
     SgColorProperty *getDiffuseColorProperty() const;
