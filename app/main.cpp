@@ -54,6 +54,9 @@ int runWindow(const SgCommandLine &line, SgPluginHost &plugins) {
 }
 
 int runScript(const SgCommandLine &line, SgPluginHost &plugins) {
+    // The script's end ends the run: a modal box closing (the only windows of a headless run)
+    // must not quit the event loop under a script that is still waiting.
+    QApplication::setQuitOnLastWindowClosed(false);
     SgScriptHost host(&plugins, line.scriptArguments);
     if (!line.sceneFile.isEmpty()) {
         // A scene named on the command line is open before the script starts.

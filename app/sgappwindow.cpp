@@ -173,19 +173,21 @@ void SgAppWindow::addPluginAction(SgAction *action) {
 }
 
 bool SgAppWindow::openScene(const QString &path, bool quiet) {
-    SgScene *scene = sgApp->getScene();
-    m_panel->showNode(nullptr);
-    m_panelNode = nullptr;
-    scene->clear();
-    m_scenePath.clear();
+    // The file is read into a scratch scene first: one that does not load leaves the user's
+    // scene as it was.
+    SgScene loaded;
     SgSceneFile file;
-    if (!file.load(path, scene)) {
+    if (!file.load(path, &loaded)) {
         sgApp->log(QStringLiteral("Could not open the scene: %1").arg(file.getErrorString()));
-        setModified(false);
         if (!quiet)
             QMessageBox::warning(this, tr("Open Scene"), file.getErrorString(), QMessageBox::Ok);
         return false;
     }
+    SgScene *scene = sgApp->getScene();
+    m_panel->showNode(nullptr);
+    m_panelNode = nullptr;
+    scene->clear();
+    scene->takeNodesFrom(loaded);
     sgApp->log(QStringLiteral("Opened %1 (%2 nodes).")
                    .arg(QFileInfo(path).fileName())
                    .arg(file.getAddedNodeCount()));

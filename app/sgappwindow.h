@@ -40,7 +40,8 @@ public:
     void addPluginAction(SgAction *action);
 
     // Loads a scene file into the scene (replacing it); false with a warning box and a log line
-    // when the file cannot be loaded. With `quiet` no box is shown.
+    // when the file cannot be loaded, the scene then left as it was. With `quiet` no box is
+    // shown.
     bool openScene(const QString &path, bool quiet = false);
     // Saves the scene to `path` (the current scene file when empty) and makes it the current
     // scene file; false with a log line (and a warning box unless `quiet`) when it fails.

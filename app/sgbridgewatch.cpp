@@ -2,11 +2,16 @@
 
 #include "app/sgscriptrunner.h"
 
+#include <QApplication>
+
 SgBridgeWatch::SgBridgeWatch(SgScriptRunner *runner, QObject *bridge, int timeoutMs,
                              QJSValue resolve, QJSValue callback, QObject *parent)
     : QObject(parent), m_runner(runner), m_bridge(bridge), m_resolve(std::move(resolve)),
       m_callback(std::move(callback)), m_timeoutMs(timeoutMs) {
     m_runner->beginWait();
+    if (bridge != nullptr && bridge->metaObject()->indexOfSignal("returnHandled(QString)") >= 0)
+        m_hearsOutcome =
+            connect(bridge, SIGNAL(returnHandled(QString)), this, SLOT(returnHandled(QString)));
     m_clock.start();
     m_ticker.setInterval(10);
     connect(&m_ticker, &QTimer::timeout, this, &SgBridgeWatch::check);
@@ -14,8 +19,13 @@ SgBridgeWatch::SgBridgeWatch(SgScriptRunner *runner, QObject *bridge, int timeou
 }
 
 void SgBridgeWatch::sceneChanged() {
-    if (!m_done)
+    if (!m_done && !m_hearsOutcome)
         finish(QStringLiteral("imported"));
+}
+
+void SgBridgeWatch::returnHandled(const QString &outcome) {
+    if (!m_done)
+        finish(outcome);
 }
 
 void SgBridgeWatch::check() {
@@ -23,7 +33,8 @@ void SgBridgeWatch::check() {
         return;
     const QTimer *poll =
         m_bridge ? m_bridge->findChild<QTimer *>(QString(), Qt::FindDirectChildrenOnly) : nullptr;
-    if (poll == nullptr || !poll->isActive())
+    // A return's dialog may still be open after the link has ended: its outcome comes first.
+    if (poll == nullptr || (!poll->isActive() && QApplication::activeModalWidget() == nullptr))
         finish(QStringLiteral("quit"));
     else if (m_timeoutMs >= 0 && m_clock.elapsed() > m_timeoutMs)
         finish(QStringLiteral("timeout"));

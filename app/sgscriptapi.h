@@ -32,9 +32,10 @@ public:
     Q_INVOKABLE QObject *action(const QString &name) const;
     // The texts of every plug-in action.
     Q_INVOKABLE QStringList actionNames() const;
-    // Waits for a bridge action until the modeler's geometry has been imported, the modeler
-    // has quit, or `timeoutMs` passed (negative: no limit). Returns a promise of the outcome
-    // ("imported", "quit" or "timeout"); `callback`, when given, is called with it as well, and
+    // Waits for a bridge action until the modeler's geometry has been dealt with, the link has
+    // ended, or `timeoutMs` passed (negative: no limit). Returns a promise of the outcome
+    // ("imported", "declined" (the user kept the scene as it was), "refused" (the return was
+    // unusable), "quit" or "timeout"); `callback`, when given, is called with it as well, and
     // an exception it throws fails the script. The event loop runs while waiting. A bridge
     // made by the script is adopted by the host (destroyed when the run ends).
     Q_INVOKABLE QJSValue waitForBridge(QObject *bridge, int timeoutMs = 60000,

@@ -144,15 +144,23 @@ QString plainReport(const SgMorphLoadLog &log) {
 bool SgFacBridge::importReturnedShape(SgPolyShape *shape, SgNode *node) {
     if (node == nullptr || shape == nullptr)
         return false;
+    const QString name = shape->getName();
     SgMorphLoader loader;
     SgMorphLoadLog log;
     loader.setOverride(0);
     loader.setApplyAfterJoint(false);
     const int tools = SgAppSettings().getInt(QStringLiteral("FacetorBridgeTools"), 0);
-    // Every road that keeps the shape ends by telling the scene's views (and a script waiting
-    // for the import) that the import is over.
-    auto dealtWith = [] {
-        sgApp->getScene()->update();
+    // The node left the scene while a dialog was open: nothing of the return is kept.
+    auto nodeGone = [&] {
+        report(QStringLiteral("%1 left the scene; the geometry returned by Facetor was not "
+                              "imported.")
+                   .arg(name));
+        m_importOutcome = QStringLiteral("refused");
+        return true;
+    };
+    auto declined = [&] {
+        report(QStringLiteral("Did not import %1 from Facetor.").arg(name));
+        m_importOutcome = QStringLiteral("declined");
         return true;
     };
 
@@ -163,24 +171,28 @@ bool SgFacBridge::importReturnedShape(SgPolyShape *shape, SgNode *node) {
     } else if (tools != 0) {
         // The dialog makes the morph on this road; the bridge makes none of its own.
         importThroughMorphLoader(shape, node);
-        return dealtWith();
+        return true;
     } else {
         SgBridgeMorphDlg dialog(node->getLabel(), window, node);
-        if (dialog.exec() != QDialog::Accepted)
-            return dealtWith();
+        int result = QDialog::Rejected;
+        if (!runImportDialog(dialog, result))
+            return nodeGone();
+        if (result != QDialog::Accepted)
+            return declined();
         loader.setMorphGroup(dialog.getGroupPath());
         loader.setMorphName(dialog.getMorphName());
         loader.setOverride(dialog.getOverride() ? 1 : 0);
         const QString action = dialog.getActionText();
         if (action.contains(QLatin1String("Material"))) {
             copyMaterials(shape, node);
+            report(QStringLiteral("Copied the materials of %1 from Facetor.").arg(name));
             if (!action.contains(QLatin1String("Morph")))
-                return dealtWith();
+                return true;
         } else if (action.contains(QLatin1String("Prop"))) {
             createPropFromShape(shape);
             return true;
         } else if (!action.contains(QLatin1String("Morph"))) {
-            return dealtWith();
+            return declined();
         }
     }
 
@@ -202,28 +214,50 @@ bool SgFacBridge::importReturnedShape(SgPolyShape *shape, SgNode *node) {
     if (log.hasProblems()) {
         // No morph was made: the figure keeps the control property it had, if any.
         undo.rollBack(loader);
-        const QMessageBox::StandardButton answer = QMessageBox::question(
-            sgApp->getDialogParent(), SgFacBridge::tr("Changed Geometry"),
+        QMessageBox question(
+            QMessageBox::Question, SgFacBridge::tr("Changed Geometry"),
             SgFacBridge::tr("The geometry has changed and cannot create a morph.\nWould you like "
                             "to import it as a prop instead?"),
-            QMessageBox::Yes | QMessageBox::No, QMessageBox::Yes);
-        return answer == QMessageBox::Yes ? false : dealtWith();
+            QMessageBox::Yes | QMessageBox::No, sgApp->getDialogParent());
+        question.setDefaultButton(QMessageBox::Yes);
+        question.setEscapeButton(QMessageBox::No);
+        int answer = QMessageBox::No;
+        if (!runImportDialog(question, answer))
+            return nodeGone();
+        return answer == QMessageBox::Yes ? false : declined();
     }
     undo.commit();
-    return dealtWith();
+    report(
+        QStringLiteral("Imported %1 from Facetor as the morph %2.").arg(name, loader.morphName()));
+    return true;
 }
 
 void SgFacBridge::importThroughMorphLoader(SgPolyShape *shape, SgNode *node) {
     if (shape == nullptr || node == nullptr)
         return;
+    const QString name = shape->getName();
     // The source refers to the geometry while the dialog lists it; the shape keeps owning it.
-    // A shape without geometry gives the dialog none, which opens it in its file mode.
     SgMorphLoaderDlg dialog(sgApp->getInterface(), false, shape->getGeometry(), node);
-    if (dialog.exec() != QDialog::Accepted)
+    int result = QDialog::Rejected;
+    if (!runImportDialog(dialog, result)) {
+        report(QStringLiteral("%1 left the scene; the geometry returned by Facetor was not "
+                              "imported.")
+                   .arg(name));
+        m_importOutcome = QStringLiteral("refused");
         return;
+    }
+    if (result != QDialog::Accepted) {
+        report(QStringLiteral("Did not import %1 from Facetor.").arg(name));
+        m_importOutcome = QStringLiteral("declined");
+        return;
+    }
     const QString action = dialog.actionText();
-    if (action.contains(QLatin1String("Material")))
+    if (action.contains(QLatin1String("Material"))) {
         copyMaterials(shape, node);
-    else if (action.contains(QLatin1String("Prop")))
+        report(QStringLiteral("Copied the materials of %1 from Facetor.").arg(name));
+    } else if (action.contains(QLatin1String("Prop"))) {
         createPropFromShape(shape);
+    } else {
+        report(QStringLiteral("Imported %1 from Facetor through the Target Importer.").arg(name));
+    }
 }

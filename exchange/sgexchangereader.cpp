@@ -9,6 +9,7 @@
 #include "sgcore/geometry/sgpolyshape.h"
 
 #include <algorithm>
+#include <cmath>
 #include <cstring>
 
 namespace {
@@ -23,6 +24,15 @@ struct MeshUnderConstruction {
     SgPolyMesh *release() { return std::exchange(mesh, nullptr); }
 };
 
+// A coordinate that is not a finite number, or becomes one only in host units, would tear
+// any morph made from the record: the record is refused.
+float toHostUnits(float value) {
+    const auto scaled = float(value * kToHostUnits);
+    if (!std::isfinite(scaled))
+        throw SgRecordError("vertex coordinate not finite");
+    return scaled;
+}
+
 void readVertices(SgRecordInput &input, SgPolyMesh &mesh) {
     const std::int32_t count = input.count(12);
     SgVec3 *vertices = mesh.setVertexArray(count);
@@ -30,8 +40,7 @@ void readVertices(SgRecordInput &input, SgPolyMesh &mesh) {
     for (std::int32_t i = 0; i < count; ++i) {
         float xyz[3];
         std::memcpy(xyz, source + size_t(i) * 12, 12);
-        vertices[i] = SgVec3(float(xyz[0] * kToHostUnits), float(xyz[1] * kToHostUnits),
-                             float(xyz[2] * kToHostUnits));
+        vertices[i] = SgVec3(toHostUnits(xyz[0]), toHostUnits(xyz[1]), toHostUnits(xyz[2]));
     }
 }
 
@@ -43,9 +52,15 @@ void readUVs(SgRecordInput &input, SgPolyMesh &mesh) {
     mesh.setUVList(uvList);
     uvList->values().resize(size_t(count));
     std::memcpy(uvList->values().data(), input.take(size_t(count) * 8), size_t(count) * 8);
+    for (const SgVec2 &uv : uvList->values())
+        if (!std::isfinite(uv.u) || !std::isfinite(uv.v))
+            throw SgRecordError("UV value not finite");
 }
 
-// Reads facet records into the mesh's arrays, checking every index first.
+// Reads facet records into the mesh's arrays, checking every index first. A bad vertex index
+// refuses the record; a material index outside the usable materials stands for material 0 and a
+// UV index outside the UV list for none, so that a modeler that returns fewer materials or UVs
+// does not lose the user's edit.
 class FacetReader {
 public:
     FacetReader(SgPolyMesh &mesh, int materialCount)
@@ -75,9 +90,9 @@ private:
 
     void readFacet(SgRecordInput &input) {
         const std::uint8_t type = input.byte();
-        const std::uint32_t material = input.uint32();
+        std::uint32_t material = input.uint32();
         if (material >= std::uint32_t(m_materialCount))
-            throw SgRecordError("facet material out of range");
+            material = 0;
         std::uint32_t corners = 0;
         if (type == 'T')
             corners = 3;
@@ -99,11 +114,8 @@ private:
         SgFaceCorner corner;
         corner.vertex = indices[0];
         // Without a UV list the UV indices mean nothing; -1 is the host's "no UV".
-        if (m_uvCount > 0 && indices[1] != -1) {
-            if (std::uint32_t(indices[1]) >= m_uvCount)
-                throw SgRecordError("UV index out of range");
+        if (std::uint32_t(indices[1]) < m_uvCount)
             corner.uv = indices[1];
-        }
         return corner;
     }
 

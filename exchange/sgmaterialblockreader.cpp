@@ -7,6 +7,7 @@
 #include "sgcore/materials/sgdefaultmaterial.h"
 #include "sgcore/properties/sgfloatproperty.h"
 
+#include <algorithm>
 #include <cmath>
 
 namespace {
@@ -17,6 +18,13 @@ constexpr std::size_t kSmallestEntryBytes = 42 + 3 * 4;
 void readColor(SgRecordInput &input, float (&color)[3]) {
     for (float &channel : color)
         channel = input.float32();
+}
+
+// A strength that is not a finite number is dropped: the entry keeps its default.
+void readStrength(SgRecordInput &input, float &strength, bool inverted) {
+    const float value = input.float32();
+    if (std::isfinite(value))
+        strength = inverted ? 1.0f - value : value;
 }
 
 QString readText(SgRecordInput &input) {
@@ -52,18 +60,20 @@ void SgMaterialBlockReader::read(SgRecordInput &input) {
         input.skip(1); // 's'
         readColor(input, material.specular);
         input.skip(1); // 'g'
-        material.glossiness = 1.0f - input.float32();
+        readStrength(input, material.glossiness, true);
         input.skip(1); // 't'
-        material.opacity = 1.0f - input.float32();
+        readStrength(input, material.opacity, true);
         input.skip(1); // 'b'
-        material.bumpStrength = input.float32();
+        readStrength(input, material.bumpStrength, false);
         material.bumpImage = readText(input);
         m_materials.push_back(std::move(material));
     }
 }
 
 int SgMaterialBlockReader::usableMaterialCount() const {
-    return m_materials.empty() ? 1 : static_cast<int>(m_materials.size());
+    if (m_materials.empty())
+        return 1;
+    return static_cast<int>(std::min<std::size_t>(m_materials.size(), kMaxMaterialIndices));
 }
 
 int SgMaterialBlockReader::channelFromFloat(float value) {

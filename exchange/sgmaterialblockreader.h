@@ -2,13 +2,15 @@
 
 #include "exchange/sgreturnmaterial.h"
 
+#include <cstddef>
 #include <vector>
 
 class SgRecordInput;
 class SgShape;
 
 // Reads the materials block of a record that the modeler returns (i32 count, then one entry of
-// 42 bytes and three strings per material) and turns it into host materials.
+// 42 bytes and three strings per material) and turns it into host materials. Strengths that
+// are not finite numbers are dropped (the entry keeps its default).
 //
 // Reading and applying are separate steps so that a record found bad later leaves nothing
 // behind: `read` only parses, `applyTo` creates materials and loads images.
@@ -21,8 +23,12 @@ public:
     // The parsed materials, in record order.
     const std::vector<SgReturnMaterial> &materials() const { return m_materials; }
 
-    // The number of materials the shape will have: the parsed count, or 1 ("default") when the
-    // block was empty. Facet material indices must stay below it.
+    // Facet material indices are 8-bit in the host's meshes: at most this many materials can
+    // be told apart.
+    static constexpr std::size_t kMaxMaterialIndices = 256;
+
+    // The number of materials that facets can use: the parsed count up to 256, or 1
+    // ("default") when the block was empty. A facet index at or above it stands for material 0.
     int usableMaterialCount() const;
 
     // Adds one SgDefaultMaterial per parsed entry to `shape` (or one named "default" when the

@@ -12,7 +12,8 @@ namespace {
 constexpr int kControlLockMs = 25;
 
 // The checkpoint reached while a message of `code` is being posted under the control lock.
-const char *postPoint(int code) {
+const char *postPoint(SgModelerMessage message) {
+    const int code = sgCodeByte(message);
     static constexpr const char *kPoints[] = {"post-idle-locked", "post-data-locked",
                                               "post-quit-locked", "post-ack-locked",
                                               "post-release-locked"};
@@ -49,14 +50,14 @@ bool SgFacetorLink::tryLink() {
     return true;
 }
 
-bool SgFacetorLink::post(int code, int value) {
+bool SgFacetorLink::post(SgModelerMessage code, int value) {
     if (!m_linked || !m_control->isAttached() || !m_control->tryLock(kControlLockMs))
         return false;
     auto *record = reinterpret_cast<SgControlRecord *>(m_control->data());
     bool posted = false;
     if (record->toHostFlag == 1) {
         SgFacetorCheckpoint::reach(postPoint(code));
-        record->toHostCode = uint8_t(code);
+        record->toHostCode = sgCodeByte(code);
         record->toHostParameter = value;
         record->toHostFlag = 0;
         posted = true;
@@ -65,14 +66,23 @@ bool SgFacetorLink::post(int code, int value) {
     return posted;
 }
 
-int SgFacetorLink::take(int &value) {
+bool SgFacetorLink::hostTookLast() {
     if (!m_linked || !m_control->isAttached() || !m_control->tryLock(kControlLockMs))
-        return -1;
+        return false;
+    const bool taken =
+        reinterpret_cast<const SgControlRecord *>(m_control->data())->toHostFlag == 1;
+    m_control->unlock();
+    return taken;
+}
+
+std::optional<SgHostMessage> SgFacetorLink::take(int &value) {
+    if (!m_linked || !m_control->isAttached() || !m_control->tryLock(kControlLockMs))
+        return std::nullopt;
     auto *record = reinterpret_cast<SgControlRecord *>(m_control->data());
-    int code = -1;
+    std::optional<SgHostMessage> code;
     if (record->toModelerFlag == 0) {
         SgFacetorCheckpoint::reach("take-locked");
-        code = record->toModelerCode;
+        code = SgHostMessage(record->toModelerCode);
         value = record->toModelerParameter;
         record->toModelerFlag = 1;
     }

@@ -1,11 +1,13 @@
 #pragma once
 
 #include "exchange/sgexchangenode.h"
+#include "exchange/shm/sgcontrolrecord.h"
 
 #include <QByteArray>
 #include <QString>
 
 #include <memory>
+#include <optional>
 
 class SgSharedMemory;
 
@@ -25,11 +27,15 @@ public:
 
     // Posts a modeler-to-host message. False when not linked, the lock is not obtained, or the
     // host has not taken the previous message.
-    bool post(int code, int value = 0);
+    bool post(SgModelerMessage code, int value = 0);
 
-    // Takes the waiting host-to-modeler message: its code, with its parameter in `value`; -1
-    // when no message waits or the lock is not obtained.
-    int take(int &value);
+    // Whether the host has taken the last message posted (the modeler-to-host slot is free).
+    // False when not linked or the lock is not obtained.
+    bool hostTookLast();
+
+    // Takes the waiting host-to-modeler message: its code (any byte), with its parameter in
+    // `value`; none when no message waits or the lock is not obtained.
+    std::optional<SgHostMessage> take(int &value);
 
     // Reads the node record the host has written (exists, attach, lock, read, unlock, detach,
     // release). False, with `error` set, when there is no segment or the record is malformed.

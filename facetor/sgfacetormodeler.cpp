@@ -18,9 +18,6 @@
 
 namespace {
 
-// Codes of the control record, the same in both directions' tables.
-enum Code { Idle = 0, Data = 1, Quit = 2, Acknowledge = 3, Release = 4 };
-
 std::atomic<bool> s_quitRequested{false};
 std::atomic<int> s_quitSignal{0};
 
@@ -118,7 +115,7 @@ void SgFacetorModeler::quit(int exitCode, const QString &reason) {
         QElapsedTimer waited;
         waited.start();
         bool posted = false;
-        while (!(posted = m_link.post(Quit)) && waited.elapsed() < kGoodbyeMs)
+        while (!(posted = m_link.post(SgModelerMessage::Quit)) && waited.elapsed() < kGoodbyeMs)
             QThread::msleep(2);
         log(posted ? QStringLiteral("goodbye posted") : QStringLiteral("goodbye not taken"));
         SgFacetorCheckpoint::reach("goodbye-posted");
@@ -143,7 +140,7 @@ void SgFacetorModeler::poll() {
         log(QStringLiteral("linked"));
         m_heardFromHost.start();
         SgFacetorCheckpoint::reach("linked");
-        postOrQueue(Idle); // ask for the pending selection
+        postOrQueue(SgModelerMessage::SendSelection); // ask for the pending selection
         SgFacetorCheckpoint::reach("requested");
     } else if (QDateTime::currentDateTimeUtc() > m_linkDeadline) {
         log(QStringLiteral("error the host never set the control segment up"));
@@ -155,10 +152,9 @@ void SgFacetorModeler::pollLinked() {
     if (!m_outbox.isEmpty() && m_link.post(m_outbox.head()))
         m_outbox.dequeue();
     int value = 0;
-    const int code = m_link.take(value);
-    if (code >= 0) {
+    if (const std::optional<SgHostMessage> code = m_link.take(value)) {
         m_heardFromHost.restart();
-        react(code);
+        react(*code);
     } else if (m_options.hostTimeoutMs > 0 && m_heardFromHost.elapsed() > m_options.hostTimeoutMs) {
         // A host that died cannot say goodbye: a modeler left linked to it would hold the
         // segments for good.
@@ -174,20 +170,21 @@ void SgFacetorModeler::pollLinked() {
     maybeFinish();
 }
 
-void SgFacetorModeler::react(int code) {
+void SgFacetorModeler::react(SgHostMessage code) {
     switch (code) {
-    case Data:
+    case SgHostMessage::NodeWritten:
         receiveNode();
         break;
-    case Idle:
+    case SgHostMessage::Idle:
         if (!m_selectionArrived && m_options.expect <= 0 && !m_idleSince.isValid())
             m_idleSince.start();
+        askAgainWhenIdle();
         break;
-    case Quit:
+    case SgHostMessage::ShuttingDown:
         log(QStringLiteral("host closing"));
         quit(0, QStringLiteral("the host closed the link"));
         break;
-    case Acknowledge:
+    case SgHostMessage::GeometryRead:
         log(QStringLiteral("host read the returned geometry"));
         SgFacetorCheckpoint::reach("return-acknowledged");
         m_link.releaseData();
@@ -197,7 +194,7 @@ void SgFacetorModeler::react(int code) {
         ++m_returned;
         startNextReturn();
         break;
-    case Release:
+    case SgHostMessage::SegmentBusy:
         log(QStringLiteral("host asks to release the data segment"));
         m_link.releaseData();
         if (m_returnInFlight) {
@@ -207,10 +204,10 @@ void SgFacetorModeler::react(int code) {
             m_inFlight = SgExchangeNode();
         }
         m_returnInFlight = false;
-        postOrQueue(Idle);
+        postOrQueue(SgModelerMessage::SendSelection);
         break;
     default:
-        log(QStringLiteral("unknown host message %1").arg(code));
+        log(QStringLiteral("unknown host message %1").arg(sgCodeByte(code)));
         break;
     }
 }
@@ -244,7 +241,7 @@ void SgFacetorModeler::receiveNode() {
     } else {
         log(QStringLiteral("error the node record cannot be read: %1").arg(error));
     }
-    postOrQueue(Acknowledge);
+    postOrQueue(SgModelerMessage::NodeRead);
     SgFacetorCheckpoint::reach("node-acknowledged");
     if (!m_selectionArrived && m_options.expect > 0 && m_received >= m_options.expect)
         selectionComplete();
@@ -271,8 +268,9 @@ void SgFacetorModeler::startNextReturn() {
     if (!m_selectionArrived || m_returnInFlight || m_returns.isEmpty() || !m_link.isLinked())
         return;
     // The host still holds the segment of the last node it sent until it has read our
-    // acknowledgement; a return waits for it to go.
-    if (m_link.dataSegmentExists())
+    // acknowledgement; a return waits for it to go, and for the host to have answered our last
+    // message (a request for the selection may bring a node into the segment).
+    if (!m_outbox.isEmpty() || !m_link.hostTookLast() || m_link.dataSegmentExists())
         return;
     SgExchangeNode &node = m_returns.head();
     if (!m_link.writeRecord(SgFacetorReturn::encode(node))) {
@@ -289,11 +287,17 @@ void SgFacetorModeler::startNextReturn() {
     log(QStringLiteral("returned %1 vertices=%2")
             .arg(m_inFlight.name)
             .arg(m_inFlight.vertexCount()));
-    postOrQueue(Data);
+    postOrQueue(SgModelerMessage::GeometryWritten);
     SgFacetorCheckpoint::reach("return-announced");
 }
 
-void SgFacetorModeler::postOrQueue(int code) {
+void SgFacetorModeler::askAgainWhenIdle() {
+    if (m_returnInFlight || !m_returns.isEmpty() || !m_outbox.isEmpty())
+        return;
+    postOrQueue(SgModelerMessage::SendSelection);
+}
+
+void SgFacetorModeler::postOrQueue(SgModelerMessage code) {
     if (m_outbox.isEmpty() && m_link.post(code))
         return;
     m_outbox.enqueue(code);

@@ -62,11 +62,14 @@ private slots:
 
 private:
     void pollLinked();
-    void react(int code);
+    void react(SgHostMessage code);
     void receiveNode();
     void queueReturn(const SgExchangeNode &node);
     void startNextReturn();
-    void postOrQueue(int code);
+    void postOrQueue(SgModelerMessage code);
+    // Asks the host again for its pending selection (code 0) when nothing is in flight, so that
+    // nodes the user sends later reach this modeler.
+    void askAgainWhenIdle();
     void maybeFinish();
     void selectionComplete();
     void log(const QString &line);
@@ -78,7 +81,7 @@ private:
     QTimer *m_timer = nullptr;
     std::unique_ptr<QFile> m_logFile;
     QDateTime m_linkDeadline;
-    QQueue<int> m_outbox;
+    QQueue<SgModelerMessage> m_outbox;
     QQueue<SgExchangeNode> m_returns;
     SgExchangeNode m_inFlight; // the return the host has been told about and not yet read
     SgFacetorSaveSettler *m_settler = nullptr;

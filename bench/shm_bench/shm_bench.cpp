@@ -86,12 +86,12 @@ SgControlRecord *controlRecord(SgSharedMemory &memory) {
 }
 
 // Host side: waits for the host-to-modeler slot to be free and posts `code` there.
-void postToModeler(SgSharedMemory &memory, std::uint8_t code, std::int32_t parameter) {
+void postToModeler(SgSharedMemory &memory, SgHostMessage code, std::int32_t parameter) {
     for (;;) {
         if (memory.tryLock(0)) {
             SgControlRecord *record = controlRecord(memory);
             if (record->toModelerFlag == 1) {
-                record->toModelerCode = code;
+                record->toModelerCode = sgCodeByte(code);
                 record->toModelerParameter = parameter;
                 record->toModelerFlag = 0;
                 memory.unlock();
@@ -134,11 +134,11 @@ int echoThroughSegment(const std::string &key) {
             if (record->toModelerFlag == 0 && record->toHostFlag == 1) {
                 const std::uint8_t code = record->toModelerCode;
                 record->toHostParameter = record->toModelerParameter;
-                record->toHostCode = SgModelerNodeRead;
+                record->toHostCode = sgCodeByte(SgModelerMessage::NodeRead);
                 record->toModelerFlag = 1;
                 record->toHostFlag = 0;
                 memory.unlock();
-                if (code == SgHostShuttingDown)
+                if (code == sgCodeByte(SgHostMessage::ShuttingDown))
                     return 0;
                 idle = 0;
                 continue;
@@ -210,14 +210,14 @@ void BM_ControlRoundTripSegment(benchmark::State &state) {
     std::int32_t sequence = 0;
     const auto start = Clock::now();
     for (auto _ : state) {
-        postToModeler(memory, SgHostNodeWritten, ++sequence);
+        postToModeler(memory, SgHostMessage::NodeWritten, ++sequence);
         if (takeFromModeler(memory) != sequence) {
             state.SkipWithError("wrong answer");
             break;
         }
     }
     record("segment", state, start);
-    postToModeler(memory, SgHostShuttingDown, 0);
+    postToModeler(memory, SgHostMessage::ShuttingDown, 0);
     takeFromModeler(memory);
     waitpid(peer, nullptr, 0);
 }

@@ -59,6 +59,11 @@ app.waitForBridge(bridge, 30000, function (outcome) {
     if (!app.exportObj(figure, out))
         throw new Error("could not write " + out);
     app.print("== Wrote " + out);
+    // The whole scene with the new morphs and their control property, to open in the window.
+    var saved = outFolder + "/" + figure + "-scene.json";
+    if (!scene.save(saved))
+        throw new Error("could not save " + saved + ": " + scene.lastError());
+    app.print("== Saved " + saved);
     if (morphs === 0)
         app.fail("no morph was created");
 });

@@ -8,26 +8,42 @@
 inline constexpr char kSgControlSegmentKey[] = "FACETOR_BRIDGE_STATIC_MAP";
 // Key of the data segment that carries one exchange record at a time.
 inline constexpr char kSgDataSegmentKey[] = "FACETOR_BRIDGE_DYNAMIC_MAP";
+// Key of a small segment that a linked host holds for as long as its link lasts, so that a
+// second host leaves the control record alone. The modeler never opens it.
+inline constexpr char kSgHostLinkKey[] = "FACETOR_BRIDGE_HOST_LINK";
+
+// The one vocabulary of the control record: every code that travels, named per direction.
+// The bridge, the reference modeler and the tests use these names; the byte values are the
+// codes as they travel.
 
 // Messages from the host to the modeler.
-enum SgHostMessage : std::uint8_t {
-    SgHostIdle = 0,         // the host has heard nothing else for ten polls
-    SgHostNodeWritten = 1,  // a node record is in the data segment
-    SgHostShuttingDown = 2, // the host is closing
-    SgHostGeometryRead = 3, // the returned geometry was read and the data segment removed
-    SgHostSegmentBusy = 4,  // nothing was sent: the data segment still exists
+enum class SgHostMessage : std::uint8_t {
+    Idle = 0,         // the host has heard nothing else for ten polls
+    NodeWritten = 1,  // a node record is in the data segment
+    ShuttingDown = 2, // the host is closing
+    GeometryRead = 3, // the returned geometry was read and the data segment removed
+    SegmentBusy = 4,  // nothing was sent: the data segment still exists
 };
 
-// Messages from the modeler to the host.
-enum SgModelerMessage : std::uint8_t {
-    SgModelerSendSelection = 0,   // send the pending selection
-    SgModelerGeometryWritten = 1, // geometry is in the data segment
-    SgModelerQuit = 2,            // the modeler has quit
-    SgModelerNodeRead = 3,        // the node record was read and the data segment released
-    SgModelerReleaseSegment = 4,  // release the data segment
+// Messages from the modeler to the host. A modeler may post any byte; codes without a name
+// here are ignored by the host.
+enum class SgModelerMessage : std::uint8_t {
+    SendSelection = 0,   // send the pending selection
+    GeometryWritten = 1, // returned geometry is in the data segment
+    Quit = 2,            // the modeler has quit
+    NodeRead = 3,        // the node record was read and the data segment released
+    ReleaseSegment = 4,  // release the data segment
     // Never travels: the host's reader uses it for "no message" and for a lock not obtained.
-    SgModelerNoMessage = 5,
+    NoMessage = 5,
 };
+
+// The byte a code travels as.
+constexpr std::uint8_t sgCodeByte(SgHostMessage code) {
+    return static_cast<std::uint8_t>(code);
+}
+constexpr std::uint8_t sgCodeByte(SgModelerMessage code) {
+    return static_cast<std::uint8_t>(code);
+}
 
 // The whole control segment, little-endian and packed. Each direction has a slot: a flag
 // (host-to-modeler: 1 = free, 0 = a message waits; modeler-to-host: 0 = a message waits,

@@ -82,6 +82,8 @@ struct SgSharedMemory::State {
     std::int32_t size = 0;
     // The access that the open data mapping handle allows.
     Platform::Access mappingAccess = Platform::Access::Read;
+    // The wait of lock() and of the calls that lock on their own.
+    std::uint32_t waitLimit = Platform::kInfinite;
 };
 
 SgSharedMemory::SgSharedMemory(std::string_view key) {
@@ -97,8 +99,13 @@ SgSharedMemory::SgSharedMemory(std::string_view key) {
 }
 
 SgSharedMemory::~SgSharedMemory() {
-    if (d->dataView.address || d->referenceView.address)
-        detach();
+    // A peer that keeps the lock past the wait limit cannot be counted on: every handle goes
+    // without counting, and the segment lives on through the peer's own handles.
+    if ((d->dataView.address || d->referenceView.address) && !detach() &&
+        d->status == StatusLockFailed) {
+        remove(kRemoveUnlocked);
+        return;
+    }
     // A destroyed object never keeps the semaphore taken.
     releaseAllLockLevels();
     // An object that holds no mapping (never created or attached, or removed) has no part in
@@ -353,8 +360,13 @@ bool SgSharedMemory::lockFor(std::uint32_t milliseconds) {
     return false;
 }
 
+void SgSharedMemory::setWaitLimit(int milliseconds) {
+    d->waitLimit =
+        milliseconds < 0 ? Platform::kInfinite : static_cast<std::uint32_t>(milliseconds);
+}
+
 bool SgSharedMemory::lock() {
-    return lockFor(Platform::kInfinite);
+    return lockFor(d->waitLimit);
 }
 
 bool SgSharedMemory::tryLock(int milliseconds) {

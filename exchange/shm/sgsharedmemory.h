@@ -43,7 +43,8 @@ public:
     // closes every handle so that the segment vanishes unless another process holds it. When
     // other processes are still attached, this process keeps its handles open until it ends,
     // so the segment outlives the object. An object that holds no mapping closes what it has
-    // and counts nothing.
+    // and counts nothing. When detaching fails because a peer keeps the lock past the wait
+    // limit, every handle is closed without counting.
     ~SgSharedMemory();
 
     SgSharedMemory(const SgSharedMemory &) = delete;
@@ -89,10 +90,18 @@ public:
     // Fails with StatusNotFound when not attached, StatusLockFailed or StatusFailed.
     bool detach();
 
-    // Takes the segment's lock, waiting without a limit. Nested calls on one object only
-    // deepen the lock. Fails (without StatusLockFailed, and giving up one held level) when the
-    // segment does not exist; fails with StatusLockFailed when the semaphore cannot be had.
-    // Cost: one system call when uncontended and this object holds the mapping open (created
+    // Bounds every wait for the lock that this object makes without a time of its own (lock,
+    // and so attach, detach, remove and destruction) to `milliseconds`; negative restores the
+    // wait without a limit (the default). A peer that holds the lock for longer makes these
+    // calls fail with StatusLockFailed; remove(kRemoveUnlocked) then still lets go of every
+    // handle. On Windows a semaphore held by a process that died stays taken for good, so a
+    // caller that must never hang sets a bound.
+    void setWaitLimit(int milliseconds);
+
+    // Takes the segment's lock, waiting without a limit (or the wait limit). Nested calls on one
+    // object only deepen the lock. Fails (without StatusLockFailed, and giving up one held level)
+    // when the segment does not exist; fails with StatusLockFailed when the semaphore cannot be
+    // had. Cost: one system call when uncontended and this object holds the mapping open (created
     // or attached); a handful more otherwise, for the existence test.
     bool lock();
 

@@ -7,10 +7,13 @@
 // The kernel calls beneath SgSharedMemory: named memory mappings, views of them, and a named
 // semaphore with a maximum count of 1 used as a cross-process mutex. Each call mirrors one
 // Windows call; the Win32 back-end makes exactly that call, the POSIX back-end gives the same
-// observable behaviour with shm objects and open-file-description locks:
-// - a named object exists while any handle to it is open in any process, also when a holder
-//   dies; it vanishes when the last handle closes;
-// - a lock held by a process that dies is released;
+// observable behaviour with shm objects and open-file-description locks, except where a
+// holder dies:
+// - a named object exists while any handle to it is open in any process; it vanishes when the
+//   last handle closes (a process that dies closes its handles);
+// - a lock held by a process that dies: the POSIX back-end releases it; a Windows semaphore
+//   stays taken until every handle to it is closed, so that waits on it must be bounded
+//   (SgSharedMemory::setWaitLimit);
 // - objects are private to the user (mode 0600, names carry the user id).
 // Handles are opaque and null when invalid. None of the calls throws.
 class SgShmPlatform {

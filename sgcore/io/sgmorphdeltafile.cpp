@@ -67,7 +67,11 @@ SgMorphDeltas *SgMorphDeltaFile::read(const QString &path, int vertexCount, QStr
         error = QStringLiteral("%1: cannot open the file (%2)").arg(path, file.errorString());
         return nullptr;
     }
-    const QByteArray bytes = file.readAll();
+    return readBuffer(file.readAll(), vertexCount, path, error);
+}
+
+SgMorphDeltas *SgMorphDeltaFile::readBuffer(const QByteArray &bytes, int vertexCount,
+                                            const QString &sourceName, QString &error) {
     const std::string_view text(bytes.constData(), size_t(bytes.size()));
     auto result = std::make_unique<SgMorphDeltas>();
     result->setVertCount(vertexCount);
@@ -75,7 +79,7 @@ SgMorphDeltas *SgMorphDeltaFile::read(const QString &path, int vertexCount, QStr
     int last = -1;
     int lineNumber = 0;
     auto fail = [&](const QString &what) {
-        error = QStringLiteral("%1:%2: %3").arg(path).arg(lineNumber).arg(what);
+        error = QStringLiteral("%1:%2: %3").arg(sourceName).arg(lineNumber).arg(what);
         return nullptr;
     };
     for (size_t at = 0; at < text.size();) {

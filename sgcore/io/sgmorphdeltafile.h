@@ -20,4 +20,7 @@ public:
     // to "<file>:<line>: <what>", for a file that does not open or does not read whole.
     // Cost: one pass over the bytes.
     static SgMorphDeltas *read(const QString &path, int vertexCount, QString &error);
+    // The same from bytes in memory; `sourceName` stands for the file in messages.
+    static SgMorphDeltas *readBuffer(const QByteArray &bytes, int vertexCount,
+                                     const QString &sourceName, QString &error);
 };

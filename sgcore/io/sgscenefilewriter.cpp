@@ -59,6 +59,12 @@ QString fileStem(const QString &name) {
     return stem.isEmpty() ? QStringLiteral("node") : stem;
 }
 
+// The parent the file can name: one in the same scene.
+SgNode *parentInScene(const SgNode *node) {
+    SgNode *parent = node->getParent();
+    return parent && parent->getScene() == node->getScene() ? parent : nullptr;
+}
+
 void putIfSet(QJsonObject &o, const char *key, bool value, bool fallback) {
     if (value != fallback)
         o.insert(QLatin1String(key), value);
@@ -102,7 +108,7 @@ void SgSceneFileWriter::writeInOrder(SgNode *node, QJsonArray &out) {
     if (m_done.contains(node))
         return;
     m_done.insert(node);
-    if (SgNode *parent = node->getParent())
+    if (SgNode *parent = parentInScene(node))
         writeInOrder(parent, out);
     auto *figure = dynamic_cast<SgSkeleton *>(node);
     out.append(figure ? figureEntry(figure) : nodeEntry(node));
@@ -128,7 +134,7 @@ QJsonObject SgSceneFileWriter::nodeEntry(SgNode *node) {
     const bool hasGeometry = node->getObject() && node->getObject()->getCurrentShape();
     o.insert(QStringLiteral("kind"), hasGeometry ? QStringLiteral("prop") : QStringLiteral("node"));
     writeCommon(node, o);
-    if (SgNode *parent = node->getParent())
+    if (SgNode *parent = parentInScene(node))
         o.insert(QStringLiteral("parent"), parent->getName());
     if (hasGeometry)
         writeGeometry(node, fileStem(node->getName()), o);
@@ -139,7 +145,7 @@ QJsonObject SgSceneFileWriter::figureEntry(SgSkeleton *figure) {
     QJsonObject o;
     o.insert(QStringLiteral("kind"), QStringLiteral("figure"));
     writeCommon(figure, o);
-    if (SgNode *parent = figure->getParent())
+    if (SgNode *parent = parentInScene(figure))
         o.insert(QStringLiteral("parent"), parent->getName());
     if (SgSkeleton *target = figure->getFollowTarget())
         o.insert(QStringLiteral("followTarget"), target->getName());

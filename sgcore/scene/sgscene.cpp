@@ -92,6 +92,27 @@ bool SgScene::addNode(SgNode *node, bool withChildren) {
     return true;
 }
 
+void SgScene::takeNodesFrom(SgScene &other) {
+    if (&other == this) {
+        return;
+    }
+    std::vector<SgNode *> moved;
+    moved.swap(other.m_nodes);
+    const bool otherHadSelection = !other.m_selected.empty();
+    other.m_selected.clear();
+    other.m_primary = nullptr;
+    for (SgNode *n : moved) {
+        n->setScene(this);
+        m_nodes.push_back(n);
+    }
+    if (otherHadSelection) {
+        emit other.selectionChanged();
+    }
+    for (SgNode *n : moved) {
+        emit nodeAdded(n);
+    }
+}
+
 void SgScene::removeNode(SgNode *node) {
     if (!node || node->getScene() != this) {
         return;
@@ -136,6 +157,9 @@ void SgScene::clear() {
     m_primary = nullptr;
     std::vector<SgNode *> nodes;
     nodes.swap(m_nodes);
+    for (SgNode *n : nodes) {
+        emit nodeRemoved(n);
+    }
     for (SgNode *n : nodes) {
         n->setParent(nullptr);
     }

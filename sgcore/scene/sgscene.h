@@ -43,8 +43,12 @@ public:
     // Removes `node` and its descendants from the scene and deletes them; they leave the
     // selection, and figures that followed a removed figure follow none.
     void removeNode(SgNode *node);
-    // Removes and deletes every node.
+    // Removes and deletes every node; emits nodeRemoved for each, as removeNode does.
     void clear();
+    // Moves every node of `other` to the end of this scene, in `other`'s scene order (nodes
+    // with their hierarchy; `other` ends empty, without selection). Emits nodeAdded for each.
+    // Lets a caller load a file into a scratch scene and keep the user's scene when it fails.
+    void takeNodesFrom(SgScene &other);
 
     // Selection. `selectNode` with `add` false replaces the selection; the node becomes the
     // primary selection. Nodes outside the scene are ignored.
@@ -62,6 +66,9 @@ public:
 
 signals:
     void nodeAdded(SgNode *node);
+    // Emitted for every node that leaves the scene, whatever removed it (removeNode, clear,
+    // loading another scene, the scene's destruction), after it has left the node list and
+    // the selection and before it is deleted: a holder of the pointer drops it here.
     void nodeRemoved(SgNode *node);
     void selectionChanged();
     void sceneUpdated();

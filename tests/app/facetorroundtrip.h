@@ -37,13 +37,15 @@ public:
               "FACETOR_QUIT_WHEN_DONE", "FACETOR_EDIT", "FACETOR_RETURN"})
             qunsetenv(name);
     }
-    // Sends the selection and runs the event loop until the modeler has quit.
+    // Sends the selection and runs the event loop until the modeler has quit and every
+    // return has been imported.
     bool run() {
         TestBridge bridge;
         bridge.executeAction();
         if (!bridge.isActive())
             return false;
-        return bridgetest::waitUntil([&] { return !bridge.isActive(); }, 30000);
+        return bridgetest::waitUntil(
+            [&] { return !bridge.isActive() && bridge.pendingImports() == 0; }, 30000);
     }
     QString log() const {
         QFile file(m_dir.filePath("facetor.log"));

@@ -35,6 +35,7 @@
 #include <QDoubleSpinBox>
 #include <QFile>
 #include <QFileDialog>
+#include <QFileInfo>
 #include <QLineEdit>
 #include <QMenu>
 #include <QMenuBar>
@@ -246,6 +247,18 @@ TEST(AppWindow, SavesReopensAndNeverLosesChangesSilently) {
     actionNamed(window, "SgOpenSceneAction")->trigger();
     QApplication::processEvents();
     EXPECT_EQ(scene->findNodeByLabel(QStringLiteral("Blobby")), figure) << "cancelled: kept";
+
+    // A file that does not load leaves the scene as it was.
+    QFile bad(sgTestPath(QStringLiteral("session/bad.json")));
+    ASSERT_TRUE(bad.open(QIODevice::WriteOnly));
+    bad.write(
+        R"({"scenara": 1, "nodes": [{"kind": "prop", "name": "X", "geometry": "none.obj"}]})");
+    bad.close();
+    const int nodes = scene->getNodeCount();
+    EXPECT_FALSE(window.openScene(bad.fileName(), true));
+    EXPECT_EQ(scene->getNodeCount(), nodes);
+    EXPECT_EQ(scene->findNodeByLabel(QStringLiteral("Blobby")), figure);
+    EXPECT_EQ(window.scenePath(), QFileInfo(saved).absoluteFilePath());
 
     // The saved file reopens with the morph at its saved control value.
     ASSERT_TRUE(window.openScene(saved, true));

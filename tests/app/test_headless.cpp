@@ -2,8 +2,13 @@
 // demonstration's round trip makes one morph per moved bone and exports the figure at morph
 // value 1; a failing script ends with a non-zero status; command-line switches reach the host.
 
+#include "sgcore/geometry/sgobject.h"
 #include "sgcore/geometry/sgpolymesh.h"
 #include "sgcore/io/sgobjreader.h"
+#include "sgcore/io/sgscenefile.h"
+#include "sgcore/scene/sgbone.h"
+#include "sgcore/scene/sgscene.h"
+#include "sgcore/scene/sgskeleton.h"
 
 #include "bridgetestsupport.h"
 #include "exchange/shm/sgcontrolrecord.h"
@@ -100,6 +105,22 @@ TEST(HeadlessDemo, RoundTripMakesMorphsAndExportsTheFigureAtValueOne) {
         offset += int(vertices.size());
     }
     EXPECT_EQ(offset, result->getVertexCount());
+    // The saved scene reopens with the morphs at 1: the bones' current geometry is the export.
+    SgScene reopened;
+    SgSceneFile saved;
+    ASSERT_TRUE(saved.load(dir.filePath(QStringLiteral("Blobby-scene.json")), &reopened))
+        << saved.getErrorString().toStdString();
+    auto *figure = dynamic_cast<SgSkeleton *>(reopened.findNodeByLabel(QStringLiteral("Blobby")));
+    ASSERT_NE(figure, nullptr);
+    offset = 0;
+    for (SgBone *bone : figure->getAllBones()) {
+        const SgVertexMesh *current = bone->getObject()->getCachedGeom();
+        for (int i = 0; i < current->getVertexCount(); ++i)
+            EXPECT_TRUE(current->getVertex(i) == result->getVertex(offset + i))
+                << bone->getName().toStdString() << " " << i;
+        offset += current->getVertexCount();
+    }
+    EXPECT_EQ(offset, result->getVertexCount());
     // Nothing of the bridge's segments is left behind.
     EXPECT_TRUE(bridgetest::segmentFiles(kSgControlSegmentKey).isEmpty());
     EXPECT_TRUE(bridgetest::segmentFiles(kSgDataSegmentKey).isEmpty());
@@ -147,4 +168,34 @@ TEST(HeadlessDemo, ScriptFailuresAndArguments) {
     EXPECT_TRUE(args.out.contains(QStringLiteral(",-facbridge\n")));
     EXPECT_TRUE(args.out.contains(QStringLiteral("script=one,two\n")));
     EXPECT_TRUE(args.out.contains(QStringLiteral("classes=function\n")));
+}
+
+TEST(HeadlessDemo, AClosedBoxDoesNotEndTheScriptAndADeclinedReturnSaysSo) {
+    QTemporaryDir dir;
+    // The modeler returns the prop with a vertex more: no morph can be made, and the script
+    // declines the prop that the host offers instead.
+    const ScenaraRun run = runScenara(
+        {QStringLiteral("--script"),
+         writeScript(dir, QStringLiteral("declined.js"),
+                     "var bridge = app.action('Send to Facetor...');\n"
+                     "app.onQuestion(function (title) { app.print('asked ' + title);"
+                     " return 'No'; });\n"
+                     "bridge.trigger();\n" // nothing selected: "Launch Facetor", answered No
+                     "app.later(200, function () {\n"
+                     "    app.print('still running');\n"
+                     "    selection.select('Box');\n"
+                     "    bridge.trigger();\n"
+                     "    app.waitForBridge(bridge, 30000, function (outcome) {\n"
+                     "        app.print('outcome ' + outcome);\n"
+                     "        app.exit(outcome === 'declined' ? 3 : 4);\n"
+                     "    });\n"
+                     "});\n"),
+         QStringLiteral(SG_EXAMPLES_DIR "/demo/scene.json")},
+        environmentIn(dir, QStringLiteral("extra=0,0,5")));
+    const qsizetype asked = run.out.indexOf(QStringLiteral("asked Launch Facetor\n"));
+    EXPECT_GE(asked, 0) << run.out.toStdString() << run.err.toStdString();
+    EXPECT_GT(run.out.indexOf(QStringLiteral("still running\n")), asked);
+    EXPECT_TRUE(run.out.contains(QStringLiteral("asked Changed Geometry\n")));
+    EXPECT_TRUE(run.out.contains(QStringLiteral("outcome declined\n")));
+    EXPECT_EQ(run.status, 3);
 }

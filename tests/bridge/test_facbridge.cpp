@@ -1,6 +1,6 @@
 // The bridge action on its own: collecting the selection, launching, the control messages and
 // the poll's counting, and placing returned geometry. The modeler is played by this test
-// through a second view of the control segment, or by a stand-in program that exits at once.
+// through a second view of the control segment, or by a stand-in program that only sleeps.
 
 #include "bridge/sgfacbridge.h"
 #include "bridgetestsupport.h"
@@ -20,7 +20,9 @@
 #include <QTest>
 #include <QTimer>
 
+#include <csignal>
 #include <cstring>
+#include <optional>
 
 #include <gtest/gtest.h>
 
@@ -56,17 +58,17 @@ public:
         return copy;
     }
     SgControlRecord *live() { return m_record ? m_record : &m_scratch; }
-    void post(int code) {
-        live()->toHostCode = uint8_t(code);
+    void post(SgModelerMessage code) {
+        live()->toHostCode = sgCodeByte(code);
         live()->toHostParameter = 0;
         live()->toHostFlag = 0;
     }
-    // Takes the host's message: its code, or -1 when none waits.
-    int take() {
+    // Takes the host's message: its code, or none when none waits.
+    std::optional<SgHostMessage> take() {
         if (live()->toModelerFlag != 0)
-            return -1;
+            return std::nullopt;
         live()->toModelerFlag = 1;
-        return live()->toModelerCode;
+        return SgHostMessage(live()->toModelerCode);
     }
 
 private:
@@ -75,21 +77,23 @@ private:
     SgControlRecord m_scratch{};
 };
 
-// A stand-in modeler program that exits at once, in a folder of its own.
+// A stand-in modeler program that lives for a few seconds (long enough for a test; a test
+// ends it early by killing it) without touching the segments. Its folder lasts as long as the
+// test program, since the program starts after the launch has returned.
 class StandInModeler {
 public:
     StandInModeler() {
-        QFile program(m_dir.filePath(QStringLiteral("Facetor")));
-        program.open(QIODevice::WriteOnly);
-        program.write("#!/bin/sh\nexit 0\n");
-        program.close();
-        program.setPermissions(QFile::ReadOwner | QFile::WriteOwner | QFile::ExeOwner);
-        qputenv("FACETOR_INSTALL_PATH", m_dir.path().toUtf8());
+        static const QTemporaryDir folder;
+        QFile program(folder.filePath(QStringLiteral("Facetor")));
+        if (!program.exists()) {
+            program.open(QIODevice::WriteOnly);
+            program.write("#!/bin/sh\nexec sleep 10\n");
+            program.close();
+            program.setPermissions(QFile::ReadOwner | QFile::WriteOwner | QFile::ExeOwner);
+        }
+        qputenv("FACETOR_INSTALL_PATH", folder.path().toUtf8());
     }
     ~StandInModeler() { qunsetenv("FACETOR_INSTALL_PATH"); }
-
-private:
-    QTemporaryDir m_dir;
 };
 
 class BridgeAction : public ::testing::Test {
@@ -202,51 +206,61 @@ TEST_F(BridgeAction, TriggeringWhileActiveAppendsWithoutALaunch) {
     EXPECT_EQ(labels(bridge->sendList()), (QStringList{"Cup", "Plate"}));
 }
 
-TEST_F(BridgeAction, AMissingModelerIsLoggedAndTheBridgeStaysIdle) {
+TEST_F(BridgeAction, AMissingModelerIsLoggedAndRemovedNodesLeaveTheSendList) {
     scene()->addNode(bridgetest::makeProp(QStringLiteral("Cup")));
+    scene()->addNode(bridgetest::makeProp(QStringLiteral("Plate")));
+    scene()->addNode(bridgetest::makeProp(QStringLiteral("Fork")));
     qputenv("FACETOR_INSTALL_PATH", "/nonexistent/facetor");
     TestBridge bridge;
-    scene()->selectNode(scene()->findNodeByLabel(QStringLiteral("Cup")));
+    for (const char *label : {"Cup", "Plate", "Fork"})
+        scene()->selectNode(scene()->findNodeByLabel(QString::fromLatin1(label)), true);
     bridge.executeAction();
     qunsetenv("FACETOR_INSTALL_PATH");
     EXPECT_TRUE(
         sgApp->getMessageSink()->logLines().contains(QStringLiteral("Failed to launch Facetor.")));
     EXPECT_FALSE(bridge.isActive());
     EXPECT_FALSE(bridge.pollTimer()->isActive());
-    EXPECT_EQ(labels(bridge.sendList()), QStringList{"Cup"});
+    EXPECT_EQ(labels(bridge.sendList()), (QStringList{"Cup", "Plate", "Fork"}));
+
+    // The kept list never outlives its nodes: a removal or a cleared (reloaded) scene drops
+    // them before they are deleted, so a later send cannot reach a freed node.
+    scene()->removeNode(scene()->findNodeByLabel(QStringLiteral("Plate")));
+    EXPECT_EQ(labels(bridge.sendList()), (QStringList{"Cup", "Fork"}));
+    scene()->clear();
+    EXPECT_EQ(bridge.sendList().count(), 0);
 }
 
 TEST_F(BridgeAction, MessagesWaitForTheirSlot) {
     scene()->addNode(bridgetest::makeProp(QStringLiteral("Cup")));
     TestBridge idle;
     int value = 42;
-    EXPECT_FALSE(idle.postMessage(1, 0)); // not attached
-    EXPECT_EQ(idle.readMessage(value), 0);
+    EXPECT_FALSE(idle.postMessage(SgHostMessage::NodeWritten, 0)); // not attached
+    EXPECT_EQ(idle.readMessage(value), SgModelerMessage::SendSelection);
     EXPECT_EQ(value, 42);
 
     auto bridge = linkedBridge();
     Peer peer;
-    EXPECT_EQ(bridge->readMessage(value), 5); // nothing waits
-    EXPECT_TRUE(bridge->postMessage(4, 7));
+    EXPECT_EQ(bridge->readMessage(value), SgModelerMessage::NoMessage);
+    EXPECT_TRUE(bridge->postMessage(SgHostMessage::SegmentBusy, 7));
     const SgControlRecord before = peer.record();
     EXPECT_EQ(before.toModelerFlag, 0);
-    EXPECT_EQ(before.toModelerCode, 4);
+    EXPECT_EQ(before.toModelerCode, sgCodeByte(SgHostMessage::SegmentBusy));
     EXPECT_EQ(before.toModelerParameter, 7);
-    EXPECT_FALSE(bridge->postMessage(1, 9));
+    EXPECT_FALSE(bridge->postMessage(SgHostMessage::NodeWritten, 9));
     EXPECT_EQ(std::memcmp(&before, peer.live(), sizeof before), 0);
 
     peer.live()->toHostParameter = -3;
     peer.live()->toHostCode = 200;
     peer.live()->toHostFlag = 0;
-    EXPECT_EQ(bridge->readMessage(value), 200);
+    EXPECT_EQ(sgCodeByte(bridge->readMessage(value)), 200);
     EXPECT_EQ(value, -3);
     EXPECT_EQ(peer.record().toHostFlag, 1);
 
     // Closing says goodbye once the slot is free, and gives up quietly while it is taken.
     bridge->closing();
-    EXPECT_EQ(peer.take(), 4);
+    EXPECT_EQ(peer.take(), SgHostMessage::SegmentBusy);
     bridge->closing();
-    EXPECT_EQ(peer.take(), 2);
+    EXPECT_EQ(peer.take(), SgHostMessage::ShuttingDown);
 }
 
 TEST_F(BridgeAction, ThePollCountsIdlePollsAndRetriesBeforeNotices) {
@@ -258,43 +272,43 @@ TEST_F(BridgeAction, ThePollCountsIdlePollsAndRetriesBeforeNotices) {
         bridge->checkSharedMap();
         EXPECT_EQ(bridge->idlePolls(), i);
     }
-    EXPECT_EQ(peer.take(), -1);
+    EXPECT_EQ(peer.take(), std::nullopt);
     bridge->checkSharedMap(); // the eleventh poll sends the idle notice
     EXPECT_EQ(bridge->idlePolls(), 1);
-    EXPECT_EQ(peer.record().toModelerCode, 0);
+    EXPECT_EQ(peer.record().toModelerCode, sgCodeByte(SgHostMessage::Idle));
     EXPECT_EQ(peer.record().toModelerFlag, 0);
 
     // Geometry announced without a readable segment is still acknowledged; with the slot
     // taken the acknowledgement waits in the retry queue.
-    peer.post(1);
+    peer.post(SgModelerMessage::GeometryWritten);
     bridge->checkSharedMap();
     EXPECT_EQ(bridge->idlePolls(), 0);
     ASSERT_EQ(bridge->retryQueue().size(), 1);
-    EXPECT_EQ(bridge->retryQueue().head(), std::make_pair(3, 0));
+    EXPECT_EQ(bridge->retryQueue().head(), std::make_pair(SgHostMessage::GeometryRead, 0));
     for (int i = 0; i < 12; ++i)
         bridge->checkSharedMap(); // retries leave the count alone, and no notice goes out
     EXPECT_EQ(bridge->idlePolls(), 0);
     EXPECT_EQ(bridge->retryQueue().size(), 1);
-    EXPECT_EQ(peer.take(), 0);
+    EXPECT_EQ(peer.take(), SgHostMessage::Idle);
     bridge->checkSharedMap();
     EXPECT_TRUE(bridge->retryQueue().isEmpty());
-    EXPECT_EQ(peer.take(), 3);
+    EXPECT_EQ(peer.take(), SgHostMessage::GeometryRead);
     EXPECT_EQ(bridge->idlePolls(), 0);
 
     // The modeler asks: the first node goes out in a data segment of its own.
-    peer.post(0);
+    peer.post(SgModelerMessage::SendSelection);
     bridge->checkSharedMap();
     EXPECT_TRUE(bridge->isExchangeBusy());
     EXPECT_EQ(bridge->sendList().count(), 0);
-    EXPECT_EQ(peer.take(), 1);
+    EXPECT_EQ(peer.take(), SgHostMessage::NodeWritten);
     EXPECT_TRUE(bridgetest::segmentExists(kSgDataSegmentKey));
-    peer.post(3);
+    peer.post(SgModelerMessage::NodeRead);
     bridge->checkSharedMap();
     EXPECT_FALSE(bridge->isExchangeBusy());
     EXPECT_FALSE(bridgetest::segmentExists(kSgDataSegmentKey));
 
     // The modeler quits: the poll stops and the link is dropped.
-    peer.post(2);
+    peer.post(SgModelerMessage::Quit);
     bridge->pollTimer()->start();
     bridge->checkSharedMap();
     EXPECT_FALSE(bridge->isActive());
@@ -307,11 +321,11 @@ TEST_F(BridgeAction, AHeldLockCostsOneWaitAndALostRecordEndsTheExchange) {
     bridge->pollTimer()->stop(); // the test steps the poll itself
     Peer peer;
     // An acknowledgement waits in the retry queue while the slot is taken.
-    ASSERT_TRUE(bridge->postMessage(4, 0));
-    peer.post(1);
+    ASSERT_TRUE(bridge->postMessage(SgHostMessage::SegmentBusy, 0));
+    peer.post(SgModelerMessage::GeometryWritten);
     bridge->checkSharedMap();
     ASSERT_EQ(bridge->retryQueue().size(), 1);
-    EXPECT_EQ(peer.take(), 4);
+    EXPECT_EQ(peer.take(), SgHostMessage::SegmentBusy);
 
     // While the modeler holds the control lock a step waits for it once and posts nothing.
     {
@@ -329,20 +343,20 @@ TEST_F(BridgeAction, AHeldLockCostsOneWaitAndALostRecordEndsTheExchange) {
         modeler.remove(SgSharedMemory::kRemoveUnlocked);
     }
     bridge->checkSharedMap();
-    EXPECT_EQ(peer.take(), 3);
+    EXPECT_EQ(peer.take(), SgHostMessage::GeometryRead);
 
     // The modeler takes the node record and asks again without acknowledging it: the same
     // modeler is still at work; one that has linked since has lost the record.
-    peer.post(0);
+    peer.post(SgModelerMessage::SendSelection);
     bridge->checkSharedMap();
-    EXPECT_EQ(peer.take(), 1);
+    EXPECT_EQ(peer.take(), SgHostMessage::NodeWritten);
     bridge->checkSharedMap();
-    peer.post(0);
+    peer.post(SgModelerMessage::SendSelection);
     bridge->checkSharedMap();
     EXPECT_TRUE(bridge->isExchangeBusy());
     SgSharedMemory restarted(kSgControlSegmentKey);
     ASSERT_TRUE(restarted.attach(SgSharedMemory::kReadWrite));
-    peer.post(0);
+    peer.post(SgModelerMessage::SendSelection);
     bridge->checkSharedMap();
     EXPECT_FALSE(bridge->isExchangeBusy());
     EXPECT_FALSE(bridgetest::segmentExists(kSgDataSegmentKey));
@@ -351,11 +365,11 @@ TEST_F(BridgeAction, AHeldLockCostsOneWaitAndALostRecordEndsTheExchange) {
     scene()->addNode(bridgetest::makeProp(QStringLiteral("Plate")));
     scene()->selectNode(scene()->findNodeByLabel(QStringLiteral("Plate")));
     bridge->executeAction();
-    peer.post(0);
+    peer.post(SgModelerMessage::SendSelection);
     bridge->checkSharedMap();
     ASSERT_TRUE(bridge->isExchangeBusy());
     EXPECT_TRUE(bridgetest::segmentExists(kSgDataSegmentKey));
-    peer.post(2);
+    peer.post(SgModelerMessage::Quit);
     bridge->checkSharedMap();
     EXPECT_FALSE(bridge->isActive());
     EXPECT_FALSE(bridge->isExchangeBusy());
@@ -383,7 +397,7 @@ TEST_F(BridgeAction, TheHostSwitchLinksWithoutRewritingTheRecord) {
     EXPECT_EQ(bridge.modelerProcessId(), 0);
     EXPECT_EQ(std::memcmp(modeler.data(), &asking, sizeof asking), 0);
     int value = 0;
-    EXPECT_EQ(bridge.readMessage(value), 0);
+    EXPECT_EQ(bridge.readMessage(value), SgModelerMessage::SendSelection);
     // The host's start-up restarts the poll of a linked bridge.
     bridge.pollTimer()->stop();
     sgApp->emitStarting();
@@ -391,36 +405,162 @@ TEST_F(BridgeAction, TheHostSwitchLinksWithoutRewritingTheRecord) {
     modeler.detach();
 }
 
-TEST_F(BridgeAction, ReturnedGeometryWithoutANamesakeBecomesAProp) {
+TEST_F(BridgeAction, ReturnsAreAcknowledgedFirstThenImportedOrRefused) {
     scene()->addNode(bridgetest::makeProp(QStringLiteral("Cup")));
+    scene()->addNode(bridgetest::makeProp(QString::fromUtf8("Kiste\u2013A")));
     auto bridge = linkedBridge();
     bridge->pollTimer()->stop();
     Peer peer;
+    QStringList outcomes;
+    QObject::connect(bridge.get(), &SgFacBridge::returnHandled,
+                     [&](const QString &outcome) { outcomes << outcome; });
 
-    SgExchangeNode returned;
-    returned.name = QStringLiteral("Gizmo");
-    returned.vertices = {0, 0, 0, 2, 0, 0, 0, 4, 0};
-    returned.materials.append(SgExchangeNode::Material{});
-    returned.facets.push_back({'T', 0, 0, 3});
-    returned.corners = {{0, -1, -1}, {1, -1, -1}, {2, -1, -1}};
-    const QByteArray record = SgFacetorReturn::encode(returned);
-    SgSharedMemory data(kSgDataSegmentKey);
-    ASSERT_TRUE(data.create(int32_t(record.size())));
-    ASSERT_TRUE(data.attach(SgSharedMemory::kReadWrite));
-    std::memcpy(data.data(), record.constData(), size_t(record.size()));
-    peer.post(1);
-    bridge->checkSharedMap();
-    EXPECT_EQ(peer.take(), 3);
-    data.detach();
-    data.remove(SgSharedMemory::kRemoveUnlocked);
-    EXPECT_FALSE(bridgetest::segmentExists(kSgDataSegmentKey));
+    // One returned record in the data segment, announced; the poll reads and acknowledges it
+    // in the step, and the import follows from the event loop.
+    auto returnShape = [&](const char *name, std::vector<float> vertices) {
+        SgExchangeNode returned;
+        returned.name = QString::fromLatin1(name);
+        returned.vertices = std::move(vertices);
+        returned.materials.append(SgExchangeNode::Material{});
+        if (returned.vertices.size() >= 9) {
+            returned.facets.push_back({'T', 0, 0, 3});
+            returned.corners = {{0, -1, -1}, {1, -1, -1}, {2, -1, -1}};
+        }
+        const QByteArray record = SgFacetorReturn::encode(returned);
+        SgSharedMemory data(kSgDataSegmentKey);
+        ASSERT_TRUE(data.create(int32_t(record.size())));
+        ASSERT_TRUE(data.attach(SgSharedMemory::kReadWrite));
+        std::memcpy(data.data(), record.constData(), size_t(record.size()));
+        peer.post(SgModelerMessage::GeometryWritten);
+        const int nodes = scene()->getNodeCount();
+        bridge->checkSharedMap();
+        EXPECT_EQ(peer.take(), SgHostMessage::GeometryRead);
+        EXPECT_EQ(scene()->getNodeCount(), nodes);
+        EXPECT_EQ(bridge->pendingImports(), 1);
+        data.detach();
+        data.remove(SgSharedMemory::kRemoveUnlocked);
+        EXPECT_FALSE(bridgetest::segmentExists(kSgDataSegmentKey));
+        EXPECT_TRUE(bridgetest::waitUntil([&] { return bridge->pendingImports() == 0; }, 2000));
+    };
 
+    returnShape("Gizmo", {0, 0, 0, 2, 0, 0, 0, 4, 0});
     SgNode *prop = scene()->findNodeByLabel(QStringLiteral("Gizmo"));
     ASSERT_NE(prop, nullptr);
     // Host units are ten times the modeler's; the origin is the centre of the bounding box.
     EXPECT_FLOAT_EQ(prop->getOrigin().x, 10.0f);
     EXPECT_FLOAT_EQ(prop->getOrigin().y, 20.0f);
     EXPECT_EQ(prop->getObject()->getCurrentShape()->getGeometry()->getVertexCount(), 3);
+
+    // A label outside 8 bits travels as "Kiste?A" and comes back to its node as a morph.
+    returnShape("Kiste?A", {0, 0, 0, 1, 0.5f, 0, 0, 1, 0});
+    SgNode *kiste = scene()->findNodeByLabel(QString::fromUtf8("Kiste\u2013A"));
+    EXPECT_NE(kiste->getObject()->findModifier(QStringLiteral("MyMorph")), nullptr);
+    EXPECT_EQ(scene()->findNodeByLabel(QStringLiteral("Kiste?A")), nullptr);
+
+    // A return without vertices is refused, not offered as a morph or a prop.
+    returnShape("Cup", {});
+    EXPECT_EQ(scene()->getNodeCount(), 3);
+    EXPECT_EQ(scene()->findNodeByLabel(QStringLiteral("Cup"))->getObject()->getModifierCount(), 0);
+    EXPECT_TRUE(sgApp->getMessageSink()->logLines().contains(
+        QStringLiteral("Facetor returned Cup without geometry; nothing was imported.")));
+    EXPECT_EQ(outcomes, (QStringList{"imported", "imported", "refused"}));
+}
+
+TEST_F(BridgeAction, AGoneModelerEndsTheLinkAndTheNextSendLaunchesAnother) {
+    scene()->addNode(bridgetest::makeProp(QStringLiteral("Cup")));
+    scene()->addNode(bridgetest::makeProp(QStringLiteral("Plate")));
+    auto bridge = linkedBridge();
+    bridge->pollTimer()->stop();
+    Peer peer;
+    peer.post(SgModelerMessage::SendSelection);
+    bridge->checkSharedMap();
+    ASSERT_TRUE(bridge->isExchangeBusy());
+    EXPECT_EQ(peer.take(), SgHostMessage::NodeWritten);
+
+    // The modeler dies without a goodbye while the node is in flight.
+    const qint64 pid = bridge->modelerProcessId();
+    ::kill(pid_t(pid), SIGKILL);
+    ASSERT_TRUE(bridgetest::waitUntil([&] { return bridgetest::processGone(pid); }, 5000));
+    bridge->checkSharedMap();
+    EXPECT_FALSE(bridge->isActive());
+    EXPECT_FALSE(bridge->isExchangeBusy());
+    EXPECT_TRUE(sgApp->getMessageSink()->logLines().contains(
+        QStringLiteral("Facetor has quit unexpectedly.")));
+    // The unacknowledged node waits for the next modeler; nothing of the link is left.
+    EXPECT_EQ(labels(bridge->sendList()), QStringList{"Cup"});
+    for (const char *key : {kSgControlSegmentKey, kSgDataSegmentKey, kSgHostLinkKey})
+        EXPECT_TRUE(bridgetest::segmentFiles(key).isEmpty()) << key;
+
+    StandInModeler modeler;
+    scene()->selectNode(scene()->findNodeByLabel(QStringLiteral("Plate")));
+    bridge->executeAction();
+    EXPECT_TRUE(bridge->isActive());
+    EXPECT_NE(bridge->modelerProcessId(), pid);
+    EXPECT_EQ(labels(bridge->sendList()), (QStringList{"Cup", "Plate"}));
+
+    // Triggering the action notices a dead modeler by itself too.
+    const qint64 second = bridge->modelerProcessId();
+    ::kill(pid_t(second), SIGKILL);
+    ASSERT_TRUE(bridgetest::waitUntil([&] { return bridgetest::processGone(second); }, 5000));
+    sgApp->getMessageSink()->clear();
+    bridge->executeAction();
+    EXPECT_TRUE(sgApp->getMessageSink()->logLines().contains(
+        QStringLiteral("Facetor has quit unexpectedly.")));
+    EXPECT_TRUE(bridge->isActive());
+    EXPECT_NE(bridge->modelerProcessId(), second);
+    ::kill(pid_t(bridge->modelerProcessId()), SIGKILL);
+}
+
+TEST_F(BridgeAction, ASecondHostLeavesALiveLinkAlone) {
+    scene()->addNode(bridgetest::makeProp(QStringLiteral("Cup")));
+    auto first = linkedBridge();
+    first->pollTimer()->stop();
+    Peer peer;
+    peer.post(SgModelerMessage::NodeRead);
+    const SgControlRecord before = peer.record();
+    {
+        StandInModeler modeler;
+        TestBridge second;
+        second.executeAction();
+        EXPECT_FALSE(second.isActive());
+        EXPECT_EQ(second.modelerProcessId(), 0);
+        EXPECT_TRUE(sgApp->getMessageSink()->logLines().contains(
+            QStringLiteral("Facetor is linked to another Scenara.")));
+        EXPECT_EQ(std::memcmp(&before, peer.live(), sizeof before), 0);
+    }
+    // Once the first host lets go, another may link.
+    ::kill(pid_t(first->modelerProcessId()), SIGKILL);
+    first.reset();
+    StandInModeler modeler;
+    TestBridge third;
+    third.executeAction();
+    EXPECT_TRUE(third.isActive());
+    ::kill(pid_t(third.modelerProcessId()), SIGKILL);
+}
+
+TEST_F(BridgeAction, ANodeThatCannotBeWrittenIsReportedAndTheNextGoesOut) {
+    auto *hollow = new SgNode(QStringLiteral("Hollow"));
+    auto *object = new SgObject(QStringLiteral("Hollow"));
+    object->addShape(new SgPolyShape(QStringLiteral("Hollow"))); // a shape without geometry
+    hollow->setObject(object);
+    scene()->addNode(hollow);
+    scene()->addNode(bridgetest::makeProp(QStringLiteral("Cup")));
+    StandInModeler modeler;
+    TestBridge bridge;
+    scene()->selectNode(hollow);
+    scene()->selectNode(scene()->findNodeByLabel(QStringLiteral("Cup")), true);
+    bridge.executeAction();
+    bridge.pollTimer()->stop();
+    Peer peer;
+    peer.post(SgModelerMessage::SendSelection);
+    bridge.checkSharedMap();
+    EXPECT_TRUE(sgApp->getMessageSink()->logLines().contains(
+        QStringLiteral("Could not send Hollow to Facetor.")));
+    // Only the whole record of the next node is announced.
+    EXPECT_EQ(peer.take(), SgHostMessage::NodeWritten);
+    EXPECT_TRUE(bridge.isExchangeBusy());
+    EXPECT_EQ(bridge.sendList().count(), 0);
+    ::kill(pid_t(bridge.modelerProcessId()), SIGKILL);
 }
 
 TEST_F(BridgeAction, PropLabelsAreMadeUnique) {

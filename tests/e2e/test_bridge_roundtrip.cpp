@@ -11,6 +11,7 @@
 #include "sgcore/scene/sgskeleton.h"
 
 #include <QDir>
+#include <QElapsedTimer>
 #include <QFile>
 #include <QRegularExpression>
 
@@ -28,6 +29,7 @@ using Point = std::tuple<float, float, float>;
 
 class TestBridge : public SgFacBridge {
 public:
+    using SgFacBridge::closing;
     using SgFacBridge::executeAction;
 };
 
@@ -71,7 +73,7 @@ private:
 // Files in the shared-memory folder that belong to one of the bridge's two keys.
 QStringList leftovers() {
     return bridgetest::segmentFiles(kSgControlSegmentKey) +
-           bridgetest::segmentFiles(kSgDataSegmentKey);
+           bridgetest::segmentFiles(kSgDataSegmentKey) + bridgetest::segmentFiles(kSgHostLinkKey);
 }
 
 std::vector<Point> scaledPoints(const SgExchangeNode &node) {
@@ -194,4 +196,30 @@ TEST_F(BridgeRoundTrip, ReturnedGeometryWithAnUnknownNameBecomesAProp) {
     ASSERT_TRUE(bridgetest::waitUntil([&] { return bridgetest::processGone(pid); }, 10000));
     EXPECT_TRUE(bridgetest::waitUntil([] { return leftovers().isEmpty(); }, 2000))
         << leftovers().join(' ').toStdString();
+}
+
+TEST_F(BridgeRoundTrip, ALaterSendWhileLinkedReachesTheModelerWithinASecond) {
+    SgScene *scene = sgApp->getScene();
+    scene->addNode(bridgetest::makeProp(QStringLiteral("Cup")));
+    scene->addNode(bridgetest::makeProp(QStringLiteral("Plate")));
+    ModelerRun run;
+    qunsetenv("FACETOR_QUIT_WHEN_DONE"); // a modeler that stays open for more work
+    TestBridge bridge;
+    scene->selectNode(scene->findNodeByLabel(QStringLiteral("Cup")));
+    bridge.executeAction();
+    ASSERT_TRUE(bridgetest::waitUntil([&] { return run.received() == QStringList{"Cup"}; }, 10000))
+        << run.log().toStdString();
+    // Long after the first request was answered, a second send is asked for again.
+    bridgetest::waitUntil([] { return false; }, 1200);
+    scene->selectNode(scene->findNodeByLabel(QStringLiteral("Plate")));
+    bridge.executeAction();
+    QElapsedTimer clock;
+    clock.start();
+    ASSERT_TRUE(bridgetest::waitUntil([&] { return run.received().size() == 2; }, 5000))
+        << run.log().toStdString();
+    EXPECT_LT(clock.elapsed(), 1500);
+    EXPECT_EQ(run.received(), (QStringList{"Cup", "Plate"}));
+    const qint64 pid = bridge.modelerProcessId();
+    bridge.closing(); // the host's goodbye ends the modeler
+    EXPECT_TRUE(bridgetest::waitUntil([&] { return bridgetest::processGone(pid); }, 5000));
 }

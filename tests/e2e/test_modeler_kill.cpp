@@ -74,8 +74,8 @@ private:
 
 // One moment to kill the modeler at: its checkpoint; whether the host has imported the
 // returned geometry by then (the modeler is killed only once it has); how many nodes a
-// restarted modeler receives (the one sent before the kill, when the dead modeler never took
-// it, and the new one); whether the modeler's goodbye has reached the host.
+// restarted modeler receives (the one sent before the kill, when the dead modeler never
+// acknowledged it, and the new one); whether the modeler's goodbye has reached the host.
 struct Moment {
     const char *point;
     bool imported;
@@ -93,14 +93,14 @@ const Moment kMoments[] = {
     {"post-idle-locked", false, 2, false},
     {"requested", false, 2, false},
     {"take-locked", false, 2, false},
-    {"node-attached", false, 1, false},
-    {"node-locked", false, 1, false},
-    {"node-read-locked", false, 1, false},
-    {"node-read", false, 1, false},
-    {"node-detached", false, 1, false},
-    {"node-released", false, 1, false},
-    {"node-received", false, 1, false},
-    {"post-ack-locked", false, 1, false},
+    {"node-attached", false, 2, false},
+    {"node-locked", false, 2, false},
+    {"node-read-locked", false, 2, false},
+    {"node-read", false, 2, false},
+    {"node-detached", false, 2, false},
+    {"node-released", false, 2, false},
+    {"node-received", false, 2, false},
+    {"post-ack-locked", false, 2, false},
     {"node-acknowledged", false, 1, false},
     {"return-created", false, 1, false},
     {"return-attached", false, 1, false},
@@ -133,7 +133,7 @@ private:
 
 QStringList leftovers() {
     return bridgetest::segmentFiles(kSgControlSegmentKey) +
-           bridgetest::segmentFiles(kSgDataSegmentKey);
+           bridgetest::segmentFiles(kSgDataSegmentKey) + bridgetest::segmentFiles(kSgHostLinkKey);
 }
 
 SgMorph *morphOn(SgNode *node) {
@@ -233,9 +233,13 @@ TEST_F(ModelerKill, HostStaysResponsiveAndARestartedModelerWorks) {
             ASSERT_TRUE(modeler.kill());
             bridgetest::waitUntil([] { return false; }, 250);
 
-            // The bridge polls on until a goodbye; the scene holds only what was imported.
-            EXPECT_EQ(bridge.isActive(), !moment.goodbyeSeen);
-            EXPECT_EQ(bridge.pollTimer()->isActive(), !moment.goodbyeSeen);
+            // The bridge ends the link, with or without a goodbye; the scene holds only what
+            // was imported.
+            EXPECT_FALSE(bridge.isActive());
+            EXPECT_FALSE(bridge.pollTimer()->isActive());
+            EXPECT_EQ(sgApp->getMessageSink()->logLines().last(),
+                      moment.goodbyeSeen ? QStringLiteral("Facetor has quit.")
+                                         : QStringLiteral("Facetor has quit unexpectedly."));
             EXPECT_EQ(scene->getNodeCount(), nodes);
             EXPECT_EQ(modifierCount(cup), moment.imported ? 1 : 0);
         }
@@ -252,7 +256,7 @@ TEST_F(ModelerKill, HostStaysResponsiveAndARestartedModelerWorks) {
         morphOn(mug)->getValueChannel()->setValue(1.0f);
         EXPECT_NEAR(mug->getObject()->getCachedGeom()->getVertex(0).y, 5.0f + 5.0f, 1e-4);
         // The node of the broken exchange went to the restarted modeler when the dead one
-        // never had it, and came back once at most.
+        // never acknowledged it, and came back once at most.
         EXPECT_EQ(modifierCount(cup), moment.imported || moment.restartReceives == 2 ? 1 : 0);
         EXPECT_EQ(bridge.sendList().count(), 0);
         EXPECT_FALSE(bridge.isExchangeBusy());
@@ -312,13 +316,15 @@ TEST_F(ModelerKill, HostThatQuitsAfterAKilledModelerLeavesNothingBehind) {
     SgScene *scene = sgApp->getScene();
     scene->addNode(bridgetest::makeProp(QStringLiteral("Cup"), {1, 2, 3}));
     SgNode *cup = scene->getNode(0);
-    // The modeler dies attached to the node record the host holds, and is never uncounted.
+    // The modeler dies attached to the node record the host holds, and is never uncounted;
+    // the host quits before its poll has noticed.
     {
         TestBridge bridge;
         ModelerKiller modeler(send(bridge, cup, "node-locked", 1));
         ASSERT_TRUE(bridgetest::waitUntil(
             [&] { return log().contains(QStringLiteral("paused node-locked\n")); }, 5000))
             << log().toStdString();
+        bridge.pollTimer()->stop();
         ASSERT_TRUE(modeler.kill());
         EXPECT_TRUE(bridge.isExchangeBusy());
         ASSERT_FALSE(leftovers().isEmpty());

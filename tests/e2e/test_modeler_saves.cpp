@@ -195,6 +195,9 @@ TEST_F(ModelerSaves, EverySaveStyleGivesExactlyOneCompleteReturn) {
     });
     bridge.closing();
     ASSERT_TRUE(bridgetest::waitUntil([&] { return !bridge.isActive(); }, 10000));
+    EXPECT_TRUE(bridgetest::waitUntil(
+        [&] { return run.log().contains(QStringLiteral("quit: the host closed the link")); }, 5000))
+        << run.log().toStdString();
 }
 
 TEST_F(ModelerSaves, TheSettingsFileSetsUpALaunchedModelerAndTheEnvironmentOverridesIt) {
@@ -238,25 +241,25 @@ TEST(ModelerRelease, AReturnReleasedInFlightComesAgain) {
     ASSERT_TRUE(control.attach(SgSharedMemory::kReadWrite));
     const SgControlRecord fresh = SgControlRecord::fresh();
     std::memcpy(control.data(), &fresh, sizeof fresh);
-    auto take = [&](int &code) {
+    auto take = [&](SgModelerMessage &code) {
         if (!control.tryLock(25))
             return false;
         auto *record = reinterpret_cast<SgControlRecord *>(control.data());
         const bool waiting = record->toHostFlag == 0;
         if (waiting) {
-            code = record->toHostCode;
+            code = SgModelerMessage(record->toHostCode);
             record->toHostFlag = 1;
         }
         control.unlock();
         return waiting;
     };
-    auto post = [&](int code) {
+    auto post = [&](SgHostMessage code) {
         if (!control.tryLock(25))
             return false;
         auto *record = reinterpret_cast<SgControlRecord *>(control.data());
         const bool free = record->toModelerFlag == 1;
         if (free) {
-            record->toModelerCode = std::uint8_t(code);
+            record->toModelerCode = sgCodeByte(code);
             record->toModelerFlag = 0;
         }
         control.unlock();
@@ -277,11 +280,11 @@ TEST(ModelerRelease, AReturnReleasedInFlightComesAgain) {
     QElapsedTimer clock;
     clock.start();
     while (vertices == 0 && clock.elapsed() < 15000) {
-        int code = -1;
-        if (take(code) && code == SgModelerGeometryWritten) {
+        auto code = SgModelerMessage::NoMessage;
+        if (take(code) && code == SgModelerMessage::GeometryWritten) {
             if (++announcements == 1) {
                 // The first announcement is answered by asking the modeler to let go.
-                while (!post(SgHostSegmentBusy))
+                while (!post(SgHostMessage::SegmentBusy))
                     QThread::msleep(5);
                 continue;
             }
@@ -295,17 +298,18 @@ TEST(ModelerRelease, AReturnReleasedInFlightComesAgain) {
             data.detach();
             ASSERT_NE(read, nullptr);
             vertices = read->getGeometry()->getVertexCount();
-            while (!post(SgHostGeometryRead))
+            while (!post(SgHostMessage::GeometryRead))
                 QThread::msleep(5);
         }
-        post(SgHostIdle);
+        post(SgHostMessage::Idle);
         QThread::msleep(20);
     }
     EXPECT_EQ(announcements, 2) << readAll(dir.filePath(QStringLiteral("log"))).toStdString();
     EXPECT_EQ(vertices, 3);
-    while (!post(SgHostShuttingDown))
-        QThread::msleep(5);
+    // A signal ends it too, and its log says which.
+    modeler.terminate();
     EXPECT_TRUE(modeler.waitForFinished(5000));
+    EXPECT_TRUE(readAll(dir.filePath(QStringLiteral("log"))).contains("quit: signal SIGTERM"));
     control.detach();
     control.remove(SgSharedMemory::kRemoveUnlocked);
 }

@@ -7,13 +7,17 @@
 #include "exchange/sgreturnrecordwriter.h"
 #include "sgcore/geometry/sgpolymesh.h"
 #include "sgcore/geometry/sgpolyshape.h"
+#include "sgcore/materials/sgdefaultmaterial.h"
+#include "sgcore/properties/sgfloatproperty.h"
 
 #include <QDir>
 #include <QFile>
 
 #include <gtest/gtest.h>
 
+#include <cmath>
 #include <cstring>
+#include <limits>
 #include <memory>
 #include <random>
 #include <vector>
@@ -117,12 +121,19 @@ TEST_F(ExchangeRobustnessTest, BadCountsAndIndicesAreRejected) {
         {v, 0x7fffffff}, // vertex bytes overflow 32 bits and exceed the record
         {v, 0x15555556}, // 12 x count wraps to a small number in 32 bits
         {u, 0x20000001}, // 8 x count wraps
-        {m, -1},           {m, 0x7fffffff},
-        {f, 0x7fffffff},   {quad + 1, 2},      // material index not below the count
-        {quad + 1, -1},    {quad + 5, 6},      // vertex index = vertex count
-        {quad + 5, -1},    {quad + 9, 3},      // UV index = UV count
-        {quad + 9, -2},    {polygon + 5, 256}, // more corners than a polygon can have
-        {polygon + 5, -1}, {polygon + 5, 7},   // more corners than the record holds
+        {m, -1},
+        {m, 0x7fffffff},
+        {f, 0x7fffffff},
+        {quad + 5, 6}, // vertex index = vertex count
+        {quad + 5, -1},
+        {polygon + 5, 256}, // more corners than a polygon can have
+        {polygon + 5, -1},
+        {polygon + 5, 7}, // more corners than the record holds
+        // Values that are not finite numbers, or become infinite in host units.
+        {v + 4, 0x7fc00000},
+        {v + 8, 0x7f800000},
+        {v + 12, 0x7ef00000},
+        {u + 4 + 8, 0x7fc00000},
     };
     for (const auto &c : cases) {
         QByteArray bad = record;
@@ -131,6 +142,38 @@ TEST_F(ExchangeRobustnessTest, BadCountsAndIndicesAreRejected) {
         EXPECT_FALSE(readExact(bad)) << "at " << c.at << " value " << c.value;
         EXPECT_EQ(logLines(), QStringList{"Error reading memory map"});
     }
+}
+
+TEST_F(ExchangeRobustnessTest, IndicesOutsideTheReturnedListsAndNonFiniteStrengthsAreKept) {
+    // A modeler that returns fewer materials or UVs than its facets name keeps the edit: the
+    // facet falls back to material 0, the corner to no UV. Strengths that are not numbers are
+    // dropped.
+    std::unique_ptr<SgPolyMesh> mesh(makeMesh({{0, 0, 0}, {1, 0, 0}, {0, 1, 0}}, {{0, 0}}));
+    addFacet(*mesh, 0, {{0, 0}, {1, 0}, {2, 0}});
+    SgReturnMaterial odd;
+    odd.name = "odd";
+    odd.glossiness = std::numeric_limits<float>::quiet_NaN();
+    odd.opacity = std::numeric_limits<float>::infinity();
+    QByteArray record = SgReturnRecordWriter("few", *mesh, {odd}, "").toByteArray();
+    const qsizetype triangle = record.size() - 4 - 41;
+    ASSERT_EQ(record.at(triangle), 'T');
+    for (const auto &[at, value] : {std::pair{triangle + 1, 300},
+                                    {triangle + 9, 1},
+                                    {triangle + 21, -2},
+                                    {triangle + 33, 0x7fffffff}})
+        putInt(record, at, value);
+    auto shape = readExact(record);
+    ASSERT_TRUE(shape) << logLines().join('\n').toStdString();
+    expectSound(*shape);
+    const SgPolyMesh *back = shape->getPolyMesh();
+    ASSERT_EQ(back->getTriangleCount(), 1);
+    EXPECT_EQ(back->getTriangleMaterial(0), 0);
+    for (int corner = 0; corner < 3; ++corner)
+        EXPECT_EQ(back->getTriangleCorners(0)[corner].uv, -1);
+    auto *material = dynamic_cast<SgDefaultMaterial *>(shape->getMaterial(0));
+    ASSERT_TRUE(material);
+    EXPECT_TRUE(std::isfinite(material->getGlossinessStrength()));
+    EXPECT_FLOAT_EQ(material->getOpacityControl()->getValue(), 1.0f);
 }
 
 TEST_F(ExchangeRobustnessTest, FuzzSeedsAreValidRecords) {

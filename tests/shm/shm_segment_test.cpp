@@ -215,6 +215,54 @@ TEST(SgSharedMemory, RemoveUncountsAndWaitsForTheOthers) {
     EXPECT_FALSE(SgSharedMemory(key).exists());
 }
 
+TEST(SgSharedMemory, APeerKilledHoldingTheLockCostsOnlyBoundedWaits) {
+    const std::string key = uniqueKey("killheld");
+    SgSharedMemory memory(key);
+    ASSERT_TRUE(memory.create(16));
+    ASSERT_TRUE(memory.attach(SgSharedMemory::kReadWrite));
+    memory.setWaitLimit(50);
+    auto other = std::make_unique<SgSharedMemory>(key);
+    other->setWaitLimit(50);
+    ASSERT_TRUE(other->attach(SgSharedMemory::kReadWrite));
+    {
+        ShmPeerProcess peer;
+        ASSERT_TRUE(peer.ok("open " + key));
+        ASSERT_TRUE(peer.ok("attach 1"));
+        ASSERT_TRUE(peer.ok("lock"));
+        // While a live peer holds the lock, every call that locks gives up after the limit,
+        // destruction included (it lets go of every handle then).
+        const auto start = Clock::now();
+        EXPECT_FALSE(memory.lock());
+        EXPECT_FALSE(memory.detach());
+        EXPECT_EQ(memory.status(), SgSharedMemory::StatusLockFailed);
+        other.reset();
+        EXPECT_LT(msSince(start), 500);
+        EXPECT_TRUE(memory.isAttached());
+        peer.kill();
+    }
+    // Killed while holding it: the POSIX back-end gives the lock back, a Windows semaphore
+    // stays taken. Either way no call waits past its limit, and letting go without the lock
+    // closes every handle.
+    const auto start = Clock::now();
+    const bool relocked = memory.tryLock(50);
+    if (relocked)
+        memory.unlock();
+#ifdef _WIN32
+    EXPECT_FALSE(relocked);
+#else
+    EXPECT_TRUE(relocked);
+#endif
+    memory.detach();
+    EXPECT_TRUE(memory.remove(SgSharedMemory::kRemoveUnlocked));
+    EXPECT_LT(msSince(start), 400);
+    EXPECT_FALSE(SgSharedMemory(key).exists());
+    // With the last handle gone the key starts afresh, its lock free.
+    SgSharedMemory fresh(key);
+    ASSERT_TRUE(fresh.create(16));
+    EXPECT_TRUE(fresh.tryLock(0));
+    fresh.unlock();
+}
+
 TEST(SgControlRecord, FreshRecordHasBothSlotsFree) {
     const SgControlRecord fresh = SgControlRecord::fresh();
     unsigned char bytes[16];
