@@ -16,7 +16,11 @@
 #include <QElapsedTimer>
 #include <QTemporaryDir>
 
+#include "bench/support/sgbenchreport.h"
+
 #include <benchmark/benchmark.h>
+
+#include <cstdio>
 
 namespace {
 
@@ -107,7 +111,11 @@ void sendThroughModeler(benchmark::State &state) {
 
 } // namespace
 
-BENCHMARK(sendThroughModeler)->UseManualTime()->Iterations(3)->Unit(benchmark::kMillisecond);
+BENCHMARK(sendThroughModeler)
+    ->UseManualTime()
+    ->Iterations(1)
+    ->Repetitions(5)
+    ->Unit(benchmark::kMillisecond);
 
 int main(int argc, char **argv) {
     qputenv("QT_QPA_PLATFORM", "offscreen");
@@ -115,8 +123,12 @@ int main(int argc, char **argv) {
     QTemporaryDir settings;
     SgAppSettings::setFileName(settings.filePath(QStringLiteral("scenara.ini")));
     SgApp host;
-    benchmark::Initialize(&argc, argv);
-    benchmark::RunSpecifiedBenchmarks();
+    sgBenchInitialize(argc, argv);
+    SgBenchReporter reporter(SgBenchReporter::RealTime);
+    benchmark::RunSpecifiedBenchmarks(&reporter);
     benchmark::Shutdown();
+    std::printf("\nMedian of the repetitions against the floor of one node per poll:\n");
+    sgPrintRatio("send 20 nodes / 20 polls of 50 ms", reporter.median("sendThroughModeler"),
+                 kNodes * kPollMs / 1000.0, double(kNodes + 3) / kNodes);
     return 0;
 }

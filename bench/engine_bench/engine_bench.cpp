@@ -1,4 +1,4 @@
-// Morph engine benchmark. Every figure is a ratio of CPU times (steadier than wall time on a
+// Morph engine benchmark. Every figure is a ratio of median CPU times (steadier than wall time on a
 // shared machine) against a baseline measured in the same run:
 //   load/tinyobj      loadMorphForNode of a 1M-vertex OBJ target onto a 1M-vertex node, end to
 //                     end, against tinyobjloader only parsing the same file (triangulate off);
@@ -23,6 +23,8 @@
 #include <QApplication>
 #include <QFile>
 #include <QTemporaryDir>
+
+#include "bench/support/sgbenchreport.h"
 
 #include <benchmark/benchmark.h>
 #include <tiny_obj_loader.h>
@@ -194,60 +196,31 @@ void BM_GroupGeometry(benchmark::State &state) {
     }
 }
 
-BENCHMARK(BM_LoadMorphForNode)->Unit(benchmark::kMillisecond)->MinTime(2.0);
-BENCHMARK(BM_TinyObjParse)->Unit(benchmark::kMillisecond)->MinTime(2.0);
+BENCHMARK(BM_LoadMorphForNode)->Unit(benchmark::kMillisecond)->MinTime(0.5)->Repetitions(5);
+BENCHMARK(BM_TinyObjParse)->Unit(benchmark::kMillisecond)->MinTime(0.5)->Repetitions(5);
 BENCHMARK(BM_ComputeDeltas)->Arg(1)->Arg(0)->Unit(benchmark::kMicrosecond)->Repetitions(5);
 BENCHMARK(BM_PlainSubtraction)->Arg(1)->Arg(0)->Unit(benchmark::kMicrosecond)->Repetitions(5);
-BENCHMARK(BM_GroupGeometry)->Arg(10)->Arg(100)->Unit(benchmark::kMillisecond);
-
-// Keeps each benchmark's time per iteration so that the ratios can be printed at the end.
-class RatioReporter : public benchmark::ConsoleReporter {
-public:
-    void ReportRuns(const std::vector<Run> &runs) override {
-        for (const Run &run : runs) {
-            if (run.error_occurred || run.run_type != Run::RT_Iteration)
-                continue;
-            // The fastest repetition: the one least disturbed by other work on the machine.
-            const double t = run.GetAdjustedCPUTime();
-            auto it = times.find(run.benchmark_name());
-            if (it == times.end() || t < it->second)
-                times[run.benchmark_name()] = t;
-        }
-        ConsoleReporter::ReportRuns(runs);
-    }
-    std::map<std::string, double> times;
-};
-
-void printRatio(const RatioReporter &r, const char *label, const std::string &ours,
-                const std::string &baseline, double target) {
-    const auto a = r.times.find(ours);
-    const auto b = r.times.find(baseline);
-    if (a == r.times.end() || b == r.times.end() || b->second <= 0.0)
-        return;
-    const double ratio = a->second / b->second;
-    std::printf("%-44s %6.3f  (target %s %.2f) %s\n", label, ratio,
-                target >= 1.0 ? "<=" : "<=", target, ratio <= target ? "met" : "NOT MET");
-}
+BENCHMARK(BM_GroupGeometry)->Arg(10)->Arg(100)->Unit(benchmark::kMillisecond)->Repetitions(5);
 
 } // namespace
 
 int main(int argc, char **argv) {
     QApplication qt(argc, argv);
     SgApp app;
-    benchmark::Initialize(&argc, argv);
+    sgBenchInitialize(argc, argv);
     Fixture data;
     fixture = &data;
-    RatioReporter reporter;
+    SgBenchReporter reporter;
     benchmark::RunSpecifiedBenchmarks(&reporter);
-    std::printf("\nRatios (same run):\n");
-    printRatio(reporter, "loadMorphForNode / tinyobjloader parse",
-               "BM_LoadMorphForNode/min_time:2.000", "BM_TinyObjParse/min_time:2.000", 0.5);
-    printRatio(reporter, "computeDeltas / plain loop (all moved)", "BM_ComputeDeltas/1/repeats:5",
-               "BM_PlainSubtraction/1/repeats:5", 1.5);
-    printRatio(reporter, "computeDeltas / plain loop (tenth moved)", "BM_ComputeDeltas/0/repeats:5",
-               "BM_PlainSubtraction/0/repeats:5", 1.5);
-    printRatio(reporter, "group geometry 100 bones / 10 bones", "BM_GroupGeometry/100",
-               "BM_GroupGeometry/10", 1.5);
+    std::printf("\nRatios of the medians (same run):\n");
+    sgPrintRatio("loadMorphForNode / tinyobjloader parse", reporter.median("BM_LoadMorphForNode"),
+                 reporter.median("BM_TinyObjParse"), 0.5);
+    sgPrintRatio("computeDeltas / plain loop (all moved)", reporter.median("BM_ComputeDeltas/1"),
+                 reporter.median("BM_PlainSubtraction/1"), 1.5);
+    sgPrintRatio("computeDeltas / plain loop (tenth moved)", reporter.median("BM_ComputeDeltas/0"),
+                 reporter.median("BM_PlainSubtraction/0"), 1.5);
+    sgPrintRatio("group geometry 100 bones / 10 bones", reporter.median("BM_GroupGeometry/100"),
+                 reporter.median("BM_GroupGeometry/10"), 1.5);
     sgApp->getScene()->clear();
     benchmark::Shutdown();
     return 0;

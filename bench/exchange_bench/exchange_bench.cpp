@@ -14,6 +14,8 @@
 #include "sgcore/materials/sgdefaultmaterial.h"
 #include "sgcore/scene/sgnode.h"
 
+#include "bench/support/sgbenchreport.h"
+
 #include <benchmark/benchmark.h>
 
 #include <malloc.h>
@@ -22,7 +24,6 @@
 #include <cstring>
 #include <map>
 #include <memory>
-#include <string>
 #include <vector>
 
 namespace {
@@ -149,38 +150,15 @@ void BM_Memcpy(benchmark::State &state) {
     state.SetBytesProcessed(state.iterations() * std::int64_t(bytes));
 }
 
-BENCHMARK(BM_Memcpy)->Unit(benchmark::kMillisecond)->MinTime(1.0);
-BENCHMARK(BM_Write)->Arg(64)->Arg(1)->Arg(256)->Unit(benchmark::kMillisecond)->MinTime(1.0);
-BENCHMARK(BM_Read)->Unit(benchmark::kMillisecond)->MinTime(1.0);
-
-// Keeps each run's time per iteration to print the ratios at the end.
-class RatioReporter : public benchmark::ConsoleReporter {
-public:
-    void ReportRuns(const std::vector<Run> &runs) override {
-        ConsoleReporter::ReportRuns(runs);
-        for (const Run &run : runs)
-            if (run.run_type == Run::RT_Iteration && run.iterations > 0)
-                seconds[run.benchmark_name()] = run.cpu_accumulated_time / double(run.iterations);
-    }
-    // The time of the run whose name is `name` or starts with `name` and "/".
-    double secondsOf(const std::string &name) const {
-        for (const auto &[run, time] : seconds)
-            if (run == name || run.rfind(name + "/", 0) == 0)
-                return time;
-        return 0.0;
-    }
-    std::map<std::string, double> seconds;
-};
-
-void printRatio(const RatioReporter &r, const char *what, const std::string &a,
-                const std::string &b, double target) {
-    const double x = r.secondsOf(a), y = r.secondsOf(b);
-    if (x <= 0.0 || y <= 0.0)
-        return;
-    const double ratio = x / y;
-    std::printf("%-40s %6.2f  (target <= %.1f) %s\n", what, ratio, target,
-                ratio <= target ? "ok" : "MISSED");
-}
+BENCHMARK(BM_Memcpy)->Unit(benchmark::kMillisecond)->MinTime(0.3)->Repetitions(5);
+BENCHMARK(BM_Write)
+    ->Arg(64)
+    ->Arg(1)
+    ->Arg(256)
+    ->Unit(benchmark::kMillisecond)
+    ->MinTime(0.3)
+    ->Repetitions(5);
+BENCHMARK(BM_Read)->Unit(benchmark::kMillisecond)->MinTime(0.3)->Repetitions(5);
 
 } // namespace
 
@@ -189,13 +167,17 @@ int main(int argc, char **argv) {
     // mapped afresh (and page-faulted) for every record, as the memcpy baseline's buffers are.
     mallopt(M_MMAP_THRESHOLD, 1 << 30);
     mallopt(M_TRIM_THRESHOLD, 1 << 30);
-    benchmark::Initialize(&argc, argv);
-    RatioReporter reporter;
+    sgBenchInitialize(argc, argv);
+    SgBenchReporter reporter;
     benchmark::RunSpecifiedBenchmarks(&reporter);
-    std::printf("\nRatios of CPU time (the machine is shared; wall time is noise):\n");
-    printRatio(reporter, "(a) measure + write, 64 materials", "BM_Write/64", "BM_Memcpy", 2.0);
-    printRatio(reporter, "(b) read back into a shape", "BM_Read", "BM_Memcpy", 4.0);
-    printRatio(reporter, "(a) 256 materials against 1 material", "BM_Write/256", "BM_Write/1", 1.2);
+    std::printf("\nRatios of median CPU times (the machine is shared; wall time is noise):\n");
+    const double memcpyTime = reporter.median("BM_Memcpy");
+    sgPrintRatio("(a) measure + write, 64 materials / memcpy", reporter.median("BM_Write/64"),
+                 memcpyTime, 2.0);
+    sgPrintRatio("(b) read back into a shape / memcpy", reporter.median("BM_Read"), memcpyTime,
+                 4.0);
+    sgPrintRatio("(c) write, 256 materials / 1 material", reporter.median("BM_Write/256"),
+                 reporter.median("BM_Write/1"), 1.2);
     benchmark::Shutdown();
     return 0;
 }

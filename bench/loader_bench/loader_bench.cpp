@@ -28,11 +28,12 @@
 #include <QTemporaryDir>
 #include <QTextBrowser>
 
+#include "bench/support/sgbenchreport.h"
+
 #include <benchmark/benchmark.h>
 #include <tiny_obj_loader.h>
 
 #include <cstdio>
-#include <map>
 #include <string>
 #include <vector>
 
@@ -188,30 +189,9 @@ void BM_TinyObjRead(benchmark::State &state) {
     }
 }
 
-BENCHMARK(BM_DialogRun)->Unit(benchmark::kMillisecond)->Repetitions(3);
-BENCHMARK(BM_HostRead)->Unit(benchmark::kMillisecond)->Repetitions(3);
-BENCHMARK(BM_TinyObjRead)->Unit(benchmark::kMillisecond)->Repetitions(3);
-
-// Keeps the fastest repetition of each benchmark (the least disturbed by other work).
-class RatioReporter : public benchmark::ConsoleReporter {
-public:
-    void ReportRuns(const std::vector<Run> &runs) override {
-        for (const Run &run : runs) {
-            if (run.error_occurred || run.run_type != Run::RT_Iteration)
-                continue;
-            const double t = run.GetAdjustedCPUTime();
-            auto it = times.find(run.run_name.function_name);
-            if (it == times.end() || t < it->second)
-                times[run.run_name.function_name] = t;
-        }
-        ConsoleReporter::ReportRuns(runs);
-    }
-    double time(const std::string &name) const {
-        const auto it = times.find(name);
-        return it == times.end() ? 0.0 : it->second;
-    }
-    std::map<std::string, double> times;
-};
+BENCHMARK(BM_DialogRun)->Unit(benchmark::kMillisecond)->Repetitions(5);
+BENCHMARK(BM_HostRead)->Unit(benchmark::kMillisecond)->Repetitions(5);
+BENCHMARK(BM_TinyObjRead)->Unit(benchmark::kMillisecond)->Repetitions(5);
 
 } // namespace
 
@@ -221,20 +201,20 @@ int main(int argc, char **argv) {
         qputenv("QT_QPA_PLATFORM", "offscreen");
     QApplication qt(argc, argv);
     SgApp app;
-    benchmark::Initialize(&argc, argv);
+    sgBenchInitialize(argc, argv);
     Fixture data;
     fixture = &data;
-    RatioReporter reporter;
+    SgBenchReporter reporter;
     benchmark::RunSpecifiedBenchmarks(&reporter);
-    const double run = reporter.time("BM_DialogRun");
-    const double read = reporter.time("BM_HostRead");
-    const double tiny = reporter.time("BM_TinyObjRead");
+    const double run = reporter.median("BM_DialogRun");
+    const double read = reporter.median("BM_HostRead");
+    const double tiny = reporter.median("BM_TinyObjRead");
     if (run > 0 && read > 0 && tiny > 0) {
-        std::printf("\nSame run, %d targets of %d vertices onto a %d-bone figure:\n", kTargets,
-                    kBones * kBoneVertices, kBones);
-        std::printf("  time per target (dialog run)        %8.2f ms\n", run / kTargets);
-        std::printf("  reading per target (host importer)  %8.2f ms\n", read / kTargets);
-        std::printf("  reading per target (tinyobjloader)  %8.2f ms\n", tiny / kTargets);
+        std::printf("\nSame run, medians of 5, %d targets of %d vertices onto a %d-bone figure:\n",
+                    kTargets, kBones * kBoneVertices, kBones);
+        std::printf("  time per target (dialog run)        %8.2f ms\n", 1e3 * run / kTargets);
+        std::printf("  reading per target (host importer)  %8.2f ms\n", 1e3 * read / kTargets);
+        std::printf("  reading per target (tinyobjloader)  %8.2f ms\n", 1e3 * tiny / kTargets);
         std::printf("  share of the run spent reading       %7.1f %%\n", 100.0 * read / run);
         std::printf("  host read / tinyobjloader read       %8.3f\n", read / tiny);
         std::printf("  whole run / tinyobjloader read       %8.3f\n", run / tiny);

@@ -14,6 +14,8 @@
 #include "sgcore/scene/sgfigurewelder.h"
 #include "sgcore/scene/sgskeleton.h"
 
+#include "bench/support/sgbenchreport.h"
+
 #include <benchmark/benchmark.h>
 #include <tiny_obj_loader.h>
 
@@ -21,7 +23,6 @@
 #include <QDir>
 
 #include <cstdio>
-#include <map>
 #include <memory>
 #include <string>
 
@@ -133,26 +134,15 @@ void BM_WeldAndUnweld(benchmark::State &state) {
     state.counters["vertices"] = double(vertices);
 }
 
-BENCHMARK(BM_TinyObjLoader)->Unit(benchmark::kMillisecond)->Iterations(2);
-BENCHMARK(BM_SgObjReader)->Unit(benchmark::kMillisecond)->Iterations(2);
+BENCHMARK(BM_TinyObjLoader)->Unit(benchmark::kMillisecond)->Iterations(1)->Repetitions(5);
+BENCHMARK(BM_SgObjReader)->Unit(benchmark::kMillisecond)->Iterations(1)->Repetitions(5);
 BENCHMARK(BM_WeldAndUnweld)
     ->Unit(benchmark::kMillisecond)
     ->Args({10, 1000000})
     ->Args({100, 1000000})
     ->Args({100, 100000})
-    ->Iterations(3);
-
-// Keeps each run's real time per iteration so that the ratios can be printed at the end.
-class RatioReporter : public benchmark::ConsoleReporter {
-public:
-    void ReportRuns(const std::vector<Run> &runs) override {
-        for (const Run &r : runs) {
-            times[r.benchmark_name()] = r.GetAdjustedRealTime();
-        }
-        ConsoleReporter::ReportRuns(runs);
-    }
-    std::map<std::string, double> times;
-};
+    ->Iterations(1)
+    ->Repetitions(5);
 
 bool sameVertexOrder() {
     tinyobj::attrib_t attrib;
@@ -187,33 +177,21 @@ int main(int argc, char **argv) {
                 "/sg_obj_bench_grid.obj";
     writeGridObj(g_objPath);
 
-    benchmark::Initialize(&argc, argv);
-    RatioReporter reporter;
+    sgBenchInitialize(argc, argv);
+    SgBenchReporter reporter;
     benchmark::RunSpecifiedBenchmarks(&reporter);
 
-    auto t = [&](const char *name) {
-        auto it = reporter.times.find(name);
-        return it == reporter.times.end() ? 0.0 : it->second;
-    };
-    const double ours = t("BM_SgObjReader/iterations:2");
-    const double theirs = t("BM_TinyObjLoader/iterations:2");
-    if (ours > 0 && theirs > 0) {
-        std::printf("OBJ read: SgObjReader is %.2fx as fast as tinyobjloader (target >= 3)\n",
-                    theirs / ours);
+    std::printf("\nRatios of the medians (same run):\n");
+    const double theirs = reporter.median("BM_TinyObjLoader");
+    if (sgPrintRatio("OBJ read: tinyobjloader / SgObjReader", theirs,
+                     reporter.median("BM_SgObjReader"), 6.0, true))
         std::printf("OBJ read: same vertex order as tinyobjloader: %s\n",
                     sameVertexOrder() ? "yes" : "NO");
-    }
-    const double w10 = t("BM_WeldAndUnweld/10/1000000/iterations:3");
-    const double w100 = t("BM_WeldAndUnweld/100/1000000/iterations:3");
-    const double w100small = t("BM_WeldAndUnweld/100/100000/iterations:3");
-    if (w10 > 0 && w100 > 0 && w100small > 0) {
-        std::printf("Weld+unweld 1M vertices: 100 bones / 10 bones = %.2f (about 1 when the cost "
-                    "does not grow with bones)\n",
-                    w100 / w10);
-        std::printf("Weld+unweld 100 bones: 1M / 100k vertices = %.2f (about 10 when linear in "
-                    "vertices)\n",
-                    w100 / w100small);
-    }
+    const double w10 = reporter.median("BM_WeldAndUnweld/10/1000000");
+    const double w100 = reporter.median("BM_WeldAndUnweld/100/1000000");
+    sgPrintRatio("Weld+unweld 1M vertices: 100 bones / 10 bones", w100, w10, 1.5);
+    sgPrintRatio("Weld+unweld 100 bones: 1M / 100k vertices", w100,
+                 reporter.median("BM_WeldAndUnweld/100/100000"), 12.0);
     std::remove(g_objPath.c_str());
     benchmark::Shutdown();
     return 0;

@@ -6,13 +6,13 @@
 #include "exchange/shm/sgcontrolrecord.h"
 #include "exchange/shm/sgsharedmemory.h"
 
+#include "bench/support/sgbenchreport.h"
+
 #include <benchmark/benchmark.h>
 
-#include <chrono>
 #include <climits>
 #include <cstdio>
 #include <cstring>
-#include <map>
 #include <mutex>
 #include <string>
 #include <thread>
@@ -26,18 +26,6 @@
 extern char **environ;
 
 namespace {
-
-using Clock = std::chrono::steady_clock;
-
-// Nanoseconds per iteration of each benchmark's last run, for the closing ratios.
-std::map<std::string, double> g_nsPerIteration;
-
-void record(const char *name, benchmark::State &state, Clock::time_point start) {
-    if (state.iterations() == 0)
-        return;
-    const double ns = std::chrono::duration<double, std::nano>(Clock::now() - start).count();
-    g_nsPerIteration[name] = ns / static_cast<double>(state.iterations());
-}
 
 std::string selfPath() {
     char path[PATH_MAX] = {};
@@ -176,26 +164,22 @@ void BM_SegmentLockUnlock(benchmark::State &state) {
         state.SkipWithError("cannot create the segment");
         return;
     }
-    const auto start = Clock::now();
     for (auto _ : state) {
         memory.lock();
         memory.unlock();
     }
-    record("lock", state, start);
 }
-BENCHMARK(BM_SegmentLockUnlock);
+BENCHMARK(BM_SegmentLockUnlock)->Repetitions(5);
 
 void BM_StdMutexLockUnlock(benchmark::State &state) {
     std::mutex mutex;
-    const auto start = Clock::now();
     for (auto _ : state) {
         mutex.lock();
         benchmark::DoNotOptimize(&mutex);
         mutex.unlock();
     }
-    record("mutex", state, start);
 }
-BENCHMARK(BM_StdMutexLockUnlock);
+BENCHMARK(BM_StdMutexLockUnlock)->Repetitions(5);
 
 void BM_ControlRoundTripSegment(benchmark::State &state) {
     SgSharedMemory memory(benchKey("control"));
@@ -208,7 +192,6 @@ void BM_ControlRoundTripSegment(benchmark::State &state) {
     std::memcpy(memory.data(), &fresh, sizeof fresh);
     const pid_t peer = startPeer("--echo-segment", memory.key(), nullptr, nullptr);
     std::int32_t sequence = 0;
-    const auto start = Clock::now();
     for (auto _ : state) {
         postToModeler(memory, SgHostMessage::NodeWritten, ++sequence);
         if (takeFromModeler(memory) != sequence) {
@@ -216,19 +199,17 @@ void BM_ControlRoundTripSegment(benchmark::State &state) {
             break;
         }
     }
-    record("segment", state, start);
     postToModeler(memory, SgHostMessage::ShuttingDown, 0);
     takeFromModeler(memory);
     waitpid(peer, nullptr, 0);
 }
-BENCHMARK(BM_ControlRoundTripSegment)->UseRealTime();
+BENCHMARK(BM_ControlRoundTripSegment)->UseRealTime()->Repetitions(5);
 
 void BM_ControlRoundTripPipe(benchmark::State &state) {
     int toPeer = -1;
     int fromPeer = -1;
     const pid_t peer = startPeer("--echo-pipe", "", &toPeer, &fromPeer);
     char message[16] = {};
-    const auto start = Clock::now();
     for (auto _ : state) {
         if (write(toPeer, message, sizeof message) != static_cast<ssize_t>(sizeof message)) {
             state.SkipWithError("pipe write failed");
@@ -243,20 +224,11 @@ void BM_ControlRoundTripPipe(benchmark::State &state) {
         }
         ++message[0];
     }
-    record("pipe", state, start);
     close(toPeer);
     close(fromPeer);
     stopPeer(peer);
 }
-BENCHMARK(BM_ControlRoundTripPipe)->UseRealTime();
-
-void printRatio(const char *label, const char *measured, const char *baseline) {
-    const auto a = g_nsPerIteration.find(measured);
-    const auto b = g_nsPerIteration.find(baseline);
-    if (a != g_nsPerIteration.end() && b != g_nsPerIteration.end() && b->second > 0)
-        std::printf("%s: %.0f ns against %.0f ns, ratio %.2f\n", label, a->second, b->second,
-                    a->second / b->second);
-}
+BENCHMARK(BM_ControlRoundTripPipe)->UseRealTime()->Repetitions(5);
 
 } // namespace
 
@@ -265,10 +237,15 @@ int main(int argc, char **argv) {
         return echoThroughSegment(argv[2]);
     if (argc >= 2 && std::strcmp(argv[1], "--echo-pipe") == 0)
         return echoThroughPipe();
-    benchmark::Initialize(&argc, argv);
-    benchmark::RunSpecifiedBenchmarks();
+    sgBenchInitialize(argc, argv);
+    SgBenchReporter reporter(SgBenchReporter::RealTime);
+    benchmark::RunSpecifiedBenchmarks(&reporter);
     benchmark::Shutdown();
-    printRatio("segment lock+unlock vs std::mutex", "lock", "mutex");
-    printRatio("control round trip, segment vs pipe", "segment", "pipe");
+    std::printf("\nRatios of the medians of real time (same run):\n");
+    sgPrintRatio("segment lock+unlock / std::mutex", reporter.median("BM_SegmentLockUnlock"),
+                 reporter.median("BM_StdMutexLockUnlock"));
+    sgPrintRatio("control round trip, segment / pipe",
+                 reporter.median("BM_ControlRoundTripSegment"),
+                 reporter.median("BM_ControlRoundTripPipe"));
     return 0;
 }

@@ -243,27 +243,73 @@ std::vector<int32_t> SgPolyMesh::getFaceGroupVertices(int group) const {
 }
 
 std::vector<std::vector<int32_t>> SgPolyMesh::getAllFaceGroupVertices() const {
-    std::vector<std::vector<int32_t>> out(static_cast<size_t>(getFaceGroupCount()));
-    auto add = [&](int32_t group, const SgFaceCorner *c, size_t n) {
-        if (group >= 0 && size_t(group) < out.size()) {
-            for (size_t k = 0; k < n; ++k) {
-                out[size_t(group)].push_back(c[k].vertex);
-            }
+    const size_t groups = static_cast<size_t>(getFaceGroupCount());
+    std::vector<std::vector<int32_t>> out(groups);
+    // The corners' vertices bucketed by group (counted, then placed), with each group's
+    // lowest and highest vertex.
+    std::vector<size_t> start(groups + 1, 0);
+    std::vector<int32_t> low(groups, INT32_MAX), high(groups, -1);
+    auto forEachFacet = [&](auto &&visit) {
+        for (size_t i = 0; i < m_triGroups.size(); ++i) {
+            visit(m_triGroups[i], &m_triCorners[i * 3], size_t(3));
+        }
+        for (size_t i = 0; i < m_quadGroups.size(); ++i) {
+            visit(m_quadGroups[i], &m_quadCorners[i * 4], size_t(4));
+        }
+        for (size_t i = 0; i < m_polyGroups.size(); ++i) {
+            visit(m_polyGroups[i], &m_polyCorners[m_polyStarts[i]],
+                  size_t(m_polyStarts[i + 1] - m_polyStarts[i]));
         }
     };
-    for (size_t i = 0; i < m_triGroups.size(); ++i) {
-        add(m_triGroups[i], &m_triCorners[i * 3], 3);
+    forEachFacet([&](int32_t group, const SgFaceCorner *c, size_t n) {
+        if (group >= 0 && size_t(group) < groups) {
+            start[size_t(group) + 1] += n;
+            for (size_t k = 0; k < n; ++k) {
+                low[size_t(group)] = std::min(low[size_t(group)], c[k].vertex);
+                high[size_t(group)] = std::max(high[size_t(group)], c[k].vertex);
+            }
+        }
+    });
+    for (size_t g = 0; g < groups; ++g) {
+        start[g + 1] += start[g];
     }
-    for (size_t i = 0; i < m_quadGroups.size(); ++i) {
-        add(m_quadGroups[i], &m_quadCorners[i * 4], 4);
-    }
-    for (size_t i = 0; i < m_polyGroups.size(); ++i) {
-        add(m_polyGroups[i], &m_polyCorners[m_polyStarts[i]],
-            m_polyStarts[i + 1] - m_polyStarts[i]);
-    }
-    for (std::vector<int32_t> &list : out) {
-        std::sort(list.begin(), list.end());
-        list.erase(std::unique(list.begin(), list.end()), list.end());
+    std::vector<int32_t> corners(start[groups]);
+    std::vector<size_t> next(start.begin(), start.end() - 1);
+    forEachFacet([&](int32_t group, const SgFaceCorner *c, size_t n) {
+        if (group >= 0 && size_t(group) < groups) {
+            for (size_t k = 0; k < n; ++k) {
+                corners[next[size_t(group)]++] = c[k].vertex;
+            }
+        }
+    });
+    // Each group's vertices in ascending order, each once: marked in a byte per vertex of the
+    // group's span and read back in order when the span is not much wider than the group's
+    // corners (as with a figure's bones), sorted otherwise. Linear in the corners either way.
+    std::vector<uint8_t> marks;
+    for (size_t g = 0; g < groups; ++g) {
+        const int32_t *first = corners.data() + start[g];
+        const int32_t *last = corners.data() + start[g + 1];
+        std::vector<int32_t> &list = out[g];
+        if (first == last) {
+            continue;
+        }
+        const size_t span = size_t(high[g] - low[g]) + 1;
+        if (span > 4 * size_t(last - first)) {
+            list.assign(first, last);
+            std::sort(list.begin(), list.end());
+            list.erase(std::unique(list.begin(), list.end()), list.end());
+            continue;
+        }
+        marks.assign(span, 0);
+        for (const int32_t *v = first; v != last; ++v) {
+            marks[size_t(*v - low[g])] = 1;
+        }
+        list.reserve(span);
+        for (size_t i = 0; i < span; ++i) {
+            if (marks[i]) {
+                list.push_back(low[g] + int32_t(i));
+            }
+        }
     }
     return out;
 }

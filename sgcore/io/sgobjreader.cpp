@@ -3,12 +3,14 @@
 #include "sgcore/geometry/sgpolymesh.h"
 #include "sgcore/geometry/sgpolyshape.h"
 #include "sgcore/io/sgfileio.h"
+#include "sgcore/io/sgobjplainline.h"
 #include "sgcore/materials/sgdefaultmaterial.h"
 
 #include <QFile>
 #include <QHash>
 
 #include <algorithm>
+#include <array>
 #include <charconv>
 #include <cmath>
 #include <cstdint>
@@ -39,6 +41,45 @@ bool isIgnoredStatement(std::string_view k) {
     return false;
 }
 
+// Powers of ten that doubles hold exactly.
+constexpr double kPowersOfTen[] = {1e0, 1e1, 1e2,  1e3,  1e4,  1e5,  1e6,  1e7,
+                                   1e8, 1e9, 1e10, 1e11, 1e12, 1e13, 1e14, 1e15};
+
+// The common short forms of an OBJ number ("-0.125", "12", "3.000000": at most 15 digits, no
+// exponent) to the float std::from_chars gives, that is correctly rounded, in a few
+// instructions. The digits make an exact double and one division by an exact power of ten
+// rounds it correctly; rounding that double to float is then correct unless it lies exactly
+// halfway between two floats. Returns the end of the number, or null when the text needs the
+// general parser (other forms, and that halfway case).
+const char *parseShortDecimal(const char *p, const char *end, float &out) {
+    const bool negative = p < end && *p == '-';
+    p += negative;
+    std::uint64_t mantissa = 0;
+    const char *digits = p;
+    while (p < end && static_cast<unsigned>(*p - '0') < 10)
+        mantissa = mantissa * 10 + static_cast<unsigned>(*p++ - '0');
+    int integerDigits = int(p - digits);
+    int fractionDigits = 0;
+    if (p < end && *p == '.') {
+        const char *fraction = ++p;
+        while (p < end && static_cast<unsigned>(*p - '0') < 10)
+            mantissa = mantissa * 10 + static_cast<unsigned>(*p++ - '0');
+        fractionDigits = int(p - fraction);
+    }
+    if (integerDigits + fractionDigits == 0 || integerDigits + fractionDigits > 15 ||
+        (p < end && (*p | 0x20) == 'e'))
+        return nullptr;
+    const double value = double(mantissa) / kPowersOfTen[fractionDigits];
+    std::uint64_t bits = 0;
+    std::memcpy(&bits, &value, sizeof bits);
+    // The 29 bits a double has beyond a float's 24: exactly a half there is the one case in
+    // which the double's own rounding may have decided the float's.
+    if ((bits & 0x1FFFFFFFu) == 0x10000000u)
+        return nullptr;
+    out = negative ? -float(value) : float(value);
+    return p;
+}
+
 } // namespace
 
 // One reading run over a byte range.
@@ -50,13 +91,19 @@ public:
     bool run() {
         m_mesh = new SgPolyMesh;
         m_mesh->beginEdit(true);
+        // The plain lines are read a word at a time, up to this far from the end.
+        m_fastEnd = m_end - std::min<std::ptrdiff_t>(m_end - m_p, SgObjPlainLine::kReadAhead);
         while (m_p < m_end) {
+            if (m_p < m_fastEnd && readPlainLine()) {
+                continue;
+            }
             ++m_line;
             const char *eol =
                 static_cast<const char *>(std::memchr(m_p, '\n', size_t(m_end - m_p)));
             if (!eol) {
                 eol = m_end;
             }
+            m_lineStart = m_p;
             m_lineEnd = eol;
             if (!parseLine()) {
                 return fail();
@@ -78,6 +125,57 @@ public:
     }
 
 private:
+    // The common lines in their plain forms (see SgObjPlainLine); false, with nothing taken,
+    // for any other line, which then goes through the general reader.
+    bool readPlainLine() {
+        const char *p = m_p;
+        const char *next = nullptr;
+        if (p[0] == 'v' && p[1] == ' ') {
+            float xyz[3];
+            if ((next = SgObjPlainLine::vertex(p + 1, xyz))) {
+                m_vertices.emplace_back(xyz[0], xyz[1], xyz[2]);
+            }
+        } else if (p[0] == 'f' && p[1] == ' ') {
+            next = readPlainFace(p + 1);
+        } else if (p[0] == 'v' && p[1] == 't' && p[2] == ' ') {
+            float uv[2];
+            if ((next = SgObjPlainLine::uv(p + 2, uv))) {
+                m_uvs.push_back(SgVec2(uv[0], uv[1]));
+            }
+        }
+        if (!next) {
+            return false;
+        }
+        m_p = next;
+        ++m_line;
+        return true;
+    }
+
+    const char *readPlainFace(const char *p) {
+        int n = 0;
+        SgObjPlainLine::FaceIndexMax max;
+        const char *next = SgObjPlainLine::face(p, m_fastEnd, m_corners.data(), n, max);
+        // Faces before any material go through the general reader, which names "default".
+        if (!next || m_material < 0) {
+            return nullptr;
+        }
+        noteReference(max.vertex, m_maxVertexRef, m_maxVertexLine);
+        noteReference(max.uv, m_maxUVRef, m_maxUVLine);
+        noteReference(max.normal, m_maxNormalRef, m_maxNormalLine);
+        if (!m_facetsReserved) {
+            reserveFacets(size_t(n), size_t(next - m_p));
+        }
+        addFace(size_t(n));
+        return next;
+    }
+
+    void noteReference(std::uint32_t index, int64_t &maxRef, int &maxRefLine) const {
+        if (int64_t(index) > maxRef) {
+            maxRef = index;
+            maxRefLine = m_line + 1;
+        }
+    }
+
     bool fail() {
         delete m_mesh;
         m_mesh = nullptr;
@@ -124,6 +222,11 @@ private:
 
     bool parseFloat(float &out, const char *what) {
         skipSpace();
+        if (const char *e = parseShortDecimal(m_p, m_lineEnd, out);
+            e && (e == m_lineEnd || isSpace(*e))) {
+            m_p = e;
+            return true;
+        }
         const char *b = m_p;
         if (b < m_lineEnd && *b == '+') {
             ++b;
@@ -216,6 +319,29 @@ private:
     // largest forward reference for the check at the end of the file.
     bool parseIndex(int32_t &out, int64_t count, int64_t &maxRef, int &maxRefLine,
                     const char *what) {
+        // The usual form first: a positive index of up to nine digits, no sign.
+        if (m_p < m_lineEnd && static_cast<unsigned>(*m_p - '1') < 9) {
+            const char *p = m_p;
+            const char *limit = std::min(m_lineEnd, p + 9);
+            int32_t value = 0;
+            while (p < limit && static_cast<unsigned>(*p - '0') < 10)
+                value = value * 10 + (*p++ - '0');
+            if (p == m_lineEnd || static_cast<unsigned>(*p - '0') >= 10) {
+                m_p = p;
+                if (value > maxRef) {
+                    maxRef = value;
+                    maxRefLine = m_line;
+                }
+                out = value - 1;
+                return true;
+            }
+        }
+        return parseSignedIndex(out, count, maxRef, maxRefLine, what);
+    }
+
+    // Any index form: a sign, leading zeros, more digits (and the errors).
+    bool parseSignedIndex(int32_t &out, int64_t count, int64_t &maxRef, int &maxRefLine,
+                          const char *what) {
         bool negative = false;
         if (m_p < m_lineEnd && (*m_p == '-' || *m_p == '+')) {
             negative = *m_p == '-';
@@ -256,15 +382,16 @@ private:
     }
 
     bool parseFace() {
-        m_corners.clear();
+        size_t n = 0;
         const int64_t vcount = int64_t(m_vertices.size());
         const int64_t tcount = int64_t(m_uvs.size());
         while (!atLineEnd()) {
-            if (m_corners.size() >= size_t(SgPolyMesh::kMaxPolygonCorners)) {
+            if (n >= m_corners.size()) {
                 return error(QStringLiteral("face with more than %1 corners")
                                  .arg(SgPolyMesh::kMaxPolygonCorners));
             }
-            SgFaceCorner c;
+            SgFaceCorner &c = m_corners[n];
+            c = SgFaceCorner();
             if (!parseIndex(c.vertex, vcount, m_maxVertexRef, m_maxVertexLine, "vertex")) {
                 return false;
             }
@@ -286,43 +413,63 @@ private:
             if (m_p < m_lineEnd && !isSpace(*m_p) && *m_p != '#') {
                 return error(QStringLiteral("bad face corner"));
             }
-            m_corners.push_back(c);
+            ++n;
         }
-        if (m_corners.size() < 3) {
+        if (n < 3) {
             return error(QStringLiteral("face needs at least three corners"));
         }
         if (m_material < 0 && !useMaterial(QStringLiteral("default"))) {
             return false;
         }
-        addFace();
+        if (!m_facetsReserved) {
+            reserveFacets(n, size_t(m_lineEnd - m_lineStart) + 1);
+        }
+        addFace(n);
         return true;
     }
 
-    // Appends the collected corners; grows by doubling so that the copy stays inline.
-    static void appendCorners(std::vector<SgFaceCorner> &to,
-                              const std::vector<SgFaceCorner> &from) {
-        if (to.capacity() - to.size() < from.size()) {
-            to.reserve(std::max(to.capacity() * 2, to.size() + from.size()));
-        }
-        for (const SgFaceCorner &c : from) {
-            to.push_back(c);
+    // At the first face: room for the faces to come, so that the big arrays are not grown
+    // (copied and touched again) by doubling. The faces left are at most the bytes left over
+    // this line's length, and a closed mesh has about two triangles or one quad per vertex;
+    // the lower of the two is reserved (untouched room costs address space only), and a file
+    // with more faces grows the arrays as usual.
+    void reserveFacets(size_t n, size_t lineBytes) {
+        m_facetsReserved = true;
+        const size_t byBytes = size_t(m_end - m_p) / lineBytes + 1;
+        const size_t byVertices = (n == 3 ? 2 : 1) * m_vertices.size() + 1024;
+        const int facets = int(std::min({byBytes, byVertices, size_t(INT32_MAX / 256)}));
+        if (n == 3) {
+            m_mesh->reserveFacets(facets, 0, 0, 0);
+        } else if (n == 4) {
+            m_mesh->reserveFacets(0, facets, 0, 0);
+        } else {
+            m_mesh->reserveFacets(0, 0, facets, facets * int(n));
         }
     }
 
-    void addFace() {
-        const size_t n = m_corners.size();
+    // Appends `n` collected corners; grows by doubling so that the copy stays inline.
+    void appendCorners(std::vector<SgFaceCorner> &to, size_t n) {
+        if (to.capacity() - to.size() < n) {
+            to.reserve(std::max(to.capacity() * 2, to.size() + n));
+        }
+        for (size_t i = 0; i < n; ++i) {
+            to.push_back(m_corners[i]);
+        }
+    }
+
+    void addFace(size_t n) {
         const auto mat = static_cast<uint8_t>(m_material);
         if (n == 3) {
-            appendCorners(m_mesh->triangleCorners(), m_corners);
+            appendCorners(m_mesh->triangleCorners(), n);
             m_mesh->triangleMaterials().push_back(mat);
             m_mesh->triangleGroups().push_back(m_group);
         } else if (n == 4) {
-            appendCorners(m_mesh->quadCorners(), m_corners);
+            appendCorners(m_mesh->quadCorners(), n);
             m_mesh->quadMaterials().push_back(mat);
             m_mesh->quadGroups().push_back(m_group);
         } else {
             auto &corners = m_mesh->polygonCorners();
-            appendCorners(corners, m_corners);
+            appendCorners(corners, n);
             m_mesh->polygonStarts().push_back(static_cast<uint32_t>(corners.size()));
             m_mesh->polygonMaterials().push_back(mat);
             m_mesh->polygonGroups().push_back(m_group);
@@ -430,12 +577,15 @@ private:
     SgObjReader &m_owner;
     const char *m_p;
     const char *m_end;
+    const char *m_lineStart = nullptr;
     const char *m_lineEnd = nullptr;
+    const char *m_fastEnd = nullptr;
+    bool m_facetsReserved = false;
     QString m_source;
     SgPolyMesh *m_mesh = nullptr;
     std::vector<SgVec3> m_vertices;
     std::vector<SgVec2> m_uvs;
-    std::vector<SgFaceCorner> m_corners;
+    std::array<SgFaceCorner, SgPolyMesh::kMaxPolygonCorners> m_corners;
     QHash<QString, int> m_materialIndex;
     int64_t m_normalCount = 0;
     int64_t m_maxVertexRef = 0, m_maxUVRef = 0, m_maxNormalRef = 0;

@@ -1,5 +1,6 @@
 #include "sgcore/scene/sgfigurewelder.h"
 
+#include "sgcore/geometry/sgbox3.h"
 #include "sgcore/geometry/sgmodifier.h"
 #include "sgcore/geometry/sgobject.h"
 #include "sgcore/geometry/sgpolymesh.h"
@@ -211,6 +212,58 @@ void appendCarriers(SgPolyMesh &out, const std::vector<int32_t> &vertices, int32
     }
 }
 
+bool insideAny(const std::vector<SgBox3> &boxes, const SgVec3 &p) {
+    for (const SgBox3 &b : boxes) {
+        if (p.x >= b.min.x && p.x <= b.max.x && p.y >= b.min.y && p.y <= b.max.y &&
+            p.z >= b.min.z && p.z <= b.max.z) {
+            return true;
+        }
+    }
+    return false;
+}
+
+// For each bone, where its vertices can meet another bone's: the overlaps of its bounding box
+// with the other bones' boxes. A vertex outside all of them equals no vertex of another bone,
+// so it needs no probe of the position table, and welds exactly as before without one (the
+// table then holds only the vertices near seams, small enough to stay in the caches).
+template <typename Slices> std::vector<std::vector<SgBox3>> seamRegions(const Slices &slices) {
+    std::vector<SgBox3> boxes(slices.size());
+    for (size_t b = 0; b < slices.size(); ++b) {
+        const int32_t n = slices[b].base->getVertexCount();
+        for (int32_t i = 0; i < n; ++i) {
+            boxes[b].extend(slices[b].source[size_t(i)]);
+        }
+    }
+    std::vector<std::vector<SgBox3>> regions(slices.size());
+    for (size_t b = 0; b < slices.size(); ++b) {
+        for (size_t c = 0; c < slices.size(); ++c) {
+            SgBox3 overlap;
+            overlap.min = {std::max(boxes[b].min.x, boxes[c].min.x),
+                           std::max(boxes[b].min.y, boxes[c].min.y),
+                           std::max(boxes[b].min.z, boxes[c].min.z)};
+            overlap.max = {std::min(boxes[b].max.x, boxes[c].max.x),
+                           std::min(boxes[b].max.y, boxes[c].max.y),
+                           std::min(boxes[b].max.z, boxes[c].max.z)};
+            if (c != b && !overlap.isEmpty()) {
+                regions[b].push_back(overlap);
+            }
+        }
+    }
+    return regions;
+}
+
+template <typename Slices>
+size_t seamVertexCount(const Slices &slices, const std::vector<std::vector<SgBox3>> &regions) {
+    size_t count = 0;
+    for (size_t b = 0; b < slices.size(); ++b) {
+        const int32_t n = slices[b].base->getVertexCount();
+        for (int32_t i = 0; i < n && !regions[b].empty(); ++i) {
+            count += insideAny(regions[b], slices[b].source[size_t(i)]);
+        }
+    }
+    return count;
+}
+
 } // namespace
 
 SgFigureWelder::SgFigureWelder(SgSkeleton *figure, bool ignoreInvisible, bool weldGeometry,
@@ -291,13 +344,7 @@ void SgFigureWelder::build(SgSkeleton *figure, bool ignoreInvisible, bool weldGe
     wv.reserve(totalVertices);
     std::vector<int32_t> lastBone; // per welded vertex: the last bone slice that joined it
     lastBone.reserve(totalVertices);
-    PositionTable table(weldGeometry ? totalVertices : 0);
-    int32_t outStart = 0;
-    int32_t uvOffset = 0;
-    auto *uvList = new SgMap(SgMap::UVMap);
-    for (size_t b = 0; b < m_slices.size(); ++b) {
-        BoneSlice &s = m_slices[b];
-        const int32_t n = s.base->getVertexCount();
+    for (BoneSlice &s : m_slices) {
         if (s.hasMorphs) {
             SgVertexMesh *morphed = getMorphOnlyGeom(s.bone);
             s.morphedSource = morphed->vertices();
@@ -308,9 +355,20 @@ void SgFigureWelder::build(SgSkeleton *figure, bool ignoreInvisible, bool weldGe
         } else {
             s.source = s.base->getVertices();
         }
+    }
+    const std::vector<std::vector<SgBox3>> seams =
+        weldGeometry ? seamRegions(m_slices) : std::vector<std::vector<SgBox3>>(m_slices.size());
+    PositionTable table(weldGeometry ? seamVertexCount(m_slices, seams) : 0);
+    int32_t outStart = 0;
+    int32_t uvOffset = 0;
+    auto *uvList = new SgMap(SgMap::UVMap);
+    for (size_t b = 0; b < m_slices.size(); ++b) {
+        BoneSlice &s = m_slices[b];
+        const int32_t n = s.base->getVertexCount();
         std::vector<uint8_t> used(size_t(n), 0);
         forEachCorner(*s.base, [&](const SgFaceCorner &c) { used[size_t(c.vertex)] = 1; });
         s.weldIndex.assign(size_t(n), -1);
+        const std::vector<SgBox3> &meets = seams[b];
         for (int32_t i = 0; i < n; ++i) {
             if (!used[size_t(i)]) {
                 s.unused.push_back(i);
@@ -320,7 +378,7 @@ void SgFigureWelder::build(SgSkeleton *figure, bool ignoreInvisible, bool weldGe
             }
             const SgVec3 &p = s.source[size_t(i)];
             int32_t w = -1;
-            if (weldGeometry) {
+            if (weldGeometry && insideAny(meets, p)) {
                 const int32_t found = table.findOrAdd(p, static_cast<int32_t>(wv.size()));
                 if (found >= 0 && lastBone[size_t(found)] != int32_t(b)) {
                     w = found;

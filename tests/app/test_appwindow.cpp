@@ -298,6 +298,9 @@ TEST(AppWindow, PreferencesHoldTheModelerPathAndTheImportRoad) {
         auto *dialog = qobject_cast<SgPreferencesDlg *>(modal);
         ASSERT_NE(dialog, nullptr);
         EXPECT_EQ(dialog->windowTitle(), QStringLiteral("Preferences"));
+        const QString artifacts = qEnvironmentVariable("SG_TEST_ARTIFACTS", QDir::tempPath());
+        QDir().mkpath(artifacts);
+        dialog->grab().save(QDir(artifacts).filePath(QStringLiteral("scenara-preferences.png")));
         dialog->installPathEdit()->setText(QStringLiteral("/opt/facetor"));
         dialog->bridgeToolsBox()->setChecked(true);
         dialog->accept();

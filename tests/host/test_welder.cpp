@@ -178,3 +178,39 @@ TEST(HostWelder, OrderedBonesFollowTheFigureHierarchy) {
     EXPECT_EQ(w.getGeometry()->getFaceGroupName(0), QStringLiteral("bone1"));
     EXPECT_EQ(w.getGeometry()->getVertexCount(), 4 + 4 - 2);
 }
+
+// The face-group vertex lists that un-welding relies on: all groups at once (marked over each
+// group's span, or sorted when the group is sparse) give what each group gives alone.
+TEST(HostWelder, AllFaceGroupVerticesMatchEachGroupAlone) {
+    SgPolyMesh mesh;
+    mesh.beginEdit(true);
+    mesh.setVertexArray(2000);
+    const int dense = mesh.addFaceGroup(QStringLiteral("dense"));
+    const int sparse = mesh.addFaceGroup(QStringLiteral("sparse"));
+    const int shared = mesh.addFaceGroup(QStringLiteral("shared"));
+    mesh.addFaceGroup(QStringLiteral("empty"));
+    auto face = [&](int group, std::initializer_list<int> corners) {
+        mesh.setActiveFaceGroup(group);
+        mesh.startFace();
+        for (const int v : corners)
+            mesh.addFaceEdge(v);
+        mesh.finishFace();
+    };
+    for (int v = 10; v + 3 < 60; v += 2)
+        face(dense, {v + 3, v, v + 1, v + 2});
+    face(sparse, {1999, 0, 1000});
+    face(sparse, {5, 1999, 7, 1500, 3});
+    face(shared, {12, 11, 10});
+    face(-1, {100, 101, 102});
+    face(shared, {13, 1998, 12, 14});
+    mesh.finishEdit();
+
+    const std::vector<std::vector<int32_t>> all = mesh.getAllFaceGroupVertices();
+    ASSERT_EQ(all.size(), 4u);
+    for (int g = 0; g < 4; ++g)
+        EXPECT_EQ(all[size_t(g)], mesh.getFaceGroupVertices(g)) << g;
+    EXPECT_EQ(all[size_t(sparse)], (std::vector<int32_t>{0, 3, 5, 7, 1000, 1500, 1999}));
+    EXPECT_EQ(all[size_t(shared)], (std::vector<int32_t>{10, 11, 12, 13, 14, 1998}));
+    EXPECT_EQ(all[size_t(dense)].size(), 50u);
+    EXPECT_TRUE(all[3].empty());
+}
