@@ -13,6 +13,7 @@
 
 #include <bit>
 #include <cstring>
+#include <numeric>
 #include <unordered_set>
 
 // What the welder remembers of one bone.
@@ -130,32 +131,24 @@ SgFaceCorner remapCorner(const SgFaceCorner &c, int32_t vertex, int32_t uvCount,
     return out;
 }
 
-// Grows `v` by `n` default elements and returns a pointer to the first new one.
-template <typename T> T *grow(std::vector<T> &v, size_t n) {
-    const size_t old = v.size();
-    v.resize(old + n);
-    return v.data() + old;
-}
-
 // Appends `bone`'s facets to `out` with vertex indices mapped by `vertexOf`.
 template <typename V>
 void appendFacets(SgPolyMesh &out, const SgPolyMesh &bone, const std::vector<uint8_t> &materialMap,
                   int32_t group, int32_t uvOffset, V &&vertexOf) {
     const int32_t uvCount = bone.getUVCount();
+    // Appended one by one into the room reserveFor made: each byte is written once (a resize
+    // would write every new element twice).
     auto copyCorners = [&](const std::vector<SgFaceCorner> &from, std::vector<SgFaceCorner> &to) {
-        SgFaceCorner *dst = grow(to, from.size());
         for (const SgFaceCorner &c : from) {
-            *dst++ = remapCorner(c, vertexOf(c.vertex), uvCount, uvOffset);
+            to.push_back(remapCorner(c, vertexOf(c.vertex), uvCount, uvOffset));
         }
     };
     auto copyFacets = [&](const std::vector<uint8_t> &mats, std::vector<uint8_t> &toMats,
                           std::vector<int32_t> &toGroups) {
-        uint8_t *m = grow(toMats, mats.size());
         for (uint8_t local : mats) {
-            *m++ = local < materialMap.size() ? materialMap[local] : uint8_t(255);
+            toMats.push_back(local < materialMap.size() ? materialMap[local] : uint8_t(255));
         }
-        int32_t *g = grow(toGroups, mats.size());
-        std::fill(g, g + mats.size(), group);
+        toGroups.insert(toGroups.end(), mats.size(), group);
     };
     copyCorners(bone.triangleCorners(), out.triangleCorners());
     copyFacets(bone.triangleMaterials(), out.triangleMaterials(), out.triangleGroups());
@@ -429,6 +422,40 @@ std::vector<int32_t> SgFigureWelder::getWeldCounts() const {
 }
 
 SgVertexMesh *SgFigureWelder::unWeld(const SgVertexMesh *edited) const {
+    SgPolyMesh *out = unWeldVertices(edited);
+    if (!out) {
+        return nullptr;
+    }
+    const SgPolyMesh *welded = getGeometry();
+    if (const SgMap *uvs = welded->getUVList()) {
+        out->setUVList(new SgMap(*uvs));
+    }
+    reserveFor(*out, m_slices);
+    for (const BoneSlice &s : m_slices) {
+        const int32_t group = out->addFaceGroup(s.bone->getName());
+        appendFacets(*out, *s.base, s.materialMap, group, s.uvOffset,
+                     [&](int32_t v) { return v + s.outStart; });
+        appendCarriers(*out, s.unused, s.outStart, group);
+    }
+    return out;
+}
+
+SgVertexMesh *SgFigureWelder::unWeldVerticesAndGroups(const SgVertexMesh *edited) const {
+    SgPolyMesh *out = unWeldVertices(edited);
+    if (!out) {
+        return nullptr;
+    }
+    std::vector<int32_t> all;
+    for (const BoneSlice &s : m_slices) {
+        const int32_t group = out->addFaceGroup(s.bone->getName());
+        all.resize(s.weldIndex.size());
+        std::iota(all.begin(), all.end(), 0);
+        appendCarriers(*out, all, s.outStart, group);
+    }
+    return out;
+}
+
+SgPolyMesh *SgFigureWelder::unWeldVertices(const SgVertexMesh *edited) const {
     const SgPolyMesh *welded = getGeometry();
     if (!edited || edited->getVertexCount() != welded->getVertexCount()) {
         return nullptr;
@@ -458,16 +485,6 @@ SgVertexMesh *SgFigureWelder::unWeld(const SgVertexMesh *edited) const {
             }
             std::copy(temp.vertices().begin(), temp.vertices().end(), block);
         }
-    }
-    if (const SgMap *uvs = welded->getUVList()) {
-        out->setUVList(new SgMap(*uvs));
-    }
-    reserveFor(*out, m_slices);
-    for (const BoneSlice &s : m_slices) {
-        const int32_t group = out->addFaceGroup(s.bone->getName());
-        appendFacets(*out, *s.base, s.materialMap, group, s.uvOffset,
-                     [&](int32_t v) { return v + s.outStart; });
-        appendCarriers(*out, s.unused, s.outStart, group);
     }
     return out;
 }

@@ -407,7 +407,8 @@ void SgMorphLoader::createMorphForNodes(SgVertexMesh *geometry, const QList<SgNo
     if (!bones.isEmpty()) {
         SgFigureWelder welder(bones, m_ignoredInvisibleNodes, m_weldedGeometry,
                               m_removedUnusedVertices, m_fourthWeldFlag, 0);
-        SgVertexMesh *unwelded = welder.unWeld(geometry);
+        // The target is read for its vertices and face groups only.
+        SgVertexMesh *unwelded = welder.unWeldVerticesAndGroups(geometry);
         const bool usable = unwelded && (unwelded->getKind() == SgVertexMesh::VertexMeshKind ||
                                          unwelded->getKind() == SgVertexMesh::PolyMeshKind);
         if (unwelded && !usable)
