@@ -13,7 +13,6 @@
 
 #include <bit>
 #include <cstring>
-#include <numeric>
 #include <unordered_set>
 
 // What the welder remembers of one bone.
@@ -436,21 +435,6 @@ SgVertexMesh *SgFigureWelder::unWeld(const SgVertexMesh *edited) const {
         appendFacets(*out, *s.base, s.materialMap, group, s.uvOffset,
                      [&](int32_t v) { return v + s.outStart; });
         appendCarriers(*out, s.unused, s.outStart, group);
-    }
-    return out;
-}
-
-SgVertexMesh *SgFigureWelder::unWeldVerticesAndGroups(const SgVertexMesh *edited) const {
-    SgPolyMesh *out = unWeldVertices(edited);
-    if (!out) {
-        return nullptr;
-    }
-    std::vector<int32_t> all;
-    for (const BoneSlice &s : m_slices) {
-        const int32_t group = out->addFaceGroup(s.bone->getName());
-        all.resize(s.weldIndex.size());
-        std::iota(all.begin(), all.end(), 0);
-        appendCarriers(*out, all, s.outStart, group);
     }
     return out;
 }

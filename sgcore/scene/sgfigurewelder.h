@@ -88,10 +88,6 @@ public:
     // face group per bone. Null when `edited` is null or its vertex count differs from the
     // welded mesh's. O(total vertices + total corners).
     SgVertexMesh *unWeld(const SgVertexMesh *edited) const;
-    // The same vertices and face groups (each group's vertex set unchanged) without the bones'
-    // facets and UVs: each bone's group is carried by polygons over all of its vertices. What
-    // the morph engine reads of an un-welded target, for a quarter of the memory and time.
-    SgVertexMesh *unWeldVerticesAndGroups(const SgVertexMesh *edited) const;
 
     // The geometry of `node`'s current shape with the object's morph modifiers applied in
     // stack order: the base geometry itself when no morph modifier exists, otherwise a new
