@@ -407,8 +407,7 @@ void SgMorphLoader::createMorphForNodes(SgVertexMesh *geometry, const QList<SgNo
     if (!bones.isEmpty()) {
         SgFigureWelder welder(bones, m_ignoredInvisibleNodes, m_weldedGeometry,
                               m_removedUnusedVertices, m_fourthWeldFlag, 0);
-        // The target is read for its vertices and face groups only.
-        SgVertexMesh *unwelded = welder.unWeldVerticesAndGroups(geometry);
+        SgVertexMesh *unwelded = welder.unWeld(geometry);
         const bool usable = unwelded && (unwelded->getKind() == SgVertexMesh::VertexMeshKind ||
                                          unwelded->getKind() == SgVertexMesh::PolyMeshKind);
         if (unwelded && !usable)
