@@ -33,10 +33,15 @@ void SgBridgeWatch::check() {
         return;
     const QTimer *poll =
         m_bridge ? m_bridge->findChild<QTimer *>(QString(), Qt::FindDirectChildrenOnly) : nullptr;
-    // A return's dialog may still be open after the link has ended: its outcome comes first.
-    if (poll == nullptr || (!poll->isActive() && QApplication::activeModalWidget() == nullptr))
+    if (poll == nullptr) {
         finish(QStringLiteral("quit"));
-    else if (m_timeoutMs >= 0 && m_clock.elapsed() > m_timeoutMs)
+    } else if (!poll->isActive()) {
+        // A return read just before the link ended is imported from a queued call, and its
+        // dialog may still be open: its outcome comes first.
+        QCoreApplication::sendPostedEvents(m_bridge, QEvent::MetaCall);
+        if (!m_done && QApplication::activeModalWidget() == nullptr)
+            finish(QStringLiteral("quit"));
+    } else if (m_timeoutMs >= 0 && m_clock.elapsed() > m_timeoutMs)
         finish(QStringLiteral("timeout"));
 }
 

@@ -251,7 +251,8 @@ void BM_HostRoundTrip(benchmark::State &state) {
     state.counters["import_ms"] = 1e3 * import / n;
 }
 
-// The import's parts on their own, on the same returned geometry: un-weld, face groups, deltas.
+// The import's parts on their own, as the engine runs them on the same returned geometry: the
+// weld and un-weld, the bones' groups, the deltas.
 void BM_ImportParts(benchmark::State &state) {
     SgFigureWelder welder(g_figure, false, true, true, true);
     std::unique_ptr<SgPolyMesh> edited(welder.getGeometry()->clonePolyMesh());

@@ -1,10 +1,12 @@
 // Feeds arbitrary bytes to the returned-record reader as a segment of exactly that size.
-// Whatever it accepts must hold together: indices in range, a material for every facet.
+// Whatever it accepts must hold together: indices in range, a material for every facet,
+// finite coordinates.
 
 #include "exchange/sgexchangereader.h"
 #include "sgcore/geometry/sgpolymesh.h"
 #include "sgcore/geometry/sgpolyshape.h"
 
+#include <cmath>
 #include <cstdint>
 #include <cstdlib>
 #include <memory>
@@ -21,6 +23,11 @@ void checkShape(const SgPolyShape &shape) {
     const SgPolyMesh *mesh = shape.getPolyMesh();
     require(mesh != nullptr);
     require(mesh->validate());
+    // A coordinate that is not a finite number never reaches the host.
+    for (int i = 0; i < mesh->getVertexCount(); ++i) {
+        const SgVec3 v = mesh->getVertex(i);
+        require(std::isfinite(v.x) && std::isfinite(v.y) && std::isfinite(v.z));
+    }
     const int materials = shape.getMaterialCount();
     require(materials >= 1);
     for (const auto *kind :

@@ -130,32 +130,24 @@ SgFaceCorner remapCorner(const SgFaceCorner &c, int32_t vertex, int32_t uvCount,
     return out;
 }
 
-// Grows `v` by `n` default elements and returns a pointer to the first new one.
-template <typename T> T *grow(std::vector<T> &v, size_t n) {
-    const size_t old = v.size();
-    v.resize(old + n);
-    return v.data() + old;
-}
-
 // Appends `bone`'s facets to `out` with vertex indices mapped by `vertexOf`.
 template <typename V>
 void appendFacets(SgPolyMesh &out, const SgPolyMesh &bone, const std::vector<uint8_t> &materialMap,
                   int32_t group, int32_t uvOffset, V &&vertexOf) {
     const int32_t uvCount = bone.getUVCount();
+    // Appended one by one into the room reserveFor made: each byte is written once (a resize
+    // would write every new element twice).
     auto copyCorners = [&](const std::vector<SgFaceCorner> &from, std::vector<SgFaceCorner> &to) {
-        SgFaceCorner *dst = grow(to, from.size());
         for (const SgFaceCorner &c : from) {
-            *dst++ = remapCorner(c, vertexOf(c.vertex), uvCount, uvOffset);
+            to.push_back(remapCorner(c, vertexOf(c.vertex), uvCount, uvOffset));
         }
     };
     auto copyFacets = [&](const std::vector<uint8_t> &mats, std::vector<uint8_t> &toMats,
                           std::vector<int32_t> &toGroups) {
-        uint8_t *m = grow(toMats, mats.size());
         for (uint8_t local : mats) {
-            *m++ = local < materialMap.size() ? materialMap[local] : uint8_t(255);
+            toMats.push_back(local < materialMap.size() ? materialMap[local] : uint8_t(255));
         }
-        int32_t *g = grow(toGroups, mats.size());
-        std::fill(g, g + mats.size(), group);
+        toGroups.insert(toGroups.end(), mats.size(), group);
     };
     copyCorners(bone.triangleCorners(), out.triangleCorners());
     copyFacets(bone.triangleMaterials(), out.triangleMaterials(), out.triangleGroups());
@@ -297,8 +289,44 @@ SgFigureWelder::~SgFigureWelder() {
     }
 }
 
+SgPolyShape *SgFigureWelder::getShape() const {
+    complete();
+    return m_shape;
+}
+
 SgPolyMesh *SgFigureWelder::getGeometry() const {
+    complete();
     return m_shape->getPolyMesh();
+}
+
+SgMap *SgFigureWelder::joinedUVs() const {
+    SgMap *uvList = nullptr;
+    for (const BoneSlice &s : m_slices) {
+        if (const SgMap *uvs = s.base->getUVList(); uvs && uvs->getValueCount() > 0) {
+            if (!uvList) {
+                uvList = new SgMap(SgMap::UVMap);
+            }
+            uvList->values().insert(uvList->values().end(), uvs->values().begin(),
+                                    uvs->values().end());
+        }
+    }
+    return uvList;
+}
+
+void SgFigureWelder::complete() const {
+    if (m_complete) {
+        return;
+    }
+    m_complete = true;
+    SgPolyMesh *welded = m_shape->getPolyMesh();
+    welded->setUVList(joinedUVs());
+    // Facets, one face group per bone.
+    reserveFor(*welded, m_slices);
+    for (const BoneSlice &s : m_slices) {
+        const int32_t group = welded->addFaceGroup(s.bone->getName());
+        appendFacets(*welded, *s.base, s.materialMap, group, s.uvOffset,
+                     [&](int32_t v) { return s.weldIndex[size_t(v)]; });
+    }
 }
 
 void SgFigureWelder::build(SgSkeleton *figure, bool ignoreInvisible, bool weldGeometry,
@@ -361,7 +389,6 @@ void SgFigureWelder::build(SgSkeleton *figure, bool ignoreInvisible, bool weldGe
     PositionTable table(weldGeometry ? seamVertexCount(m_slices, seams) : 0);
     int32_t outStart = 0;
     int32_t uvOffset = 0;
-    auto *uvList = new SgMap(SgMap::UVMap);
     for (size_t b = 0; b < m_slices.size(); ++b) {
         BoneSlice &s = m_slices[b];
         const int32_t n = s.base->getVertexCount();
@@ -396,28 +423,13 @@ void SgFigureWelder::build(SgSkeleton *figure, bool ignoreInvisible, bool weldGe
         outStart += n;
         s.uvOffset = uvOffset;
         if (const SgMap *uvs = s.base->getUVList()) {
-            uvList->values().insert(uvList->values().end(), uvs->values().begin(),
-                                    uvs->values().end());
             uvOffset += uvs->getValueCount();
         }
-    }
-    if (uvOffset > 0) {
-        welded->setUVList(uvList);
-    } else {
-        delete uvList;
-    }
-
-    // Facets, one face group per bone.
-    reserveFor(*welded, m_slices);
-    for (const BoneSlice &s : m_slices) {
-        const int32_t group = welded->addFaceGroup(s.bone->getName());
-        appendFacets(*welded, *s.base, s.materialMap, group, s.uvOffset,
-                     [&](int32_t v) { return s.weldIndex[size_t(v)]; });
     }
 }
 
 std::vector<int32_t> SgFigureWelder::getWeldCounts() const {
-    std::vector<int32_t> counts(size_t(getGeometry()->getVertexCount()), 0);
+    std::vector<int32_t> counts(size_t(m_shape->getPolyMesh()->getVertexCount()), 0);
     for (const BoneSlice &s : m_slices) {
         for (int32_t w : s.weldIndex) {
             if (w >= 0) {
@@ -429,7 +441,23 @@ std::vector<int32_t> SgFigureWelder::getWeldCounts() const {
 }
 
 SgVertexMesh *SgFigureWelder::unWeld(const SgVertexMesh *edited) const {
-    const SgPolyMesh *welded = getGeometry();
+    SgPolyMesh *out = unWeldVertices(edited);
+    if (!out) {
+        return nullptr;
+    }
+    out->setUVList(joinedUVs());
+    reserveFor(*out, m_slices);
+    for (const BoneSlice &s : m_slices) {
+        const int32_t group = out->addFaceGroup(s.bone->getName());
+        appendFacets(*out, *s.base, s.materialMap, group, s.uvOffset,
+                     [&](int32_t v) { return v + s.outStart; });
+        appendCarriers(*out, s.unused, s.outStart, group);
+    }
+    return out;
+}
+
+SgPolyMesh *SgFigureWelder::unWeldVertices(const SgVertexMesh *edited) const {
+    const SgPolyMesh *welded = m_shape->getPolyMesh();
     if (!edited || edited->getVertexCount() != welded->getVertexCount()) {
         return nullptr;
     }
@@ -458,16 +486,6 @@ SgVertexMesh *SgFigureWelder::unWeld(const SgVertexMesh *edited) const {
             }
             std::copy(temp.vertices().begin(), temp.vertices().end(), block);
         }
-    }
-    if (const SgMap *uvs = welded->getUVList()) {
-        out->setUVList(new SgMap(*uvs));
-    }
-    reserveFor(*out, m_slices);
-    for (const BoneSlice &s : m_slices) {
-        const int32_t group = out->addFaceGroup(s.bone->getName());
-        appendFacets(*out, *s.base, s.materialMap, group, s.uvOffset,
-                     [&](int32_t v) { return v + s.outStart; });
-        appendCarriers(*out, s.unused, s.outStart, group);
     }
     return out;
 }

@@ -249,7 +249,8 @@ TEST_F(ModelerKill, HostStaysResponsiveAndARestartedModelerWorks) {
         SgNode *mug = scene->getNode(scene->getNodeCount() - 1);
         const int steps = poll.steps();
         ModelerKiller restarted(send(bridge, mug, QByteArray(), moment.restartReceives));
-        ASSERT_TRUE(bridgetest::waitUntil([&] { return !bridge.isActive(); }, 10000))
+        ASSERT_TRUE(bridgetest::waitUntil(
+            [&] { return !bridge.isActive() && bridge.pendingImports() == 0; }, 10000))
             << log().toStdString();
         EXPECT_GT(poll.steps(), steps);
         ASSERT_NE(morphOn(mug), nullptr) << log().toStdString();
@@ -302,7 +303,8 @@ TEST_F(ModelerKill, AtRandomMomentsTheSceneGetsAWholeMorphOrNothing) {
         SgNode *mug = scene->getNode(scene->getNodeCount() - 1);
         ModelerKiller restarted(send(bridge, mug, QByteArray(), 0));
         qputenv("FACETOR_PAUSE_JITTER_MS", "15");
-        ASSERT_TRUE(bridgetest::waitUntil([&] { return !bridge.isActive(); }, 10000))
+        ASSERT_TRUE(bridgetest::waitUntil(
+            [&] { return !bridge.isActive() && bridge.pendingImports() == 0; }, 10000))
             << log().toStdString();
         EXPECT_NE(morphOn(mug), nullptr) << log().toStdString();
         EXPECT_LE(modifierCount(cup), 1);
@@ -334,7 +336,8 @@ TEST_F(ModelerKill, HostThatQuitsAfterAKilledModelerLeavesNothingBehind) {
     // A host started afresh in the same process links a new modeler and gets its node back.
     TestBridge bridge;
     ModelerKiller modeler(send(bridge, cup, QByteArray(), 1));
-    ASSERT_TRUE(bridgetest::waitUntil([&] { return !bridge.isActive(); }, 10000))
+    ASSERT_TRUE(bridgetest::waitUntil(
+        [&] { return !bridge.isActive() && bridge.pendingImports() == 0; }, 10000))
         << log().toStdString();
     EXPECT_NE(morphOn(cup), nullptr) << log().toStdString();
     EXPECT_TRUE(bridgetest::waitUntil([] { return leftovers().isEmpty(); }, 2000))

@@ -197,7 +197,8 @@ TEST_F(ModelerSaves, EverySaveStyleGivesExactlyOneCompleteReturn) {
         file.write(finished);
     });
     bridge.closing();
-    ASSERT_TRUE(bridgetest::waitUntil([&] { return !bridge.isActive(); }, 10000));
+    ASSERT_TRUE(bridgetest::waitUntil(
+        [&] { return !bridge.isActive() && bridge.pendingImports() == 0; }, 10000));
     EXPECT_TRUE(bridgetest::waitUntil(
         [&] { return run.log().contains(QStringLiteral("quit: the host closed the link")); }, 5000))
         << run.log().toStdString();
@@ -215,7 +216,8 @@ TEST_F(ModelerSaves, TheSettingsFileSetsUpALaunchedModelerAndTheEnvironmentOverr
     {
         TestBridge bridge;
         bridge.executeAction();
-        EXPECT_TRUE(bridgetest::waitUntil([&] { return !bridge.isActive(); }, 20000))
+        EXPECT_TRUE(bridgetest::waitUntil(
+            [&] { return !bridge.isActive() && bridge.pendingImports() == 0; }, 20000))
             << run.log().toStdString();
     }
     qunsetenv("FACETOR_WORKSPACE");
