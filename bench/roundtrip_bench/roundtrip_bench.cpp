@@ -252,7 +252,7 @@ void BM_HostRoundTrip(benchmark::State &state) {
 }
 
 // The import's parts on their own, as the engine runs them on the same returned geometry: the
-// weld and un-weld (vertices and face groups), the bones' groups, the deltas.
+// weld and un-weld, the bones' groups, the deltas.
 void BM_ImportParts(benchmark::State &state) {
     SgFigureWelder welder(g_figure, false, true, true, true);
     std::unique_ptr<SgPolyMesh> edited(welder.getGeometry()->clonePolyMesh());
@@ -263,7 +263,7 @@ void BM_ImportParts(benchmark::State &state) {
     for (auto _ : state) {
         double t0 = threadSeconds();
         SgFigureWelder boneWelder(bones, false, true, true, true, 0);
-        std::unique_ptr<SgVertexMesh> unwelded(boneWelder.unWeldVerticesAndGroups(edited.get()));
+        std::unique_ptr<SgVertexMesh> unwelded(boneWelder.unWeld(edited.get()));
         const double t1 = threadSeconds();
         SgMorphLoader loader;
         std::vector<SgVertexMesh *> targets;

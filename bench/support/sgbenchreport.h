@@ -76,21 +76,27 @@ public:
         for (const Run &run : runs) {
             if (run.error_occurred || run.run_type != Run::RT_Iteration || run.iterations <= 0)
                 continue;
-            const double total =
-                m_clock == CpuTime ? run.cpu_accumulated_time : run.real_accumulated_time;
-            m_samples[nameOf(run)].push_back(total / double(run.iterations));
+            m_samples[CpuTime][nameOf(run)].push_back(run.cpu_accumulated_time /
+                                                      double(run.iterations));
+            m_samples[RealTime][nameOf(run)].push_back(run.real_accumulated_time /
+                                                       double(run.iterations));
             for (const auto &[counter, value] : run.counters)
                 m_counters[nameOf(run) + "#" + counter].push_back(value.value);
         }
         ConsoleReporter::ReportRuns(runs);
     }
 
-    // Seconds per iteration of each repetition of `name`, in the order they ran.
-    std::vector<double> samples(const std::string &name) const {
-        const auto found = m_samples.find(name);
-        return found == m_samples.end() ? std::vector<double>() : found->second;
+    // Seconds per iteration of each repetition of `name`, in the order they ran, on the
+    // reporter's clock or on `clock`.
+    std::vector<double> samples(const std::string &name) const { return samples(name, m_clock); }
+    std::vector<double> samples(const std::string &name, Clock clock) const {
+        const auto found = m_samples[clock].find(name);
+        return found == m_samples[clock].end() ? std::vector<double>() : found->second;
     }
     double median(const std::string &name) const { return sgMedian(samples(name)); }
+    double median(const std::string &name, Clock clock) const {
+        return sgMedian(samples(name, clock));
+    }
     double fastest(const std::string &name) const { return sgFastest(samples(name)); }
     // The median over the repetitions of a benchmark's user counter (state.counters[counter]).
     double counterMedian(const std::string &name, const std::string &counter) const {
@@ -105,6 +111,6 @@ private:
     }
 
     Clock m_clock;
-    std::map<std::string, std::vector<double>> m_samples;
+    std::map<std::string, std::vector<double>> m_samples[2];
     std::map<std::string, std::vector<double>> m_counters;
 };

@@ -13,7 +13,6 @@
 
 #include <bit>
 #include <cstring>
-#include <numeric>
 #include <unordered_set>
 
 // What the welder remembers of one bone.
@@ -290,8 +289,44 @@ SgFigureWelder::~SgFigureWelder() {
     }
 }
 
+SgPolyShape *SgFigureWelder::getShape() const {
+    complete();
+    return m_shape;
+}
+
 SgPolyMesh *SgFigureWelder::getGeometry() const {
+    complete();
     return m_shape->getPolyMesh();
+}
+
+SgMap *SgFigureWelder::joinedUVs() const {
+    SgMap *uvList = nullptr;
+    for (const BoneSlice &s : m_slices) {
+        if (const SgMap *uvs = s.base->getUVList(); uvs && uvs->getValueCount() > 0) {
+            if (!uvList) {
+                uvList = new SgMap(SgMap::UVMap);
+            }
+            uvList->values().insert(uvList->values().end(), uvs->values().begin(),
+                                    uvs->values().end());
+        }
+    }
+    return uvList;
+}
+
+void SgFigureWelder::complete() const {
+    if (m_complete) {
+        return;
+    }
+    m_complete = true;
+    SgPolyMesh *welded = m_shape->getPolyMesh();
+    welded->setUVList(joinedUVs());
+    // Facets, one face group per bone.
+    reserveFor(*welded, m_slices);
+    for (const BoneSlice &s : m_slices) {
+        const int32_t group = welded->addFaceGroup(s.bone->getName());
+        appendFacets(*welded, *s.base, s.materialMap, group, s.uvOffset,
+                     [&](int32_t v) { return s.weldIndex[size_t(v)]; });
+    }
 }
 
 void SgFigureWelder::build(SgSkeleton *figure, bool ignoreInvisible, bool weldGeometry,
@@ -354,7 +389,6 @@ void SgFigureWelder::build(SgSkeleton *figure, bool ignoreInvisible, bool weldGe
     PositionTable table(weldGeometry ? seamVertexCount(m_slices, seams) : 0);
     int32_t outStart = 0;
     int32_t uvOffset = 0;
-    auto *uvList = new SgMap(SgMap::UVMap);
     for (size_t b = 0; b < m_slices.size(); ++b) {
         BoneSlice &s = m_slices[b];
         const int32_t n = s.base->getVertexCount();
@@ -389,28 +423,13 @@ void SgFigureWelder::build(SgSkeleton *figure, bool ignoreInvisible, bool weldGe
         outStart += n;
         s.uvOffset = uvOffset;
         if (const SgMap *uvs = s.base->getUVList()) {
-            uvList->values().insert(uvList->values().end(), uvs->values().begin(),
-                                    uvs->values().end());
             uvOffset += uvs->getValueCount();
         }
-    }
-    if (uvOffset > 0) {
-        welded->setUVList(uvList);
-    } else {
-        delete uvList;
-    }
-
-    // Facets, one face group per bone.
-    reserveFor(*welded, m_slices);
-    for (const BoneSlice &s : m_slices) {
-        const int32_t group = welded->addFaceGroup(s.bone->getName());
-        appendFacets(*welded, *s.base, s.materialMap, group, s.uvOffset,
-                     [&](int32_t v) { return s.weldIndex[size_t(v)]; });
     }
 }
 
 std::vector<int32_t> SgFigureWelder::getWeldCounts() const {
-    std::vector<int32_t> counts(size_t(getGeometry()->getVertexCount()), 0);
+    std::vector<int32_t> counts(size_t(m_shape->getPolyMesh()->getVertexCount()), 0);
     for (const BoneSlice &s : m_slices) {
         for (int32_t w : s.weldIndex) {
             if (w >= 0) {
@@ -426,10 +445,7 @@ SgVertexMesh *SgFigureWelder::unWeld(const SgVertexMesh *edited) const {
     if (!out) {
         return nullptr;
     }
-    const SgPolyMesh *welded = getGeometry();
-    if (const SgMap *uvs = welded->getUVList()) {
-        out->setUVList(new SgMap(*uvs));
-    }
+    out->setUVList(joinedUVs());
     reserveFor(*out, m_slices);
     for (const BoneSlice &s : m_slices) {
         const int32_t group = out->addFaceGroup(s.bone->getName());
@@ -440,23 +456,8 @@ SgVertexMesh *SgFigureWelder::unWeld(const SgVertexMesh *edited) const {
     return out;
 }
 
-SgVertexMesh *SgFigureWelder::unWeldVerticesAndGroups(const SgVertexMesh *edited) const {
-    SgPolyMesh *out = unWeldVertices(edited);
-    if (!out) {
-        return nullptr;
-    }
-    std::vector<int32_t> all;
-    for (const BoneSlice &s : m_slices) {
-        const int32_t group = out->addFaceGroup(s.bone->getName());
-        all.resize(s.weldIndex.size());
-        std::iota(all.begin(), all.end(), 0);
-        appendCarriers(*out, all, s.outStart, group);
-    }
-    return out;
-}
-
 SgPolyMesh *SgFigureWelder::unWeldVertices(const SgVertexMesh *edited) const {
-    const SgPolyMesh *welded = getGeometry();
+    const SgPolyMesh *welded = m_shape->getPolyMesh();
     if (!edited || edited->getVertexCount() != welded->getVertexCount()) {
         return nullptr;
     }

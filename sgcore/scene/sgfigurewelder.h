@@ -8,6 +8,7 @@
 
 class SgBone;
 class SgNode;
+class SgMap;
 class SgPolyMesh;
 class SgPolyShape;
 class SgSkeleton;
@@ -71,7 +72,7 @@ public:
 
     // The welded shape (owned by the welder): named after the figure's label, holding the
     // welded mesh and the figure's materials.
-    SgPolyShape *getShape() const { return m_shape; }
+    SgPolyShape *getShape() const;
     // The welded mesh (owned by the welder through its shape); never null, possibly empty.
     SgPolyMesh *getGeometry() const;
     // The bones of the weld, in welder order (after leaving out invisible ones).
@@ -88,10 +89,6 @@ public:
     // face group per bone. Null when `edited` is null or its vertex count differs from the
     // welded mesh's. O(total vertices + total corners).
     SgVertexMesh *unWeld(const SgVertexMesh *edited) const;
-    // The same vertices and face groups (each group's vertex set unchanged) without the bones'
-    // facets and UVs: each bone's group is carried by polygons over all of its vertices. What
-    // the morph engine reads of an un-welded target, for a quarter of the memory and time.
-    SgVertexMesh *unWeldVerticesAndGroups(const SgVertexMesh *edited) const;
 
     // The geometry of `node`'s current shape with the object's morph modifiers applied in
     // stack order: the base geometry itself when no morph modifier exists, otherwise a new
@@ -106,6 +103,11 @@ private:
     struct BoneSlice;
     // unWeld's vertices alone (null like unWeld).
     SgPolyMesh *unWeldVertices(const SgVertexMesh *edited) const;
+    // The bones' UV lists one after the other (null when none has UVs).
+    SgMap *joinedUVs() const;
+    // Gives the welded mesh its UVs and facets, once: an un-weld alone needs neither, so they
+    // are made only when the welded shape or mesh is asked for.
+    void complete() const;
     void build(SgSkeleton *figure, bool ignoreInvisible, bool weldGeometry, bool removeUnused);
 
     SgBoneList m_bones;
@@ -113,4 +115,5 @@ private:
     std::vector<int32_t> m_subdMap;
     std::vector<BoneSlice> m_slices;
     bool m_morphed = false;
+    mutable bool m_complete = false;
 };
