@@ -7,10 +7,12 @@
 
 #include <QCheckBox>
 #include <QComboBox>
+#include <QDialogButtonBox>
 #include <QGroupBox>
 #include <QHBoxLayout>
 #include <QLabel>
 #include <QLineEdit>
+#include <QPushButton>
 #include <QVBoxLayout>
 
 namespace {
@@ -73,6 +75,7 @@ SgBridgeMorphDlg::SgBridgeMorphDlg(const QString &label, QWidget *parent, SgNode
     m_groupCombo->setCurrentIndex(0);
 
     connect(m_actionCombo, &QComboBox::textActivated, this, &SgBridgeMorphDlg::actionChanged);
+    connect(m_nameEdit, &QLineEdit::textChanged, this, &SgBridgeMorphDlg::updateOkButton);
 
     setWindowTitle(tr("Action for ") + label);
     resize(minimumSizeHint().expandedTo(QSize(300, 100)));
@@ -92,6 +95,14 @@ void SgBridgeMorphDlg::actionChanged(const QString &) {
     m_groupCombo->setEnabled(morph);
     m_nameEdit->setEnabled(morph);
     m_overrideBox->setEnabled(morph);
+    updateOkButton();
+}
+
+void SgBridgeMorphDlg::updateOkButton() {
+    // A blank name would make a morph named "": a morph action needs a name.
+    const bool morph = m_action.contains(QLatin1String("Morph"));
+    if (QPushButton *ok = buttonBox()->button(QDialogButtonBox::Ok))
+        ok->setEnabled(!morph || !m_nameEdit->text().trimmed().isEmpty());
 }
 
 void SgBridgeMorphDlg::apply() {

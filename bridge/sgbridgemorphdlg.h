@@ -38,6 +38,9 @@ protected:
     void apply() override;
 
 private:
+    // "Ok" is enabled unless a morph action is chosen with a blank morph name.
+    void updateOkButton();
+
     QString m_morphName;
     QString m_groupPath;
     QString m_action;

@@ -101,9 +101,8 @@ void SgMaterialBlockReader::applyTo(SgShape &shape) const {
         if (SgFloatProperty *opacity = material->getOpacityControl())
             opacity->setValue(entry.opacity);
         material->setBumpStrength(entry.bumpStrength);
-        // The returned bump image maps "Bump Strength"; the diffuse map stays as it was.
-        if (SgTexture *image = imageFor(images, entry.bumpImage))
-            material->setBumpMap(image);
+        // A returned bump image is ignored: the host's material interface has no bump-map
+        // setter, and taking it as the colour map would replace the diffuse map.
         shape.addMaterial(material);
     }
     if (images)

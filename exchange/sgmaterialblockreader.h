@@ -33,7 +33,8 @@ public:
 
     // Adds one SgDefaultMaterial per parsed entry to `shape` (or one named "default" when the
     // block was empty): name, diffuse colour and colour map, specular colour, glossiness,
-    // opacity, bump strength and bump map. Image paths become textures of the application's
+    // opacity and bump strength. A returned bump image is ignored (the host's material
+    // interface has no bump-map setter). Image paths become textures of the application's
     // image manager, which is refreshed afterwards. Needs `sgApp` for images.
     void applyTo(SgShape &shape) const;
 

@@ -10,13 +10,12 @@
 #include "sgcore/properties/sgcolorproperty.h"
 #include "sgcore/properties/sgfloatproperty.h"
 
+#include <QCryptographicHash>
+#include <QDateTime>
 #include <QDir>
 #include <QFile>
 #include <QFileInfo>
-#include <QHash>
 #include <QImage>
-#include <QMutex>
-#include <QMutexLocker>
 
 #include <algorithm>
 
@@ -25,43 +24,29 @@ namespace {
 // The fixed bytes of a host entry (six tags, eight floats) plus its five string counts.
 constexpr std::int64_t kEntryFixedBytes = 42 + 5 * 4;
 
-// Which image file each copy path was written from, in this process.
-struct CopyRegistry {
-    QMutex mutex;
-    QHash<QString, QString> sourceOfCopy;
-};
-
-CopyRegistry &copyRegistry() {
-    static CopyRegistry registry;
-    return registry;
-}
-
-QString sourceKey(const SgTexture *texture) {
-    return QDir::cleanPath(QFileInfo(texture->getFileName()).absoluteFilePath());
-}
-
 QString copyFolder() {
     return (sgApp ? sgApp->getTempPath() : QDir::tempPath()) + QStringLiteral("/FacetorMaps");
 }
 
-QString plainCopyPath(const SgTexture *texture) {
-    return copyFolder() + QLatin1Char('/') + SgFileIO::getBaseFileName(texture->getFileName()) +
-           QStringLiteral(".jpg");
+// The base name with every character other than ASCII letters, digits, '-', '_' and '.'
+// replaced by '_', at most 64 characters: the modeler opens the copy through an 8-bit path.
+QString asciiBaseName(const QString &fileName) {
+    QString name = SgFileIO::getBaseFileName(fileName).left(64);
+    for (QChar &c : name) {
+        const char16_t u = c.unicode();
+        const bool plain = (u >= 'a' && u <= 'z') || (u >= 'A' && u <= 'Z') ||
+                           (u >= '0' && u <= '9') || u == '-' || u == '_' || u == '.';
+        if (!plain)
+            c = QLatin1Char('_');
+    }
+    return name.isEmpty() ? QStringLiteral("image") : name;
 }
 
-QString suffixedCopyPath(const SgTexture *texture) {
-    const QString suffix =
-        QStringLiteral("-%1").arg(qHash(sourceKey(texture)) & 0xffffffffu, 8, 16, QLatin1Char('0'));
-    return copyFolder() + QLatin1Char('/') + SgFileIO::getBaseFileName(texture->getFileName()) +
-           suffix + QStringLiteral(".jpg");
-}
-
-// Records that the copy at `target` stands for `texture`'s image file (first source wins).
-void rememberSource(const QString &target, const SgTexture *texture) {
-    CopyRegistry &registry = copyRegistry();
-    QMutexLocker locker(&registry.mutex);
-    if (!registry.sourceOfCopy.contains(target))
-        registry.sourceOfCopy.insert(target, sourceKey(texture));
+// Eight hex digits of a hash of the image's absolute path, the same in every run.
+QString sourceHash(const QString &fileName) {
+    const QString source = QDir::cleanPath(QFileInfo(fileName).absoluteFilePath());
+    return QString::fromLatin1(
+        QCryptographicHash::hash(source.toUtf8(), QCryptographicHash::Sha1).toHex().left(8));
 }
 
 // A colour or float property of `material` named `name`, or null when missing or of another
@@ -80,8 +65,7 @@ std::int64_t imageStringBytes(const SgTexture *texture) {
     if (!texture)
         return 0;
     return SgFileIO::getFilePath(texture->getFileName()).size() +
-           SgMaterialBlockWriter::jpegCopyPath(texture).size() +
-           SgMaterialBlockWriter::kCopySuffixLength;
+           SgMaterialBlockWriter::jpegCopyPath(texture).size();
 }
 
 void putColor(SgRecordOutput &output, const SgColorProperty *property) {
@@ -159,23 +143,19 @@ std::int64_t SgMaterialBlockWriter::write(const SgShape &shape, SgRecordOutput &
 }
 
 QString SgMaterialBlockWriter::jpegCopyPath(const SgTexture *texture) {
-    const QString plain = plainCopyPath(texture);
-    CopyRegistry &registry = copyRegistry();
-    QMutexLocker locker(&registry.mutex);
-    const auto known = registry.sourceOfCopy.constFind(plain);
-    if (known == registry.sourceOfCopy.cend() || *known == sourceKey(texture))
-        return plain;
-    return suffixedCopyPath(texture);
+    const QString fileName = texture->getFileName();
+    return copyFolder() + QLatin1Char('/') + asciiBaseName(fileName) + QLatin1Char('-') +
+           sourceHash(fileName) + QStringLiteral(".jpg");
 }
 
 QString SgMaterialBlockWriter::exportTextureAsJpeg(const SgTexture *texture) {
     if (!texture)
         return QString();
     const QString target = jpegCopyPath(texture);
-    if (QFile::exists(target)) {
-        rememberSource(target, texture);
+    // A copy of this very image is reused unless the image changed after it was made.
+    const QFileInfo copy(target);
+    if (copy.exists() && copy.lastModified() >= QFileInfo(texture->getFileName()).lastModified())
         return target;
-    }
     if (!SgFileIO::pathExists(copyFolder(), true))
         return QString();
     QImage image;
@@ -183,6 +163,5 @@ QString SgMaterialBlockWriter::exportTextureAsJpeg(const SgTexture *texture) {
         return QString();
     if (!image.save(target, "JPEG"))
         return QString();
-    rememberSource(target, texture);
     return target;
 }

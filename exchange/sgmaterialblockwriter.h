@@ -22,9 +22,8 @@ public:
     // count the block's own count field. O(materials); touches no file.
     static std::int64_t allowance(const SgShape &shape);
 
-    // An upper bound of the block's real size from its real strings (count field included;
-    // each copy path counted with the suffix it may gain), valid for paths of any length.
-    // O(materials); touches no file.
+    // An upper bound of the block's real size from its real strings (count field included),
+    // valid for paths of any length. O(materials); touches no file.
     static std::int64_t measureStrings(const SgShape &shape);
 
     // Writes the block of `shape` at the cursor and returns the bytes written. Throws
@@ -32,19 +31,16 @@ public:
     static std::int64_t write(const SgShape &shape, SgRecordOutput &output);
 
     // Copies the image of `texture` as a JPEG file into the temporary folder's "FacetorMaps"
-    // sub-folder, named after the image's base name, and returns the copy's path. An image whose
-    // copy already exists is not written again. Empty when the folder cannot be made, the image
-    // cannot be loaded or the JPEG cannot be saved. When another image file of the same base
-    // name was copied earlier in this process, the copy's name carries a suffix made from the
-    // image's own path, so that two different images never share one copy.
+    // sub-folder and returns the copy's path. The copy's name is the image's base name made
+    // ASCII-safe (other characters become '_'), '-', eight hex digits of a hash of the image's
+    // absolute path and ".jpg": the modeler reads the path as 8-bit text, and two different
+    // images never share a copy, in this run or a later one. A copy that exists and is not
+    // older than its image is not written again. Empty when the folder cannot be made, the
+    // image cannot be loaded or the JPEG cannot be saved.
     static QString exportTextureAsJpeg(const SgTexture *texture);
 
-    // The path that exportTextureAsJpeg gives `texture` if it succeeds (no file is touched).
+    // The path that exportTextureAsJpeg gives `texture` (no file is touched).
     static QString jpegCopyPath(const SgTexture *texture);
-
-    // The characters a copy path may gain as a suffix beyond jpegCopyPath's answer at
-    // measuring time (another material of the same record can claim the plain name first).
-    static constexpr int kCopySuffixLength = 9;
 
     // The bytes that one image string may take without adding to the allowance.
     static constexpr int kImageStringAllowance = 1024;

@@ -16,6 +16,7 @@
 #include "sgcore/morph/sgmorphdeltas.h"
 #include "sgcore/scene/sgbone.h"
 #include "sgcore/scene/sgscene.h"
+#include "sharedsource/engine/sgfacegroupcache.h"
 #include "sharedsource/engine/sgmorphloader.h"
 #include "sharedsource/engine/sgmorphloadlog.h"
 
@@ -183,9 +184,10 @@ void BM_GroupGeometry(benchmark::State &state) {
     if (!f)
         f = std::make_unique<GroupFixture>(int(state.range(0)));
     for (auto _ : state) {
-        SgMorphLoader loader; // a fresh loader gathers the groups again, as each run does
+        SgMorphLoader loader;
+        SgFaceGroupCache groups; // a fresh cache gathers the groups again, as each run does
         for (const auto &bone : f->bones) {
-            SgVertexMesh *group = loader.groupGeometry(bone.get(), f->mesh.get());
+            SgVertexMesh *group = loader.groupGeometry(bone.get(), f->mesh.get(), &groups);
             if (!group)
                 state.SkipWithError("group missing");
             else

@@ -1,5 +1,7 @@
-// Loads arbitrary bytes as a morph loader configuration file into a source list. Every input
-// must end in a load error or in listed sources; warnings are collected instead of shown.
+// Loads arbitrary bytes as a morph loader configuration file into a source list: reading and
+// applying to the rows together (slow: every input builds a source list of widgets; the reading
+// alone is fuzzed fast by loader_config_read). Every input must end in a load error or in listed
+// sources; warnings are collected instead of shown.
 
 #include "sgcore/app/sgapp.h"
 #include "sgcore/app/sgappsettings.h"

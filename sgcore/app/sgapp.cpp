@@ -5,6 +5,7 @@
 #include "sgcore/app/sgimportmgr.h"
 #include "sgcore/app/sgmessagesink.h"
 #include "sgcore/scene/sgscene.h"
+#include "sgcore/widgets/sgstyle.h"
 
 #include <QApplication>
 #include <QDir>
@@ -18,6 +19,10 @@ SgApp::SgApp(const QStringList &arguments, QObject *parent)
       m_sink(new SgMessageSink(this)), m_helpMgr(std::make_unique<SgHelpMgr>()),
       m_importMgr(std::make_unique<SgImportMgr>()), m_imageMgr(std::make_unique<SgImageMgr>()) {
     sgApp = this;
+    // The host's widgets are drawn in the host's style (its pixmaps and dialog spacing).
+    if (qobject_cast<QApplication *>(QCoreApplication::instance()) &&
+        !qobject_cast<SgStyle *>(QApplication::style()))
+        QApplication::setStyle(new SgStyle);
 }
 
 SgApp::~SgApp() {

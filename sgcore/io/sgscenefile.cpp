@@ -314,7 +314,10 @@ private:
             }
             const QString bumpMap = optionalString(m, "bumpMap", at);
             if (!bumpMap.isEmpty()) {
-                material->setBumpMap(textureFor(bumpMap));
+                if (SgFloatProperty *bump = material->getBumpControl()) {
+                    bump->setMapValue(textureFor(bumpMap));
+                    bump->setMapped(true);
+                }
             }
         }
     }

@@ -142,9 +142,6 @@ float SgDefaultMaterial::getBumpStrength() const {
     const SgFloatProperty *p = getBumpControl();
     return p ? p->getValue() : 0.0f;
 }
-void SgDefaultMaterial::setBumpMap(SgTexture *texture) {
-    unmapOrMap(getBumpControl(), texture);
-}
 SgTexture *SgDefaultMaterial::getBumpMap() const {
     const SgFloatProperty *p = getBumpControl();
     return p ? p->getMapValue() : nullptr;

@@ -14,7 +14,8 @@ class SgTexture;
 //   "Glossiness"       float 0 to 1, mappable; default 0
 //   "Opacity Strength" float 0 to 1, mappable; default 1 (the opacity control)
 //   "Bump Strength"    float, mappable (the bump map); default 0
-// The setters below write those properties.
+// The setters below write those properties. There is no bump-map setter: a bump map is
+// mapped through the "Bump Strength" property itself (`getBumpControl`).
 class SgDefaultMaterial : public SgMaterial {
 public:
     explicit SgDefaultMaterial(const QString &name = QString());
@@ -33,8 +34,7 @@ public:
     float getOpacityStrength() const;
     void setBumpStrength(float value);
     float getBumpStrength() const;
-    // Maps "Bump Strength" to `texture` (null unmaps it).
-    void setBumpMap(SgTexture *texture);
+    // The image "Bump Strength" is mapped to, or null.
     SgTexture *getBumpMap() const;
 
     // The five properties (null only if a caller removed them).

@@ -52,8 +52,11 @@ void SgNumberSlider::setNumberRange(double rangeMin, double rangeMax) {
         return;
     m_rangeMin = rangeMin;
     m_rangeMax = rangeMax;
-    if (m_integral)
+    if (m_integral) {
+        // The handle moves to show the same value on the new span; it must not set the value.
+        const QSignalBlocker blocker(m_slider);
         m_slider->setRange(0, int(std::min(rangeMax - rangeMin, 1.0e6)));
+    }
     showNumber();
 }
 

@@ -76,3 +76,10 @@ QIcon SgStyle::standardIcon(StandardPixmap standardIcon, const QStyleOption *opt
         return custom;
     return QProxyStyle::standardIcon(standardIcon, option, widget);
 }
+
+int SgStyle::pixelMetric(PixelMetric metric, const QStyleOption *option,
+                         const QWidget *widget) const {
+    if (metric == PM_CustomBase)
+        return DialogSpacing;
+    return QProxyStyle::pixelMetric(metric, option, widget);
+}

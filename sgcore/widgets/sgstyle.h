@@ -4,7 +4,9 @@
 #include <QProxyStyle>
 
 // The host's widget style: the platform style plus the host's own pixmaps, available both through
-// `standardIcon` (when the style is installed) and through the static accessors (always).
+// `standardIcon` (when the style is installed) and through the static accessors (always), and
+// the host's dialog spacing as its custom pixel metric. `SgApp` installs it as the application
+// style when the application has widgets.
 class SgStyle : public QProxyStyle {
     Q_OBJECT
 public:
@@ -24,4 +26,10 @@ public:
 
     QIcon standardIcon(StandardPixmap standardIcon, const QStyleOption *option = nullptr,
                        const QWidget *widget = nullptr) const override;
+
+    // The host's custom metric (`PM_CustomBase`): the margin and spacing of the host's dialogs,
+    // `DialogSpacing` pixels. Every other metric is the platform style's.
+    static constexpr int DialogSpacing = 6;
+    int pixelMetric(PixelMetric metric, const QStyleOption *option = nullptr,
+                    const QWidget *widget = nullptr) const override;
 };

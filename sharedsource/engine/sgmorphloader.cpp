@@ -1,6 +1,8 @@
 #include "sharedsource/engine/sgmorphloader.h"
 
 #include "sharedsource/engine/sgdeltablock.h"
+#include "sharedsource/engine/sgfacegroupcache.h"
+#include "sharedsource/engine/sgmorphloaderquestions.h"
 
 #include "sharedsource/engine/sgmorphloadlog.h"
 
@@ -23,8 +25,6 @@
 #include "sgcore/scene/sgskeleton.h"
 #include "sgcore/script/sgscript.h"
 
-#include <QInputDialog>
-#include <QMessageBox>
 #include <QtDebug>
 
 #include <algorithm>
@@ -92,7 +92,13 @@ constexpr float kDeltaThreshold = 0.001f;
 // Vertices per block of the quiet-block scan of computeDeltas.
 constexpr size_t kScanBlock = 64;
 
-enum class DeltaOutcome { Made, CountMismatch, NoDeltas, InvalidTarget };
+enum class DeltaOutcome { Made, CountMismatch, NoDeltas, InvalidTarget, InvalidBase };
+
+bool allFinite(const SgVertexMesh &mesh) {
+    const float *f = reinterpret_cast<const float *>(mesh.getVertices());
+    return std::all_of(f, f + size_t(mesh.getVertexCount()) * 3,
+                       [](float x) { return std::isfinite(x); });
+}
 
 // The deltas of `morph` against `base` with the outcome; see SgMorphLoader::computeDeltas.
 std::unique_ptr<SgMorphDeltas> makeDeltas(const SgVertexMesh &base, const SgVertexMesh &morph,
@@ -146,7 +152,9 @@ std::unique_ptr<SgMorphDeltas> makeDeltas(const SgVertexMesh &base, const SgVert
         lastBlockAllMoved = kept == end - start;
     }
     if (invalid) {
-        outcome = DeltaOutcome::InvalidTarget;
+        // Rare, so the side at fault is looked up only now: a broken node mesh is not the
+        // target's fault.
+        outcome = allFinite(base) ? DeltaOutcome::InvalidTarget : DeltaOutcome::InvalidBase;
         return nullptr;
     }
     if (!deltas || used == 0) {
@@ -171,14 +179,17 @@ QString invalidTargetMessage() {
     return QStringLiteral("Morph target has invalid coordinates - delta calculation failed.");
 }
 
+QString invalidBaseMessage() {
+    return QStringLiteral("Base geometry has invalid coordinates - delta calculation failed.");
+}
+
 } // namespace
 
-// The face groups of the geometry of the current node-list run, gathered once: the vertices
-// of every group in ascending order. Matching a hundred bones thus costs one pass over the
-// facets instead of one per bone.
-struct SgMorphLoader::GroupIndex {
-    const SgPolyMesh *mesh = nullptr;
-    std::vector<std::vector<int32_t>> groups;
+struct SgMorphLoader::NodePlan {
+    SgNode *node = nullptr;
+    SgObject *object = nullptr;
+    std::unique_ptr<SgMorphDeltas> deltas;
+    QString failure; // for PlanResult::Failed: what the run's log says
 };
 
 SgMorphLoader::SgMorphLoader() : QObject(nullptr) {
@@ -190,7 +201,6 @@ SgMorphLoader::SgMorphLoader() : QObject(nullptr) {
 
 SgMorphLoader::~SgMorphLoader() {
     discardControlProperty();
-    delete m_groupIndex;
 }
 
 QString SgMorphLoader::label() const {
@@ -293,7 +303,11 @@ void SgMorphLoader::discardControlProperty() {
 }
 
 // ---------------------------------------------------------------------------------------------
-// Pose step
+// Questions
+
+SgMorphLoaderQuestions &SgMorphLoader::questions() const {
+    return m_questions ? *m_questions : SgMorphLoaderQuestions::dialogs();
+}
 
 bool SgMorphLoader::applyPose() {
     if (!m_reverseModifiers || m_poseFile.isEmpty() || m_poseFile == QLatin1String("None"))
@@ -303,12 +317,35 @@ bool SgMorphLoader::applyPose() {
         script.execute();
         return true;
     }
-    const QString text = tr("Failed to load the pose file: \n") + m_poseFile + "\n" +
-                         tr("For the morph: ") + m_morphName + "\n\n" +
-                         tr("Do you wish to continue loading this morph?");
-    const auto answer = QMessageBox::question(nullptr, tr("Pose File Error"), text,
-                                              QMessageBox::Ok | QMessageBox::No, QMessageBox::Ok);
-    return answer == QMessageBox::Ok;
+    return questions().continueWithoutPose(m_poseFile, m_morphName);
+}
+
+bool SgMorphLoader::resolveNameClash(const QList<SgNode *> &nodes, SgMorphLoadLog &log) {
+    if (m_override != MakeUnique)
+        return true;
+    const auto clashes = [this](SgNode *node) {
+        SgObject *object = node ? node->getObject() : nullptr;
+        return object && dynamic_cast<SgMorph *>(object->findModifier(m_morphName)) != nullptr;
+    };
+    // A blank answer names no morph: it is asked again like a name that is taken.
+    bool asked = false;
+    while ((asked && m_morphName.trimmed().isEmpty()) ||
+           std::any_of(nodes.begin(), nodes.end(), clashes)) {
+        if (!askNewName()) {
+            log.addWarning(QStringLiteral("User cancelled."));
+            return false;
+        }
+        asked = true;
+    }
+    return true;
+}
+
+bool SgMorphLoader::askNewName() {
+    QString name;
+    if (!questions().askNewMorphName(m_morphName, name))
+        return false;
+    setMorphName(name);
+    return true;
 }
 
 // ---------------------------------------------------------------------------------------------
@@ -336,44 +373,20 @@ void SgMorphLoader::loadMorphForNodes(const SgFileIOSettings &importOptions,
     createMorphForNodes(geometry.get(), nodes, log);
 }
 
-bool SgMorphLoader::resolveNameClash(const QList<SgNode *> &nodes, SgMorphLoadLog &log) {
-    if (m_override != MakeUnique)
-        return true;
-    const auto clashes = [this](SgNode *node) {
-        SgObject *object = node ? node->getObject() : nullptr;
-        return object && dynamic_cast<SgMorph *>(object->findModifier(m_morphName)) != nullptr;
-    };
-    while (std::any_of(nodes.begin(), nodes.end(), clashes)) {
-        if (!askNewName()) {
-            log.addWarning(QStringLiteral("User cancelled."));
-            return false;
-        }
-    }
-    return true;
-}
-
-bool SgMorphLoader::askNewName() {
-    bool ok = false;
-    const QString name = QInputDialog::getText(
-        sgApp ? sgApp->getDialogParent() : nullptr, tr("Morph Already Exists"),
-        tr("A morph named \"%1\" already exists. Please enter a new name for the morph:")
-            .arg(m_morphName),
-        QLineEdit::Normal, QString(), &ok);
-    if (!ok)
-        return false;
-    setMorphName(name);
-    return true;
-}
-
 void SgMorphLoader::createMorphForNode(SgVertexMesh *geometry, SgNode *node, SgMorphLoadLog &log) {
+    m_linkFailureLogged = false;
     if (!resolveNameClash({node}, log))
         return;
-    prepareControlProperty();
-    SgNumericProperty *channel = nullptr;
-    if (createMorph(node, geometry, false, channel)) {
+    NodePlan plan;
+    const PlanResult result = planMorph(node, geometry, nullptr, plan);
+    if (result == PlanResult::Planned) {
+        prepareControlProperty();
+        SgNumericProperty *channel = applyMorph(plan);
         log.addMessage(QStringLiteral("Created morph successfully."));
         if (m_createControl && channel)
-            setupMorph(channel);
+            setupMorph(channel, &log);
+    } else if (result == PlanResult::Failed && !plan.failure.isEmpty()) {
+        log.addError(plan.failure + QStringLiteral(" No morph created."));
     } else {
         log.addWarning(QStringLiteral("Geometry did not match, failed to create morph."));
     }
@@ -382,6 +395,7 @@ void SgMorphLoader::createMorphForNode(SgVertexMesh *geometry, SgNode *node, SgM
 
 void SgMorphLoader::createMorphForNodes(SgVertexMesh *geometry, const QList<SgNode *> &nodes,
                                         SgMorphLoadLog &log) {
+    m_linkFailureLogged = false;
     if (!resolveNameClash(nodes, log))
         return;
 
@@ -401,24 +415,41 @@ void SgMorphLoader::createMorphForNodes(SgVertexMesh *geometry, const QList<SgNo
         target = MeshRef(usable ? unwelded : nullptr);
     }
 
-    prepareControlProperty();
-    std::vector<SgNumericProperty *> channels;
-    for (SgNode *node : nodes) {
-        SgNumericProperty *channel = nullptr;
-        if (createMorph(node, target.get(), true, channel))
-            channels.push_back(channel);
+    // Every node's deltas first: one failed target leaves the scene as it was.
+    SgFaceGroupCache groups;
+    std::vector<NodePlan> plans;
+    QList<SgNode *> skipped;
+    for (qsizetype i = 0; i < nodes.size(); ++i) {
+        NodePlan plan;
+        const PlanResult result = planMorph(nodes[i], target.get(), &groups, plan);
         stepProgress();
+        if (result == PlanResult::Failed) {
+            for (qsizetype rest = i + 1; rest < nodes.size(); ++rest)
+                stepProgress();
+            log.addError(plan.failure + QStringLiteral(" No morphs created."));
+            return;
+        }
+        if (result == PlanResult::Planned)
+            plans.push_back(std::move(plan));
+        else if (nodes[i])
+            skipped.append(nodes[i]);
     }
-    delete std::exchange(m_groupIndex, nullptr);
-
-    if (channels.empty()) {
+    if (plans.empty()) {
         log.addWarning(QStringLiteral("Geometry did not match, no morphs created."));
         return;
     }
+
+    prepareControlProperty();
+    std::vector<SgNumericProperty *> channels;
+    for (NodePlan &plan : plans) {
+        if (SgNumericProperty *channel = applyMorph(plan))
+            channels.push_back(channel);
+    }
     log.addMessage(QStringLiteral("Created morph successfully."));
+    cleanUpOrphans(skipped, log);
     if (m_createControl) {
         for (SgNumericProperty *channel : channels)
-            setupMorph(channel);
+            setupMorph(channel, &log);
     }
 }
 
@@ -432,6 +463,8 @@ SgMorphDeltas *SgMorphLoader::computeDeltas(const SgVertexMesh &base, const SgVe
         statusLine(mismatchMessage());
     else if (outcome == DeltaOutcome::InvalidTarget)
         statusLine(invalidTargetMessage());
+    else if (outcome == DeltaOutcome::InvalidBase)
+        statusLine(invalidBaseMessage());
     return deltas.release();
 }
 
@@ -472,7 +505,8 @@ SgVertexMesh *SgMorphLoader::loadGeometry(const SgFileIOSettings &importOptions)
     return mesh;
 }
 
-SgVertexMesh *SgMorphLoader::groupGeometry(SgNode *node, SgVertexMesh *geometry) {
+SgVertexMesh *SgMorphLoader::groupGeometry(SgNode *node, SgVertexMesh *geometry,
+                                           SgFaceGroupCache *groups) {
     auto *mesh = dynamic_cast<SgPolyMesh *>(geometry);
     const bool bone = dynamic_cast<SgBone *>(node) != nullptr;
     const bool figure = !bone && dynamic_cast<SgSkeleton *>(node) != nullptr;
@@ -492,84 +526,104 @@ SgVertexMesh *SgMorphLoader::groupGeometry(SgNode *node, SgVertexMesh *geometry)
     if (group < 0)
         return nullptr;
 
-    if (!m_groupIndex || m_groupIndex->mesh != mesh) {
-        delete m_groupIndex;
-        m_groupIndex = new GroupIndex{mesh, mesh->getAllFaceGroupVertices()};
-    }
-    if (size_t(group) >= m_groupIndex->groups.size())
+    SgFaceGroupCache ownGroups;
+    const std::vector<int32_t> *vertices =
+        (groups ? groups : &ownGroups)->groupVertices(mesh, group);
+    if (!vertices)
         return nullptr;
-    const std::vector<int32_t> &vertices = m_groupIndex->groups[size_t(group)];
     auto *result = new SgPolyMesh;
-    SgVec3 *out = result->setVertexArray(int(vertices.size()));
+    SgVec3 *out = result->setVertexArray(int(vertices->size()));
     const SgVec3 *in = mesh->getVertices();
-    for (size_t i = 0; i < vertices.size(); ++i)
-        out[i] = in[vertices[i]];
+    for (size_t i = 0; i < vertices->size(); ++i)
+        out[i] = in[(*vertices)[i]];
     result->ref();
     return result;
 }
 
-void SgMorphLoader::cleanUpOrphan(SgNode *node, SgObject *object) {
+bool SgMorphLoader::cleanUpOrphan(SgNode *node, SgObject *object) {
     if (m_override == MakeUnique || !m_cleanUpOrphans || !object)
-        return;
+        return false;
     if (node == m_controlNode && (m_createControl || m_override != DeltasAndLinks))
-        return;
+        return false;
     auto *morph = dynamic_cast<SgMorph *>(object->findModifier(m_morphName));
     if (!morph || morph->getValueChannel()->getLinkProperty())
-        return;
+        return false;
     // The loader's own control property must not be deleted under it.
     if (morph->getValueChannel() == m_controlProperty)
-        return;
-    object->removeModifier(morph);
+        return false;
+    return object->removeModifier(morph) == SgResult::Ok;
 }
 
-bool SgMorphLoader::createMorph(SgNode *node, SgVertexMesh *geometry, bool matchGroups,
-                                SgNumericProperty *&channel) {
-    channel = nullptr;
+void SgMorphLoader::cleanUpOrphans(const QList<SgNode *> &nodes, SgMorphLoadLog &log) {
+    for (SgNode *node : nodes) {
+        if (!cleanUpOrphan(node, node->getObject()))
+            continue;
+        const QString text =
+            QStringLiteral("Removed orphaned morph %1 from %2.").arg(m_morphName, node->getLabel());
+        hostLog(text);
+        log.addMessage(text);
+    }
+}
+
+SgMorphLoader::PlanResult SgMorphLoader::planMorph(SgNode *node, SgVertexMesh *geometry,
+                                                   SgFaceGroupCache *groups, NodePlan &plan) {
     if (!node)
-        return false;
+        return PlanResult::Skipped;
+    plan.node = node;
     hostLog(QStringLiteral("Creating morph for %1...").arg(node->getLabel()));
 
     MeshRef morphMesh =
-        matchGroups ? MeshRef::adopt(groupGeometry(node, geometry)) : MeshRef(geometry);
-    SgObject *object = node->getObject();
-    if (!object) {
+        groups ? MeshRef::adopt(groupGeometry(node, geometry, groups)) : MeshRef(geometry);
+    plan.object = node->getObject();
+    if (!plan.object) {
         hostLog(QStringLiteral("No object found, skipping node."));
-        return false;
+        return PlanResult::Skipped;
     }
     if (!morphMesh) {
-        cleanUpOrphan(node, object);
         hostLog(QStringLiteral("No morph geometry found, skipping node."));
-        return false;
+        return PlanResult::Skipped;
     }
-    SgShape *shape = object->getCurrentShape();
+    SgShape *shape = plan.object->getCurrentShape();
     SgVertexMesh *base = shape ? shape->getGeometry() : nullptr;
-    if (!base)
-        return false;
-    SgVertexMesh *reference = m_reverseModifiers ? object->getCachedGeom() : base;
-    if (!reference)
-        return false;
+    SgVertexMesh *reference = m_reverseModifiers ? plan.object->getCachedGeom() : base;
+    if (!base || !reference) {
+        hostLog(QStringLiteral("No geometry found on the node, skipping node."));
+        return PlanResult::Skipped;
+    }
     if (reference->getVertexCount() != morphMesh.get()->getVertexCount()) {
         statusLine(QStringLiteral("Vertex Count mismatch %1:%2 (Base:Morph).")
                        .arg(reference->getVertexCount())
                        .arg(morphMesh.get()->getVertexCount()));
-        return false;
+        plan.failure = QStringLiteral("The vertex count of %1 does not match the target "
+                                      "(%2:%3, Base:Morph).")
+                           .arg(node->getLabel())
+                           .arg(reference->getVertexCount())
+                           .arg(morphMesh.get()->getVertexCount());
+        return PlanResult::Failed;
     }
 
     const auto noDeltas = [&]() {
-        cleanUpOrphan(node, object);
         hostLog(QStringLiteral("No deltas for morph, skipping node."));
-        return false;
+        return PlanResult::Skipped;
     };
-    const auto invalidTarget = [&]() {
-        statusLine(invalidTargetMessage());
-        hostLog(QStringLiteral("Morph target has invalid coordinates, skipping node."));
-        return false;
+    const auto invalid = [&](DeltaOutcome outcome) {
+        const bool ownGeometry = outcome == DeltaOutcome::InvalidBase;
+        statusLine(ownGeometry ? invalidBaseMessage() : invalidTargetMessage());
+        plan.failure = ownGeometry
+                           ? QStringLiteral("The geometry of %1 has coordinates that are not "
+                                            "finite numbers.")
+                                 .arg(node->getLabel())
+                           : QStringLiteral("The target for %1 has coordinates that are not "
+                                            "finite numbers.")
+                                 .arg(node->getLabel());
+        hostLog(plan.failure);
+        return PlanResult::Failed;
     };
 
     DeltaOutcome outcome = DeltaOutcome::NoDeltas;
     std::unique_ptr<SgMorphDeltas> deltas = makeDeltas(*reference, *morphMesh.get(), outcome);
-    if (outcome == DeltaOutcome::InvalidTarget)
-        return invalidTarget();
+    if (outcome == DeltaOutcome::InvalidTarget || outcome == DeltaOutcome::InvalidBase)
+        return invalid(outcome);
     if (!deltas)
         return noDeltas();
 
@@ -579,13 +633,13 @@ bool SgMorphLoader::createMorph(SgNode *node, SgVertexMesh *geometry, bool match
         } else {
             std::unique_ptr<SgVertexMesh> reversed(morphMesh.get()->clone());
             reversed->transform(node->getWSTransform().inverse());
-            const auto &modifiers = object->getModifiers();
+            const auto &modifiers = plan.object->getModifiers();
             for (auto it = modifiers.rbegin(); it != modifiers.rend(); ++it)
                 (*it)->applyInverse(reversed.get(), node);
             reversed->translate(node->getOrigin());
             std::unique_ptr<SgMorphDeltas> restDeltas = makeDeltas(*base, *reversed, outcome);
-            if (outcome == DeltaOutcome::InvalidTarget)
-                return invalidTarget();
+            if (outcome == DeltaOutcome::InvalidTarget || outcome == DeltaOutcome::InvalidBase)
+                return invalid(outcome);
             if (!restDeltas)
                 return noDeltas();
             restDeltas->filter([&](int vertex) { return deltas->hasVertex(vertex); });
@@ -595,43 +649,55 @@ bool SgMorphLoader::createMorph(SgNode *node, SgVertexMesh *geometry, bool match
         }
     }
     hostLog(QStringLiteral("Morph contains %1 deltas").arg(deltas->getNumEntries()));
+    plan.deltas = std::move(deltas);
+    return PlanResult::Planned;
+}
 
+SgNumericProperty *SgMorphLoader::applyMorph(NodePlan &plan) {
+    SgObject *object = plan.object;
     auto *existing = dynamic_cast<SgMorph *>(object->findModifier(m_morphName));
     SgMorph *morph = nullptr;
-    bool isNew = false;
     if (existing && m_override == DeltasAndLinks) {
         existing->getValueChannel()->removeAllControllers();
-        existing->setDeltas(deltas.release());
+        existing->setDeltas(plan.deltas.release());
         morph = existing;
     } else if (existing && m_override == DeltasOnly) {
-        existing->setDeltas(deltas.release());
+        existing->setDeltas(plan.deltas.release());
         morph = existing;
     } else {
-        morph = new SgMorph(m_morphName, deltas.release());
+        morph = new SgMorph(m_morphName, plan.deltas.release());
         SgFloatProperty *value = morph->getValueChannel();
         value->setPath(m_morphGroup);
         value->setMin(-1.0f);
         value->setMax(1.0f);
         value->setIsClamped(true);
-        isNew = true;
-    }
-
-    if (isNew) {
         int index = -1;
-        if (auto *bone = dynamic_cast<SgBone *>(node)) {
+        if (auto *bone = dynamic_cast<SgBone *>(plan.node)) {
             const int joint = SgFigureJoint::findJoint(bone);
             if (joint >= 0)
                 index = joint + (m_applyAfterJoint ? 1 : 0);
         }
+        // A new morph has no parent and is in no stack: adding it cannot be refused.
         if (object->addModifier(morph, index) != 0) {
             delete morph;
-            return false;
+            return nullptr;
         }
     }
-    channel = morph->getValueChannel();
-    if (m_createControl && !m_controlProperty && node == m_controlNode)
+    SgNumericProperty *channel = morph->getValueChannel();
+    if (m_createControl && !m_controlProperty && plan.node == m_controlNode)
         setControlProperty(channel);
-    return true;
+    return channel;
+}
+
+bool SgMorphLoader::createMorph(SgNode *node, SgVertexMesh *geometry, bool matchGroups,
+                                SgNumericProperty *&channel) {
+    SgFaceGroupCache groups;
+    NodePlan plan;
+    channel = nullptr;
+    if (planMorph(node, geometry, matchGroups ? &groups : nullptr, plan) != PlanResult::Planned)
+        return false;
+    channel = applyMorph(plan);
+    return channel != nullptr;
 }
 
 // ---------------------------------------------------------------------------------------------
@@ -679,11 +745,20 @@ void SgMorphLoader::prepareControlProperty() {
     discardControlProperty();
 }
 
-void SgMorphLoader::setupMorph(SgNumericProperty *channel) {
+void SgMorphLoader::linkFailed(const char *warning, const QString &logText, SgMorphLoadLog *log) {
+    qWarning("%s", warning);
+    if (log && !m_linkFailureLogged) {
+        log->addWarning(logText);
+        m_linkFailureLogged = true;
+    }
+}
+
+void SgMorphLoader::setupMorph(SgNumericProperty *channel, SgMorphLoadLog *log) {
     if (!channel || channel == m_controlProperty)
         return;
     if (!m_controlProperty) {
         if (!m_controlNode) {
+            // The settings show "- none -" for the node: unlinked morphs are what was asked for.
             qWarning("No control node in SgMorphLoader::setupMorph() - control link could not "
                      "be created.");
             return;
@@ -702,13 +777,24 @@ void SgMorphLoader::setupMorph(SgNumericProperty *channel) {
             delete property;
             auto *namesake =
                 dynamic_cast<SgFloatProperty *>(m_controlNode->findProperty(m_morphName));
-            if (!namesake)
+            if (!namesake) {
+                linkFailed("The control node's property of the morph's name is not a float "
+                           "property - control link could not be created.",
+                           QStringLiteral("The property %1 on %2 is not a float property: the "
+                                          "morph is not linked to a control property.")
+                               .arg(m_morphName, m_controlNode->getLabel()),
+                           log);
                 return;
+            }
             setControlProperty(namesake);
         } else {
             delete property;
-            qWarning("Error adding control property to node - control link could not be "
-                     "created.");
+            linkFailed("Error adding control property to node - control link could not be "
+                       "created.",
+                       QStringLiteral("The control property %1 could not be added to %2: the "
+                                      "morph is not linked to a control property.")
+                           .arg(m_morphName, m_controlNode->getLabel()),
+                       log);
             return;
         }
     }

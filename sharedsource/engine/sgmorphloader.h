@@ -4,8 +4,10 @@
 #include <QObject>
 #include <QString>
 
+class SgFaceGroupCache;
 class SgFileIOSettings;
 class SgMorphDeltas;
+class SgMorphLoaderQuestions;
 class SgMorphLoadLog;
 class SgNode;
 class SgNumericProperty;
@@ -24,6 +26,14 @@ class SgVertexMesh;
 //
 // Progress goes to the host log (per-node details), the host status line (load and vertex-count
 // problems) and the run's `SgMorphLoadLog` (one entry per source or node list).
+//
+// A run over a node list is all or nothing: every node's morph is worked out before the scene
+// changes, and a node whose target cannot be used (coordinates that are not finite numbers, a
+// vertex count that does not match) fails the whole source, with nothing made and nothing
+// removed. Nodes that only have nothing to take (no face group, no motion) are skipped.
+//
+// Questions to the user (a new morph name, a pose file that does not load) go through
+// `SgMorphLoaderQuestions`; by default they are the host's modal dialogs.
 //
 // Ownership: the control node is never owned. An unplaced control property (one without an
 // owner, or owned by an `SgMorph` that is on no object) belongs to the loader and is deleted
@@ -104,11 +114,15 @@ public:
     void setErcType(short type) { m_ercType = type; }
     void setCleanUpOrphans(bool on) { m_cleanUpOrphans = on; }
 
+    // Who answers the run's questions; null (the default) asks with the host's dialogs. Not
+    // owned: it must outlive the runs that use it.
+    void setQuestions(SgMorphLoaderQuestions *questions) { m_questions = questions; }
+
     // ---- Entry points ----
     // The pose step, run by the source list before each source: with reverse deformations on
     // and a pose file other than empty or "None", loads the file as a host script and runs it.
-    // A file that does not load asks "Pose File Error" (Ok goes on without the pose: true;
-    // No: false, skip this source). Otherwise true.
+    // A file that does not load asks "Pose File Error" through the questions (going on without
+    // the pose: true; not: false, skip this source). Otherwise true.
     bool applyPose();
 
     // Loads the file `filename()` through the host importer (with `importOptions` copied over
@@ -124,13 +138,17 @@ public:
     // From geometry in memory, one node, no group matching. `geometry` is not consumed (the
     // caller keeps its reference). Logs "Created morph successfully." or the warning "Geometry
     // did not match, failed to create morph." ("User cancelled." when the new-name question is
-    // cancelled).
+    // cancelled; an error naming the geometry when coordinates are not finite numbers).
     void createMorphForNode(SgVertexMesh *geometry, SgNode *node, SgMorphLoadLog &log);
     // From geometry in memory over a node list, with bone and figure group matching and, when
-    // "Scenara exported" is on, un-welding through the figure welder first. Logs "Created morph
-    // successfully." when any node got a morph, else "Geometry did not match, no morphs
-    // created."; then links every new channel to the control property (when create control is
-    // on). Cost: linear in the facets and vertices, not in nodes times facets.
+    // "Scenara exported" is on, un-welding through the figure welder first. Every node's deltas
+    // are worked out first; a node whose target fails (see the class comment) ends the source
+    // with one error and no change to the scene. Otherwise logs "Created morph successfully."
+    // when any node got a morph, else "Geometry did not match, no morphs created."; then runs
+    // the orphan clean-up on the nodes that got no morph (only after a run that made morphs;
+    // each removed morph is named in the log) and links every new channel to the control
+    // property (when create control is on). Cost: linear in the facets and vertices, not in
+    // nodes times facets.
     void createMorphForNodes(SgVertexMesh *geometry, const QList<SgNode *> &nodes,
                              SgMorphLoadLog &log);
 
@@ -139,7 +157,9 @@ public:
     // whose difference exceeds 0.001 in some axis (strictly). None (nullptr) when the counts
     // differ (status line "Vertex Count mismatch - delta calculation failed."), when no vertex
     // moved, and when a difference is not finite (status line "Morph target has invalid
-    // coordinates - delta calculation failed."). The caller owns the result. O(vertices).
+    // coordinates - delta calculation failed.", or "Base geometry has invalid coordinates -
+    // delta calculation failed." when the fault is in `base`). The caller owns the result.
+    // O(vertices).
     static SgMorphDeltas *computeDeltas(const SgVertexMesh &base, const SgVertexMesh &morph);
 
     // Reads `filename()` through the import manager; none with a status-line message on
@@ -150,12 +170,14 @@ public:
     // (failing that, of its label), for a figure the group "BODY", each as a new mesh of the
     // group's vertices in ascending source order; for any other node, or a geometry without
     // face groups, `geometry` itself. None when the group is missing. The result carries one
-    // reference for the caller. O(facet corners of the group) after an O(facets) index of the
-    // mesh's groups, which is built once per geometry and kept for the run.
-    SgVertexMesh *groupGeometry(SgNode *node, SgVertexMesh *geometry);
+    // reference for the caller. O(facet corners of the group) after an O(facets) pass over the
+    // mesh's groups, which `groups` keeps for the next calls of the run (without one, each call
+    // makes its own).
+    SgVertexMesh *groupGeometry(SgNode *node, SgVertexMesh *geometry,
+                                SgFaceGroupCache *groups = nullptr);
 
     // Makes (or updates) the morph on one node; true on success, with the morph's value channel
-    // in `channel`.
+    // in `channel`. Runs no orphan clean-up.
     bool createMorph(SgNode *node, SgVertexMesh *geometry, bool matchGroups,
                      SgNumericProperty *&channel);
 
@@ -163,8 +185,9 @@ public:
     // properties); discards it when it cannot be placed.
     void prepareControlProperty();
     // Links one new morph channel to the control property, creating a control property on the
-    // control node when there is none.
-    void setupMorph(SgNumericProperty *channel);
+    // control node when there is none. A link that cannot be made is reported on the warning
+    // channel and, when `log` is given, once per run as a warning in it.
+    void setupMorph(SgNumericProperty *channel, SgMorphLoadLog *log = nullptr);
 
 signals:
     void filenameChanged(QString);
@@ -183,9 +206,19 @@ signals:
     void applyAfterJointChanged(bool);
 
 private:
+    // One node's morph, worked out before anything in the scene changes.
+    struct NodePlan;
+    enum class PlanResult { Planned, Skipped, Failed };
+
+    SgMorphLoaderQuestions &questions() const;
     bool askNewName();
     bool resolveNameClash(const QList<SgNode *> &nodes, SgMorphLoadLog &log);
-    void cleanUpOrphan(SgNode *node, SgObject *object);
+    PlanResult planMorph(SgNode *node, SgVertexMesh *geometry, SgFaceGroupCache *groups,
+                         NodePlan &plan);
+    SgNumericProperty *applyMorph(NodePlan &plan);
+    bool cleanUpOrphan(SgNode *node, SgObject *object);
+    void cleanUpOrphans(const QList<SgNode *> &nodes, SgMorphLoadLog &log);
+    void linkFailed(const char *warning, const QString &logText, SgMorphLoadLog *log);
     void discardControlProperty();
     bool isPlaced(SgNumericProperty *property) const;
 
@@ -212,7 +245,7 @@ private:
     short m_override = 0;
     bool m_cleanUpOrphans = true;
 
-    // Face-group index of the geometry of the current node-list run (see groupGeometry).
-    struct GroupIndex;
-    GroupIndex *m_groupIndex = nullptr;
+    SgMorphLoaderQuestions *m_questions = nullptr;
+    // Whether the current run's log already reports a link that could not be made.
+    bool m_linkFailureLogged = false;
 };

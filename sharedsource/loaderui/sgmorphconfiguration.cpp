@@ -4,6 +4,7 @@
 #include "sgcore/io/sgfileio.h"
 #include "sgcore/properties/sgfloatproperty.h"
 #include "sgcore/settings/sgpropertysettings.h"
+#include "sharedsource/loaderui/sgmorphconfigurationdocument.h"
 #include "sharedsource/loaderui/sgmorphfileitem.h"
 #include "sharedsource/loaderui/sgmorphsourceitem.h"
 #include "sharedsource/loaderui/sgmorphsourcelist.h"
@@ -13,16 +14,11 @@
 #include <QFile>
 #include <QFileInfo>
 #include <QMessageBox>
-#include <QXmlStreamReader>
 
 namespace {
 const QString s_rootTag = QStringLiteral("VarnTargetImporter");
 const QString s_extension = QStringLiteral(".scx");
 const QString s_value = QStringLiteral("Value");
-// Configuration files are small; anything larger or nested deeper than this is no
-// configuration and is refused before it is parsed into a document.
-constexpr qint64 s_maxFileSize = 16 * 1024 * 1024;
-constexpr int s_maxDepth = 64;
 
 QString tr(const char *text) {
     return QCoreApplication::translate("SgMorphLoaderDlg", text);
@@ -49,20 +45,6 @@ QDomElement firstElementBelow(const QDomElement &scope, const QString &tag) {
         node = node.nextSibling();
     }
     return QDomElement();
-}
-
-// Whether `bytes` stay within the nesting limit (a deep document is refused, not parsed).
-bool shallowEnough(const QByteArray &bytes) {
-    QXmlStreamReader reader(bytes);
-    int depth = 0;
-    while (!reader.atEnd()) {
-        const auto token = reader.readNext();
-        if (token == QXmlStreamReader::StartElement && ++depth > s_maxDepth)
-            return false;
-        if (token == QXmlStreamReader::EndElement)
-            --depth;
-    }
-    return true;
 }
 
 SgMorphSourceItem *settingRow(QTreeWidgetItem *item) {
@@ -218,35 +200,20 @@ void SgMorphConfiguration::loadError(const QString &text) {
     warn(tr("Load Error"), text, tr("Ok"));
 }
 
-bool SgMorphConfiguration::readFileType(const QString &path, QDomDocument &document,
-                                        QDomElement &fileType) {
+bool SgMorphConfiguration::readDocument(const QString &path,
+                                        SgMorphConfigurationDocument &document) {
     QFile file(path);
     if (!file.open(QIODevice::ReadOnly)) {
         loadError(tr("Error: Could not open file"));
         return false;
     }
-    const QByteArray bytes =
-        file.size() <= s_maxFileSize ? file.read(s_maxFileSize + 1) : QByteArray();
-    if (bytes.isEmpty() || bytes.size() > s_maxFileSize || !shallowEnough(bytes) ||
-        !document.setContent(bytes)) {
-        loadError(tr("Error: Document could not set as xml."));
+    // A file over the limit is not read at all; reading one byte more tells a file that grew.
+    const qint64 limit = SgMorphConfigurationDocument::maxFileSize;
+    const QByteArray bytes = file.size() <= limit ? file.read(limit + 1) : QByteArray();
+    if (!document.read(bytes)) {
+        loadError(document.error());
         return false;
     }
-    const QDomElement root = document.documentElement();
-    if (root.isNull()) {
-        loadError(tr("No Root Element Found"));
-        return false;
-    }
-    if (root.tagName() != s_rootTag) {
-        loadError(
-            tr("Unexpected Root tag name '%1'...Expected '%2'").arg(root.tagName(), s_rootTag));
-        return false;
-    }
-    if (!root.hasChildNodes()) {
-        loadError(tr("Root Element Has No Children"));
-        return false;
-    }
-    fileType = root.firstChild().toElement();
     return true;
 }
 
@@ -266,13 +233,12 @@ SgMorphFileItem *SgMorphConfiguration::sourceFor(const QString &geometryPath) {
 }
 
 bool SgMorphConfiguration::loadConfigurationFile(const QString &path, const QString &base) {
-    QDomDocument document;
-    QDomElement fileType;
-    if (!readFileType(path, document, fileType))
+    SgMorphConfigurationDocument document;
+    if (!readDocument(path, document))
         return false;
-    const QString type = fileType.attribute(QStringLiteral("Type"));
+    const QString type = document.type();
     if (type == QLatin1String("Project")) {
-        loadProjectObjects(fileType, path);
+        loadProjectObjects(document.fileType(), path);
         return true;
     }
     if (type != QLatin1String("Object")) {
@@ -286,18 +252,19 @@ bool SgMorphConfiguration::loadConfigurationFile(const QString &path, const QStr
                      "directory as the Configuration."));
         return false;
     }
-    applyObjectConfiguration(fileType, base, sourceFor(geometryPath));
+    applyObjectConfiguration(document.fileType(), base, sourceFor(geometryPath));
     return true;
 }
 
-void SgMorphConfiguration::loadProjectObjects(const QDomElement &fileType,
+void SgMorphConfiguration::loadProjectObjects(const SgConfigurationElement &fileType,
                                               const QString &projectPath) {
     const QString projectFolder = SgFileIO::getFilePath(projectPath);
-    const QDomNodeList objects = fileType.elementsByTagName(QStringLiteral("Object"));
+    const QList<const SgConfigurationElement *> objects =
+        fileType.allBelow(QStringLiteral("Object"));
     // New rows go to the top, so the entries are added from the last to the first.
-    for (int i = objects.size() - 1; i >= 0; --i) {
-        const QDomElement object = objects.at(i).toElement();
-        const QString path = resolvePath(projectFolder, object.attribute(QStringLiteral("Path")));
+    for (qsizetype i = objects.size() - 1; i >= 0; --i) {
+        const QString path =
+            resolvePath(projectFolder, objects[i]->attributes.value(QStringLiteral("Path")));
         if (path.isEmpty() || !QFileInfo(path).isFile())
             continue;
         SgMorphFileItem *source = sourceFor(path);
@@ -309,57 +276,57 @@ void SgMorphConfiguration::loadProjectObjects(const QDomElement &fileType,
 
 bool SgMorphConfiguration::loadObjectConfiguration(const QString &path, const QString &base,
                                                    SgMorphFileItem *target) {
-    QDomDocument document;
-    QDomElement fileType;
-    if (!readFileType(path, document, fileType))
+    SgMorphConfigurationDocument document;
+    if (!readDocument(path, document))
         return false;
-    if (fileType.attribute(QStringLiteral("Type")) != QLatin1String("Object")) {
+    if (document.type() != QLatin1String("Object")) {
         loadError(tr("XML Parse error, Improper Configuration type."));
         return false;
     }
-    applyObjectConfiguration(fileType, base, target);
+    applyObjectConfiguration(document.fileType(), base, target);
     return true;
 }
 
-void SgMorphConfiguration::applyObjectConfiguration(const QDomElement &fileType,
+void SgMorphConfiguration::applyObjectConfiguration(SgConfigurationElement fileType,
                                                     const QString &base, SgMorphFileItem *target) {
-    if (!target || !fileType.hasChildNodes())
+    if (!target || !fileType.hasChildNodes)
         return;
-    QDomElement pose = firstElementBelow(fileType, QStringLiteral("Pose"));
-    if (!pose.isNull() && isRelative(pose.attribute(s_value)))
-        pose.setAttribute(s_value, resolvePath(base, pose.attribute(s_value)));
+    const QString valueKey = QStringLiteral("Value");
+    if (SgConfigurationElement *pose = fileType.firstBelow(QStringLiteral("Pose"));
+        pose && isRelative(pose->value()))
+        pose->attributes.insert(valueKey, resolvePath(base, pose->value()));
     for (int i = 0; i < target->childCount(); ++i) {
         SgMorphSourceItem *row = settingRow(target->child(i));
         if (!row)
             continue;
-        const QDomElement element = firstElementBelow(fileType, row->settingKey());
-        row->setValueText(element.attribute(s_value));
-        if (element.isNull())
+        const SgConfigurationElement *element = fileType.firstBelow(row->settingKey());
+        row->setValueText(element ? element->value() : QString());
+        if (!element)
             continue;
         for (int c = 0; c < row->childCount(); ++c)
             if (SgMorphSourceItem *child = settingRow(row->child(c)))
-                applyRow(child, element);
+                applyRow(child, *element);
     }
 }
 
 // Sets `row` from the first element below `scope` with its key, then its dependent rows from
 // below that element; a row without an element keeps its value.
-void SgMorphConfiguration::applyRow(SgMorphSourceItem *row, const QDomElement &scope) {
-    const QDomElement element = firstElementBelow(scope, row->settingKey());
-    if (element.isNull())
+void SgMorphConfiguration::applyRow(SgMorphSourceItem *row, const SgConfigurationElement &scope) {
+    const SgConfigurationElement *element = scope.firstBelow(row->settingKey());
+    if (!element)
         return;
-    row->setValueText(element.attribute(s_value));
-    if (row->settingType() == 4 && element.hasChildNodes()) {
-        SgPropertySettings attributes;
-        attributes.fromDOM(element);
+    row->setValueText(element->value());
+    if (row->settingType() == 4 && element->hasChildNodes) {
         SgMorphLoader *loader = row->loader();
+        // The attributes go to a property of the loader's own: one the scene holds (or a
+        // control morph carries) is never renamed behind the user's back.
         SgNumericProperty *property = loader->controlProperty();
-        if (!property)
+        if (!property || property->getOwner())
             property = new SgFloatProperty;
-        property->setAttributes(attributes);
+        property->setAttributes(element->propertyAttributes);
         loader->setControlProperty(property);
     }
     for (int c = 0; c < row->childCount(); ++c)
         if (SgMorphSourceItem *child = settingRow(row->child(c)))
-            applyRow(child, element);
+            applyRow(child, *element);
 }

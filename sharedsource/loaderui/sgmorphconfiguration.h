@@ -8,6 +8,8 @@
 class QDomDocument;
 class QDomElement;
 class QWidget;
+class SgMorphConfigurationDocument;
+struct SgConfigurationElement;
 class SgMorphFileItem;
 class SgMorphSourceItem;
 class SgMorphSourceList;
@@ -25,8 +27,10 @@ class SgMorphSourceList;
 // putting the base folder in front of it. Because absolute paths on this platform also start
 // with "/", such a path is taken as it is when the resolved one does not exist and it does.
 //
-// Reading takes untrusted bytes: every fault ends in one "Load Error" warning (parented to the
-// message parent) or in a source with default settings, never in a crash.
+// Reading takes untrusted bytes: `SgMorphConfigurationDocument` turns them into plain data (or
+// a load error) without touching any widget; this class then applies that data to the rows.
+// Every fault ends in one "Load Error" warning (parented to the message parent) or in a source
+// with default settings, never in a crash.
 class SgMorphConfiguration {
 public:
     // Rows are added to and read from `list`; warnings are parented to `messageParent`.
@@ -61,8 +65,9 @@ public:
     // Reads the object file of a project entry; false after a "Load Error".
     bool loadObjectConfiguration(const QString &path, const QString &base, SgMorphFileItem *target);
     // Applies the elements below `fileType` to the rows of `target`, a parent row before its
-    // dependent rows.
-    void applyObjectConfiguration(const QDomElement &fileType, const QString &base,
+    // dependent rows. A "Property" element's attributes go to the loader's own unattached
+    // control property (a new float property when the current one belongs to the scene).
+    void applyObjectConfiguration(SgConfigurationElement fileType, const QString &base,
                                   SgMorphFileItem *target);
 
     // Whether a stored path is in relative form.
@@ -71,11 +76,11 @@ public:
     static QString resolvePath(const QString &base, const QString &path);
 
 private:
-    bool readFileType(const QString &path, QDomDocument &document, QDomElement &fileType);
-    void loadProjectObjects(const QDomElement &fileType, const QString &projectPath);
+    bool readDocument(const QString &path, SgMorphConfigurationDocument &document);
+    void loadProjectObjects(const SgConfigurationElement &fileType, const QString &projectPath);
     SgMorphFileItem *sourceFor(const QString &geometryPath);
     void appendRow(QDomDocument &document, QDomElement &parent, SgMorphSourceItem *row);
-    void applyRow(SgMorphSourceItem *row, const QDomElement &scope);
+    void applyRow(SgMorphSourceItem *row, const SgConfigurationElement &scope);
     bool writeFile(const QString &path, const QByteArray &bytes);
     void loadError(const QString &text);
     void warn(const QString &title, const QString &text, const QString &button);

@@ -10,6 +10,7 @@
 #include "sgcore/widgets/sgopenfilesdialog.h"
 #include "sharedsource/engine/sgmorphloadlog.h"
 #include "sharedsource/loaderui/sgconfigurationsaveoptionsdlg.h"
+#include "sharedsource/loaderui/sgexistingfolder.h"
 #include "sharedsource/loaderui/sgmorphfileitem.h"
 #include "sharedsource/loaderui/sgmorphsourcelist.h"
 
@@ -171,10 +172,11 @@ void SgMorphLoaderDlg::buildLogPage() {
     auto *layout = new QVBoxLayout(m_logPage);
     layout->setContentsMargins(0, 0, 0, 0);
     layout->setSpacing(0);
-    auto *label = new QLabel(tr("Loading Morphs..."), m_logPage);
+    m_logHeading = new QLabel(tr("Loading Morphs..."), m_logPage);
+    m_logHeading->setObjectName(QStringLiteral("MorphLoaderLogHeading"));
     m_logView = new QTextBrowser(m_logPage);
     m_logView->setObjectName(QStringLiteral("MorphLoaderLog"));
-    layout->addWidget(label);
+    layout->addWidget(m_logHeading);
     layout->addWidget(m_logView, 100);
     m_logPage->hide();
     addWidget(m_logPage);
@@ -191,13 +193,24 @@ void SgMorphLoaderDlg::accept() {
         return;
     }
     if (m_ran) {
-        if (m_closeAccepts)
-            SgBasicDialog::accept();
-        else
-            reject();
+        closeAfterRun();
         return;
     }
     run();
+}
+
+void SgMorphLoaderDlg::reject() {
+    if (m_ran)
+        closeAfterRun();
+    else
+        SgBasicDialog::reject();
+}
+
+void SgMorphLoaderDlg::closeAfterRun() {
+    if (m_closeAccepts)
+        SgBasicDialog::accept();
+    else
+        SgBasicDialog::reject();
 }
 
 int SgMorphLoaderDlg::nodeMode() const {
@@ -233,6 +246,8 @@ void SgMorphLoaderDlg::run() {
     m_logView->setHtml(log.toHtml());
     m_ran = true;
     m_closeAccepts = !log.hasProblems();
+    m_logHeading->setText(m_closeAccepts ? tr("Morphs Loaded:")
+                                         : tr("Morphs Loaded, with Warnings or Errors:"));
 }
 
 // ---------------------------------------------------------------------------------------------
@@ -246,8 +261,8 @@ void SgMorphLoaderDlg::chooseFiles() {
     QString filter;
     sgApp->getImportMgr()->makeGeometryFileFilter(filter, QString(), true);
     QStringList files;
-    if (!SgOpenFilesDialog::doOpenFilesDialog(files, tr("Select Geometry Files for Morphs"), folder,
-                                              filter, this))
+    if (!SgOpenFilesDialog::doOpenFilesDialog(files, tr("Select Geometry Files for Morphs"),
+                                              sgExistingFolder(folder), filter, this))
         return;
     m_sourceList->addFiles(files);
     if (!files.isEmpty())
@@ -272,8 +287,8 @@ void SgMorphLoaderDlg::moveDown() {
 
 void SgMorphLoaderDlg::loadConfiguration() {
     const QString folder = SgAppSettings(s_group).getString(s_lastDirectory);
-    QFileDialog dialog(sgApp->getInterface(), tr("Choose a Configuration file"), folder,
-                       s_configurationFilter);
+    QFileDialog dialog(sgApp->getInterface(), tr("Choose a Configuration file"),
+                       sgExistingFolder(folder), s_configurationFilter);
     dialog.setObjectName(QStringLiteral("Open file dialog"));
     dialog.setFileMode(QFileDialog::ExistingFiles);
     if (dialog.exec() != QDialog::Accepted)
@@ -300,7 +315,8 @@ void SgMorphLoaderDlg::saveConfiguration() {
         return;
     SgAppSettings defaults;
     QFileDialog dialog(sgApp->getInterface(), tr("Choose a Configuration file"),
-                       defaults.getString(s_lastDirectory), s_configurationFilter);
+                       sgExistingFolder(defaults.getString(s_lastDirectory)),
+                       s_configurationFilter);
     dialog.setObjectName(QStringLiteral("Save file dialog"));
     dialog.setAcceptMode(QFileDialog::AcceptSave);
     if (dialog.exec() != QDialog::Accepted || dialog.selectedFiles().isEmpty())

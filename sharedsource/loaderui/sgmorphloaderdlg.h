@@ -6,6 +6,7 @@
 #include <memory>
 
 class QComboBox;
+class QLabel;
 class QTextBrowser;
 class SgFileIOPresetWidget;
 class SgMorphFileItem;
@@ -20,7 +21,9 @@ class SgVertexMesh;
 //
 // Accepting with a morph action runs every source into one load log, replaces the options page
 // by the log page and keeps the dialog open; the next "Ok" accepts when the log holds no
-// warning or error and rejects otherwise. Other actions accept at once.
+// warning or error and rejects otherwise. After the run, Escape and the window's close box end
+// the dialog as that second "Ok" does (the run has happened: it cannot be cancelled). Other
+// actions accept at once.
 //
 // Application settings: group "TargetImporter" with "Preset", "Nodes" and "LastDirectory"; the
 // default group's "LastDirectory" for saving configurations.
@@ -51,6 +54,8 @@ public:
 public slots:
     // First acceptance with a morph action: the run; afterwards the close (see class comment).
     void accept() override;
+    // Before the run: cancels. After the run: as the second "Ok".
+    void reject() override;
 
     void chooseFiles();
     void clearList();
@@ -69,6 +74,7 @@ private:
     void buildListButtons(QWidget *page);
     void buildLogPage();
     void run();
+    void closeAfterRun();
     int nodeMode() const;
     void registerHelp(QObject *object);
 
@@ -80,6 +86,7 @@ private:
     SgMorphSourceList *m_sourceList = nullptr;
     QComboBox *m_nodesBox = nullptr;
     QTextBrowser *m_logView = nullptr;
+    QLabel *m_logHeading = nullptr;
     SgVertexMesh *m_mesh = nullptr;
     QComboBox *m_actionBox = nullptr;
     QString m_action;

@@ -1,5 +1,7 @@
 #include "sharedsource/loaderui/sgmorphposeitem.h"
 
+#include "sharedsource/loaderui/sgexistingfolder.h"
+
 #include "sgcore/app/sgapp.h"
 #include "sgcore/app/sgappsettings.h"
 #include "sgcore/io/sgfileio.h"
@@ -60,7 +62,7 @@ QString SgMorphPoseItem::browseForPose() const {
                  SgScript::s_VarnScript1TextExtension, SgScript::s_VarnScript2TextExtension);
     QWidget *parent = sgApp->getInterface();
     QFileDialog dialog(parent ? parent : sgApp->getDialogParent(), tr("Choose a Pose file"),
-                       directory, filter);
+                       sgExistingFolder(directory), filter);
     dialog.setObjectName(QStringLiteral("open file dialog"));
     dialog.setFileMode(QFileDialog::ExistingFile);
     QString path;

@@ -1,5 +1,7 @@
 #include "sharedsource/loaderui/sgmorphsourcelist.h"
 
+#include "sharedsource/engine/sgmorphloadlog.h"
+
 #include "sgcore/app/sgapp.h"
 #include "sgcore/app/sgimportmgr.h"
 #include "sgcore/geometry/sgvertexmesh.h"
@@ -21,6 +23,7 @@
 #include <QMenu>
 #include <QMimeData>
 #include <QMouseEvent>
+#include <QStyle>
 #include <QStyledItemDelegate>
 #include <QUrl>
 
@@ -82,6 +85,52 @@ SgMorphSourceList::SgMorphSourceList(QWidget *parent, const QString &name) : QTr
     setEditTriggers(QAbstractItemView::NoEditTriggers);
     setItemDelegate(new RenameDelegate(this));
     setMinimumSize(400, 400);
+    // The "Item" column always fits every row's label, shown or collapsed, so that expanding a
+    // source never cuts a label; the "Value" column takes the rest.
+    connect(model(), &QAbstractItemModel::rowsInserted, this, &SgMorphSourceList::fitItemColumn);
+    connect(model(), &QAbstractItemModel::dataChanged, this, &SgMorphSourceList::fitItemColumn);
+}
+
+int SgMorphSourceList::textWidthBelow(int column, const QTreeWidgetItem *item, int depth) const {
+    int width = 0;
+    for (int i = 0; i < item->childCount(); ++i) {
+        const QTreeWidgetItem *child = item->child(i);
+        const QModelIndex index = indexFromItem(child, column);
+        int own = sizeHintForIndex(index).width();
+        if (column == 0)
+            own += indentation() * (depth + (rootIsDecorated() ? 1 : 0));
+        width = qMax(width, qMax(own, textWidthBelow(column, child, depth + 1)));
+    }
+    return width;
+}
+
+int SgMorphSourceList::neededWidth(int column) const {
+    const int header = this->header()->sectionSizeHint(column);
+    return qMax(header, textWidthBelow(column, invisibleRootItem(), 0));
+}
+
+void SgMorphSourceList::fitItemColumn() {
+    const int width = neededWidth(0);
+    if (header()->sectionSize(0) != width)
+        header()->resizeSection(0, width);
+}
+
+QSize SgMorphSourceList::sizeHint() const {
+    // Wide enough for a source with all its settings shown (measured once on a sample
+    // source) and for the rows listed now, plus frame and scroll bar.
+    static int sampleItem = 0;
+    static int sampleValue = 0;
+    if (sampleItem == 0) {
+        SgMorphSourceList sample(nullptr, QString());
+        sample.setFont(font());
+        new SgMorphFileItem(&sample, QStringLiteral("/Targets/target.obj"));
+        sampleItem = sample.neededWidth(0);
+        sampleValue = sample.neededWidth(1);
+    }
+    const int item = qMax(sampleItem, neededWidth(0));
+    const int value = qMax(sampleValue, neededWidth(1));
+    const int chrome = 2 * frameWidth() + style()->pixelMetric(QStyle::PM_ScrollBarExtent) + 4;
+    return QSize(qMax(minimumWidth(), item + value + chrome), QTreeWidget::sizeHint().height());
 }
 
 SgMorphSourceList::~SgMorphSourceList() {
@@ -310,4 +359,8 @@ void SgMorphSourceList::createMorphs(SgFileIOSettings &importOptions, int mode,
         }
     }
     sgApp->finishProgress();
+    // The loader's "Loading Morph: ..." must not outlive the run.
+    sgApp->statusLine(log.hasProblems() ? tr("Morphs loaded, with warnings or errors.")
+                                        : tr("Morphs loaded."),
+                      true);
 }

@@ -45,6 +45,10 @@ public:
     // the file rows as total. Stops at the first row that is no source.
     void createMorphs(SgFileIOSettings &importOptions, int mode, SgMorphLoadLog &log);
 
+    // Wide enough for both columns of a source with every setting row shown: the dialog's
+    // default width fits its columns.
+    QSize sizeHint() const override;
+
 signals:
     // "Save Object Configuration.." was chosen on a source row.
     void saveObject();
@@ -71,6 +75,13 @@ protected:
 
 private:
     class RenameDelegate;
+
+    // The widest text of `column` among the rows below `item` (all of them, expanded or not),
+    // with the indentation of their depth for the "Item" column; at least the header's width.
+    int textWidthBelow(int column, const QTreeWidgetItem *item, int depth) const;
+    int neededWidth(int column) const;
+    // Sizes the "Item" column to its widest row.
+    void fitItemColumn();
 
     void activateRow(QTreeWidgetItem *item);
     void finishRename(const QModelIndex &index);

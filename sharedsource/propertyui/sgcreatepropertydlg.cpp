@@ -1,7 +1,6 @@
 #include "sharedsource/propertyui/sgcreatepropertydlg.h"
 
 #include "sgcore/app/sgapp.h"
-#include "sgcore/app/sgimagemgr.h"
 #include "sgcore/geometry/sgmodifier.h"
 #include "sgcore/geometry/sgobject.h"
 #include "sgcore/morph/sgmorph.h"
@@ -19,36 +18,35 @@
 #include "sgcore/scene/sgscene.h"
 #include "sgcore/scene/sgskeleton.h"
 #include "sgcore/widgets/sgboolbutton.h"
-#include "sgcore/widgets/sgcolorwgt.h"
-#include "sgcore/widgets/sgenumslider.h"
-#include "sgcore/widgets/sgfloatslider.h"
-#include "sgcore/widgets/sgimagemenu.h"
-#include "sgcore/widgets/sgintslider.h"
-#include "sgcore/widgets/sgnodemenu.h"
-#include "sgcore/widgets/sgstyle.h"
+#include "sharedsource/propertyui/sgboolpropertypage.h"
+#include "sharedsource/propertyui/sgcolorpropertypage.h"
+#include "sharedsource/propertyui/sgenumpropertypage.h"
+#include "sharedsource/propertyui/sgfloatpropertypage.h"
+#include "sharedsource/propertyui/sgimagepropertypage.h"
+#include "sharedsource/propertyui/sgintpropertypage.h"
+#include "sharedsource/propertyui/sgmorphoptionspage.h"
+#include "sharedsource/propertyui/sgnodepropertypage.h"
+#include "sharedsource/propertyui/sgnumericnodepropertypage.h"
+#include "sharedsource/propertyui/sgnumericpropertypage.h"
+#include "sharedsource/propertyui/sgpropertyrange.h"
 
 #include <QButtonGroup>
-#include <QCheckBox>
 #include <QComboBox>
 #include <QCursor>
 #include <QEvent>
 #include <QGridLayout>
 #include <QGroupBox>
 #include <QHBoxLayout>
-#include <QHeaderView>
 #include <QLabel>
 #include <QLineEdit>
 #include <QMessageBox>
 #include <QPushButton>
-#include <QSignalBlocker>
 #include <QTreeWidget>
 #include <QVBoxLayout>
 
 namespace {
 
-constexpr int LabelWidth = 100;
-constexpr int IndexColumn = 0;
-constexpr int LabelColumn = 1;
+constexpr int LabelWidth = SgPropertyPage::LabelWidth;
 
 // Restores a flag when leaving the scope.
 class FlagOverride {
@@ -64,7 +62,7 @@ private:
 } // namespace
 
 QString SgCreatePropertyDlg::enumPlaceholderText() {
-    return QStringLiteral("<Double-Click to Add/Rename>");
+    return SgEnumPropertyPage::placeholderText();
 }
 
 SgCreatePropertyDlg::SgCreatePropertyDlg(QWidget *parent, const QString &name, bool singleType,
@@ -81,18 +79,8 @@ SgCreatePropertyDlg::SgCreatePropertyDlg(QWidget *parent, const QString &name, b
     m_typeBox->setCurrentIndex(type);
     m_mainLayout->addWidget(m_typeRow);
     buildBasePage();
-    buildImagePage();
-    buildNodePage();
-    buildNumericPage();
-    buildFloatPage();
-    buildNumericNodePage();
-    buildIntPage();
-    buildBoolPage();
-    buildColorPage();
-    buildEnumPage();
-    buildAdditionalOptionsPage();
+    buildPages();
     buildButtonRow();
-    setModal(true);
     restoreDefaults();
     updateDisplay();
 }
@@ -104,47 +92,7 @@ int SgCreatePropertyDlg::currentType() const {
 }
 
 // ---------------------------------------------------------------------------------------------
-// Pages
-
-QGroupBox *SgCreatePropertyDlg::newPage(const QString &title, const QString &name,
-                                        QGridLayout *&grid) {
-    auto *page = new QGroupBox(title, this);
-    page->setObjectName(name);
-    grid = new QGridLayout(page);
-    grid->setSpacing(5);
-    grid->setColumnStretch(1, 1);
-    m_mainLayout->addWidget(page);
-    return page;
-}
-
-QLabel *SgCreatePropertyDlg::addRow(QGridLayout *grid, int row, const QString &text,
-                                    const QString &labelName, QWidget *widget) {
-    auto *label = new QLabel(text, grid->parentWidget());
-    label->setObjectName(labelName);
-    label->setFixedWidth(LabelWidth);
-    grid->addWidget(label, row, 0);
-    grid->addWidget(widget, row, 1);
-    return label;
-}
-
-SgBoolButton *SgCreatePropertyDlg::newYesNoButton(QWidget *parent, const QString &name) {
-    auto *button = new SgBoolButton(parent, name, tr("No"), tr("Yes"));
-    button->setFixedWidth(LabelWidth);
-    return button;
-}
-
-SgFloatSlider *SgCreatePropertyDlg::newFloatSlider(QWidget *parent, const QString &name) {
-    auto *slider = new SgFloatSlider(parent, name);
-    slider->setTextEditable(true);
-    return slider;
-}
-
-SgIntSlider *SgCreatePropertyDlg::newIntSlider(QWidget *parent, const QString &name,
-                                               bool textEditable) {
-    auto *slider = new SgIntSlider(parent, name);
-    slider->setTextEditable(textEditable);
-    return slider;
-}
+// Building
 
 void SgCreatePropertyDlg::buildTypeRow() {
     m_typeRow = new QWidget(this);
@@ -164,213 +112,101 @@ void SgCreatePropertyDlg::buildTypeRow() {
 }
 
 void SgCreatePropertyDlg::buildBasePage() {
-    QGridLayout *grid = nullptr;
-    m_basePage = newPage(tr("Base Attributes"), QStringLiteral("SgUniversalPropSettingsBox"), grid);
+    m_basePage = new QGroupBox(tr("Base Attributes"), this);
+    m_basePage->setObjectName(QStringLiteral("SgUniversalPropSettingsBox"));
     m_basePage->setFixedWidth(500);
+    auto *grid = new QGridLayout(m_basePage);
+    grid->setSpacing(5);
+    grid->setColumnStretch(1, 1);
     m_pathDefaults = new QComboBox(m_basePage);
     m_pathDefaults->setObjectName(QStringLiteral("SgPathDefaults"));
     m_pathDefaults->setSizePolicy(QSizePolicy::Expanding, QSizePolicy::Fixed);
-    m_pathEdit = new QLineEdit(m_basePage);
-    m_pathEdit->setObjectName(QStringLiteral("SgPathAttrib"));
-    m_nameEdit = new QLineEdit(m_basePage);
-    m_nameEdit->setObjectName(QStringLiteral("SgPropertyInternalNameAttrib"));
-    m_labelEdit = new QLineEdit(m_basePage);
-    m_labelEdit->setObjectName(QStringLiteral("SgPropertyLabelAttrib"));
-    m_hidden = newYesNoButton(m_basePage, QStringLiteral("SgPropertyHiddenAttrib"));
-    m_locked = newYesNoButton(m_basePage, QStringLiteral("SgPropertyLockedAttrib"));
-    m_canAnimate = newYesNoButton(m_basePage, QStringLiteral("SgPropertyAnimationAttrib"));
+    const auto edit = [this](const char *name) {
+        auto *line = new QLineEdit(m_basePage);
+        line->setObjectName(QLatin1String(name));
+        return line;
+    };
+    m_pathEdit = edit("SgPathAttrib");
+    m_nameEdit = edit("SgPropertyInternalNameAttrib");
+    m_labelEdit = edit("SgPropertyLabelAttrib");
+    const auto yesNo = [this](const char *name) {
+        auto *button = new SgBoolButton(m_basePage, QLatin1String(name), tr("No"), tr("Yes"));
+        button->setFixedWidth(LabelWidth);
+        return button;
+    };
+    m_hidden = yesNo("SgPropertyHiddenAttrib");
+    m_locked = yesNo("SgPropertyLockedAttrib");
+    m_canAnimate = yesNo("SgPropertyAnimationAttrib");
 
-    addRow(grid, 0, tr("Path Defaults:"), QStringLiteral("SgPathDefaultsLabel"), m_pathDefaults);
-    m_pathLabel = addRow(grid, 1, tr("Path:"), QStringLiteral("SgPathLabel"), m_pathEdit);
-    addRow(grid, 2, tr("Name:"), QStringLiteral("SgInternalNameLabel"), m_nameEdit);
-    addRow(grid, 3, tr("Label:"), QStringLiteral("SgPropertyLabel"), m_labelEdit);
-    addRow(grid, 4, tr("Hidden:"), QStringLiteral("SgPropertyHiddenLabel"), m_hidden);
-    addRow(grid, 5, tr("Locked:"), QStringLiteral("SgPropertyLockedLabel"), m_locked);
-    addRow(grid, 6, tr("Can Animate:"), QStringLiteral("SgPropertyAnimationLabel"), m_canAnimate);
+    const struct {
+        QString text;
+        const char *name;
+        QWidget *widget;
+    } rows[] = {
+        {tr("Path Defaults:"), "SgPathDefaultsLabel", m_pathDefaults},
+        {tr("Path:"), "SgPathLabel", m_pathEdit},
+        {tr("Name:"), "SgInternalNameLabel", m_nameEdit},
+        {tr("Label:"), "SgPropertyLabel", m_labelEdit},
+        {tr("Hidden:"), "SgPropertyHiddenLabel", m_hidden},
+        {tr("Locked:"), "SgPropertyLockedLabel", m_locked},
+        {tr("Can Animate:"), "SgPropertyAnimationLabel", m_canAnimate},
+    };
+    int row = 0;
+    for (const auto &entry : rows) {
+        auto *label = new QLabel(entry.text, m_basePage);
+        label->setObjectName(QLatin1String(entry.name));
+        label->setMinimumWidth(LabelWidth);
+        grid->addWidget(label, row, 0);
+        const bool fixed = entry.widget->maximumWidth() < QWIDGETSIZE_MAX;
+        grid->addWidget(entry.widget, row++, 1, fixed ? Qt::AlignLeft : Qt::Alignment());
+        m_baseLabels.append(label);
+    }
+    m_pathLabel = m_baseLabels[1];
+    m_mainLayout->addWidget(m_basePage);
 
     connect(m_pathDefaults, &QComboBox::textActivated, m_pathEdit, &QLineEdit::setText);
     // The label is filled in when the name edit loses focus (see eventFilter).
     m_nameEdit->installEventFilter(this);
 }
 
-void SgCreatePropertyDlg::buildImagePage() {
-    QGridLayout *grid = nullptr;
-    m_imagePage = newPage(tr("Image Attributes"), QStringLiteral("SgImagePropertyAttribs"), grid);
-    m_imageMenu = new SgImageMenu(m_imagePage, QStringLiteral("SgImageAttrib"));
-    addRow(grid, 0, tr("Image:"), QStringLiteral("SgImageLabel"), m_imageMenu);
-    m_imagePage->hide();
+void SgCreatePropertyDlg::buildPages() {
+    m_imagePage = new SgImagePropertyPage(this);
+    m_nodePage = new SgNodePropertyPage(this);
+    m_numericPage = new SgNumericPropertyPage(this);
+    m_floatPage = new SgFloatPropertyPage(this);
+    m_numericNodePage = new SgNumericNodePropertyPage(this);
+    m_intPage = new SgIntPropertyPage(this);
+    m_boolPage = new SgBoolPropertyPage(this);
+    m_colorPage = new SgColorPropertyPage(this);
+    m_enumPage = new SgEnumPropertyPage(this);
+    m_morphOptionsPage = new SgMorphOptionsPage(this);
+    for (SgPropertyPage *page : allPages()) {
+        m_mainLayout->addWidget(page);
+        page->hide();
+    }
+    connectEnumEditor();
 }
 
-void SgCreatePropertyDlg::buildNodePage() {
-    QGridLayout *grid = nullptr;
-    m_nodePage = newPage(tr("Node Attributes"), QStringLiteral("SgNodePropertyAttribs"), grid);
-    m_nodeMenu = new SgNodeMenu(m_nodePage, QStringLiteral("SgNodeAttrib"), true);
-    m_defaultNodeMenu = new SgNodeMenu(m_nodePage, QStringLiteral("SgDefaultNodeAttrib"), true);
-    m_nodeLabel = addRow(grid, 0, tr("Node:"), QStringLiteral("SgNodeLabel"), m_nodeMenu);
-    m_defaultNodeLabel = addRow(grid, 1, tr("Default Node:"), QStringLiteral("SgDefaultNodeLabel"),
-                                m_defaultNodeMenu);
-    m_nodePage->hide();
+QList<SgPropertyPage *> SgCreatePropertyDlg::allPages() const {
+    return {m_imagePage, m_nodePage, m_numericPage, m_floatPage, m_numericNodePage,
+            m_intPage,   m_boolPage, m_colorPage,   m_enumPage,  m_morphOptionsPage};
 }
 
-void SgCreatePropertyDlg::buildNumericPage() {
-    QGridLayout *grid = nullptr;
-    m_numericPage =
-        newPage(tr("Numeric Attributes"), QStringLiteral("SgNumericPropertyAttribs"), grid);
-    m_obeyLimits = newYesNoButton(m_numericPage, QStringLiteral("SgObeyLimitsAttrib"));
-    addRow(grid, 0, tr("Obey Limits:"), QStringLiteral("SgObeyLimitsPropertyLabel"), m_obeyLimits);
-    grid->addWidget(new QWidget(m_numericPage), 1, 1);
-    m_numericPage->hide();
-}
-
-void SgCreatePropertyDlg::buildFloatPage() {
-    QGridLayout *grid = nullptr;
-    m_floatPage = newPage(tr("Float Attributes"), QStringLiteral("SgFloatAttribs"), grid);
-    m_floatValue = newFloatSlider(m_floatPage, QStringLiteral("SgFloatVal"));
-    m_floatDefault = newFloatSlider(m_floatPage, QStringLiteral("SgDefaultFloatVal"));
-    m_floatMin = newFloatSlider(m_floatPage, QStringLiteral("SgFloatMinAttrib"));
-    m_floatMax = newFloatSlider(m_floatPage, QStringLiteral("SgFloatMaxAttrib"));
-    m_floatSensitivity = newFloatSlider(m_floatPage, QStringLiteral("SgFloatSensitivityAttrib"));
-    m_displayAsPercent = newYesNoButton(m_floatPage, QStringLiteral("SgDisplayAsPercentAttrib"));
-    addRow(grid, 0, tr("Value:"), QStringLiteral("SgFloatValueLabel"), m_floatValue);
-    addRow(grid, 1, tr("Default Value:"), QStringLiteral("SgDefaultFloatValueLabel"),
-           m_floatDefault);
-    addRow(grid, 2, tr("Min:"), QStringLiteral("SgFloatMinPropertyLabel"), m_floatMin);
-    addRow(grid, 3, tr("Max:"), QStringLiteral("SgFloatMaxPropertyLabel"), m_floatMax);
-    addRow(grid, 4, tr("Sensitivity:"), QStringLiteral("SgFloatSensitivityPropertyLabel"),
-           m_floatSensitivity);
-    addRow(grid, 5, tr("Display As Percent:"), QStringLiteral("SgDisplayAsPercentLabel"),
-           m_displayAsPercent);
-    m_floatPage->hide();
-}
-
-void SgCreatePropertyDlg::buildNumericNodePage() {
-    QGridLayout *grid = nullptr;
-    m_numericNodePage =
-        newPage(tr("Numeric Node Attributes"), QStringLiteral("SgNumericNodeAttribs"), grid);
-    m_numericNodeMenu =
-        new SgNodeMenu(m_numericNodePage, QStringLiteral("SgNumericNodeAttrib"), true);
-    m_requiresNode = newYesNoButton(m_numericNodePage, QStringLiteral("SgRequiresNodeAttrib"));
-    addRow(grid, 0, tr("Node:"), QStringLiteral("SgNumericNodePropertyLabel"), m_numericNodeMenu);
-    addRow(grid, 1, tr("Requires Node:"), QStringLiteral("SgRequiresNodePropertyLabel"),
-           m_requiresNode);
-    m_numericNodePage->hide();
-}
-
-void SgCreatePropertyDlg::buildIntPage() {
-    QGridLayout *grid = nullptr;
-    m_intPage = newPage(tr("Int Attributes"), QStringLiteral("SgIntAttribs"), grid);
-    m_intValue = newIntSlider(m_intPage, QStringLiteral("SgIntVal"), true);
-    m_intDefault = newIntSlider(m_intPage, QStringLiteral("SgDefaultIntVal"), true);
-    m_intMin = newIntSlider(m_intPage, QStringLiteral("SgIntMinAttrib"), true);
-    m_intMax = newIntSlider(m_intPage, QStringLiteral("SgIntMaxAttrib"), false);
-    m_intSensitivity = newIntSlider(m_intPage, QStringLiteral("SgIntSensitivityAttrib"), true);
-    addRow(grid, 0, tr("Value:"), QStringLiteral("SgIntValueLabel"), m_intValue);
-    addRow(grid, 1, tr("Default Value:"), QStringLiteral("SgDefaultIntValueLabel"), m_intDefault);
-    addRow(grid, 2, tr("Min:"), QStringLiteral("SgIntMinPropertyLabel"), m_intMin);
-    addRow(grid, 3, tr("Max:"), QStringLiteral("SgIntMaxPropertyLabel"), m_intMax);
-    addRow(grid, 4, tr("Sensitivity:"), QStringLiteral("SgIntSensitivityPropertyLabel"),
-           m_intSensitivity);
-    m_intPage->hide();
-}
-
-void SgCreatePropertyDlg::buildBoolPage() {
-    QGridLayout *grid = nullptr;
-    m_boolPage = newPage(tr("Bool Attributes"), QStringLiteral("SgBoolAttribs"), grid);
-    m_boolValue =
-        new SgBoolButton(m_boolPage, QStringLiteral("SgBoolValueAttrib"), tr("Off"), tr("On"));
-    m_boolValue->setFixedWidth(LabelWidth);
-    m_boolDefault = new SgBoolButton(m_boolPage, QStringLiteral("SgDefaultBoolValueAttrib"),
-                                     tr("Off"), tr("On"));
-    m_boolDefault->setFixedWidth(LabelWidth);
-    addRow(grid, 0, tr("Value:"), QStringLiteral("SgBoolValueLabel"), m_boolValue);
-    addRow(grid, 1, tr("Default Value:"), QStringLiteral("SgDefaultBoolValueLabel"), m_boolDefault);
-    m_boolPage->hide();
-}
-
-void SgCreatePropertyDlg::buildColorPage() {
-    QGridLayout *grid = nullptr;
-    m_colorPage = newPage(tr("Color Attributes"), QStringLiteral("SgColorAttribs"), grid);
-    m_color = new SgColorWgt(m_colorPage, QStringLiteral("SgColorAttrib"));
-    m_defaultColor = new SgColorWgt(m_colorPage, QStringLiteral("SgDefaultColorAttrib"));
-    m_color->setColor(Qt::black);
-    m_defaultColor->setColor(Qt::black);
-    addRow(grid, 0, tr("Color:"), QStringLiteral("SgColorLabel"), m_color);
-    addRow(grid, 1, tr("Default Color:"), QStringLiteral("SgDefaultColorLabel"), m_defaultColor);
-    m_colorPage->hide();
-}
-
-void SgCreatePropertyDlg::buildEnumPage() {
-    QGridLayout *grid = nullptr;
-    m_enumPage = newPage(tr("Enum Attributes"), QStringLiteral("SgEnumAttribs"), grid);
-
-    m_enumList = new QTreeWidget(m_enumPage);
-    m_enumList->setObjectName(QStringLiteral("SgEnumAttrib"));
-    m_enumList->setColumnCount(2);
-    m_enumList->setHeaderLabels({tr("Int Val"), tr("Enumerated Type")});
-    m_enumList->header()->setStretchLastSection(true);
-    m_enumList->setAllColumnsShowFocus(true);
-    m_enumList->setRootIsDecorated(false);
-    m_enumList->setSortingEnabled(false);
-    m_enumList->setEditTriggers(QAbstractItemView::NoEditTriggers);
-    m_enumList->setFixedHeight(100);
-    grid->addWidget(m_enumList, 0, 1);
-
-    auto *buttonBox = new QGroupBox(m_enumPage);
-    buttonBox->setObjectName(QStringLiteral("SgUpDownButtonGroup"));
-    buttonBox->setFlat(true);
-    auto *buttonColumn = new QVBoxLayout(buttonBox);
-    buttonColumn->setContentsMargins(0, 0, 0, 0);
-    auto *buttons = new QButtonGroup(buttonBox);
-    auto addButton = [&](const QString &name, const QIcon &icon,
-                         void (SgCreatePropertyDlg::*slot)()) {
-        auto *button = new QPushButton(icon, QString(), buttonBox);
-        button->setObjectName(name);
-        buttons->addButton(button);
-        buttonColumn->addWidget(button);
-        connect(button, &QPushButton::clicked, this, slot);
-    };
-    addButton(QStringLiteral("SgMoveEnumUpButton"), SgStyle::customIcon(SgStyle::UpArrowPixmap),
-              &SgCreatePropertyDlg::moveEnumUp);
-    addButton(QStringLiteral("SgMoveEnumDownButton"), SgStyle::customIcon(SgStyle::DownArrowPixmap),
-              &SgCreatePropertyDlg::moveEnumDown);
-    addButton(QStringLiteral("SgDeleteEnumDownButton"),
-              SgStyle::actionIcon(QStringLiteral("SgDeleteAction")),
-              &SgCreatePropertyDlg::removeEnum);
-    grid->addWidget(buttonBox, 0, 2);
-
-    m_enumValue = new SgEnumSlider(m_enumPage, QStringLiteral("SgEnumAttrib"));
-    m_enumDefault = new SgEnumSlider(m_enumPage, QStringLiteral("SgDefaultEnumAttrib"));
-    addRow(grid, 1, tr("Value:"), QStringLiteral("SgEnumValueLabel"), m_enumValue);
-    addRow(grid, 2, tr("Default Value:"), QStringLiteral("SgDefaultEnumValueLabel"), m_enumDefault);
-
-    addDefaultEnumItem();
-    connect(m_enumList, &QTreeWidget::itemDoubleClicked, this,
-            [this](QTreeWidgetItem *item, int column) {
-                beginRenameEnum(item, m_enumList->viewport()->mapFromGlobal(QCursor::pos()),
-                                column);
+void SgCreatePropertyDlg::connectEnumEditor() {
+    QTreeWidget *list = m_enumPage->list();
+    connect(list, &QTreeWidget::itemDoubleClicked, this,
+            [this, list](QTreeWidgetItem *item, int column) {
+                beginRenameEnum(item, list->viewport()->mapFromGlobal(QCursor::pos()), column);
             });
     // Programmatic changes of the list block its signals, so that only the user's edits arrive.
-    connect(m_enumList, &QTreeWidget::itemChanged, this, [this](QTreeWidgetItem *item, int column) {
+    connect(list, &QTreeWidget::itemChanged, this, [this](QTreeWidgetItem *item, int column) {
         renameEnum(item, column, item->text(column));
     });
-    m_enumPage->hide();
-}
-
-void SgCreatePropertyDlg::buildAdditionalOptionsPage() {
-    m_additionalOptionsPage = new QGroupBox(tr("Additional Options"), this);
-    m_additionalOptionsPage->setObjectName(QStringLiteral("SgAdditionalOptions"));
-    auto *column = new QVBoxLayout(m_additionalOptionsPage);
-    m_createAsMorph = new QCheckBox(tr("Create as empty morph"), m_additionalOptionsPage);
-    m_createAsMorph->setObjectName(QStringLiteral("SgCreateAsMorphOption"));
-    m_createAfterJoint = new QCheckBox(tr("Create morph after joint"), m_additionalOptionsPage);
-    m_createAfterJoint->setObjectName(QStringLiteral("SgCreateAfterJointOption"));
-    m_createAfterJoint->setChecked(false);
-    m_createAfterJoint->setEnabled(false);
-    column->addWidget(m_createAsMorph);
-    column->addWidget(m_createAfterJoint);
-    connect(m_createAsMorph, &QCheckBox::toggled, m_createAfterJoint, &QCheckBox::setEnabled);
-    m_mainLayout->addWidget(m_additionalOptionsPage);
-    m_additionalOptionsPage->hide();
+    connect(m_enumPage->upButton(), &QPushButton::clicked, this, &SgCreatePropertyDlg::moveEnumUp);
+    connect(m_enumPage->downButton(), &QPushButton::clicked, this,
+            &SgCreatePropertyDlg::moveEnumDown);
+    connect(m_enumPage->deleteButton(), &QPushButton::clicked, this,
+            &SgCreatePropertyDlg::removeEnum);
 }
 
 void SgCreatePropertyDlg::buildButtonRow() {
@@ -382,11 +218,11 @@ void SgCreatePropertyDlg::buildButtonRow() {
     row->addWidget(new QWidget(m_buttonRow), 1);
     auto *create = new QPushButton(tr("Create"), m_buttonRow);
     create->setObjectName(QStringLiteral("SgCreatePropButton"));
-    create->setFixedWidth(LabelWidth);
+    create->setMinimumWidth(LabelWidth);
     create->setDefault(true);
     auto *cancel = new QPushButton(tr("Cancel"), m_buttonRow);
     cancel->setObjectName(QStringLiteral("SgCancelCreatePropButton"));
-    cancel->setFixedWidth(LabelWidth);
+    cancel->setMinimumWidth(LabelWidth);
     buttons->addButton(create);
     buttons->addButton(cancel);
     row->addWidget(create);
@@ -394,6 +230,18 @@ void SgCreatePropertyDlg::buildButtonRow() {
     connect(create, &QPushButton::clicked, this, &SgCreatePropertyDlg::acceptButtonClicked);
     connect(cancel, &QPushButton::clicked, this, &SgCreatePropertyDlg::resetValues);
     m_mainLayout->addWidget(m_buttonRow);
+}
+
+void SgCreatePropertyDlg::alignLabelColumns() {
+    // Every page's labels share one column width, so the editing widgets of all pages line up.
+    QList<QLabel *> labels = m_baseLabels;
+    for (SgPropertyPage *page : allPages())
+        labels += page->rowLabels();
+    int width = LabelWidth;
+    for (const QLabel *label : std::as_const(labels))
+        width = qMax(width, label->sizeHint().width());
+    for (QLabel *label : std::as_const(labels))
+        label->setMinimumWidth(width);
 }
 
 bool SgCreatePropertyDlg::eventFilter(QObject *watched, QEvent *event) {
@@ -405,11 +253,15 @@ bool SgCreatePropertyDlg::eventFilter(QObject *watched, QEvent *event) {
 // ---------------------------------------------------------------------------------------------
 // Showing
 
-void SgCreatePropertyDlg::show() {
+void SgCreatePropertyDlg::updateTitle() {
     const QString middle =
         m_singleType ? QStringLiteral(" ") + m_typeBox->currentText() + QStringLiteral(" ")
                      : QStringLiteral(" ");
     setWindowTitle(tr("Create") + middle + tr("Property"));
+}
+
+void SgCreatePropertyDlg::show() {
+    updateTitle();
     if (m_resetValuesOnShow)
         restoreDefaults();
     updateDisplay();
@@ -417,87 +269,60 @@ void SgCreatePropertyDlg::show() {
     QDialog::show();
 }
 
-void SgCreatePropertyDlg::updateDisplay() {
-    const int type = currentType();
-    for (QWidget *page : {m_imagePage, m_nodePage, m_numericPage, m_floatPage, m_numericNodePage,
-                          m_intPage, m_boolPage, m_colorPage, m_enumPage, m_additionalOptionsPage})
-        page->hide();
-    QList<QWidget *> shown;
+QList<SgPropertyPage *> SgCreatePropertyDlg::pagesOfType(int type) const {
     switch (type) {
     case FloatType:
-        shown = {m_numericPage, m_floatPage, m_additionalOptionsPage};
-        break;
+        return {m_numericPage, m_floatPage, m_morphOptionsPage};
     case IntType:
-        shown = {m_numericPage, m_intPage};
-        break;
+        return {m_numericPage, m_intPage};
     case BoolType:
-        shown = {m_boolPage};
-        break;
+        return {m_boolPage};
     case ColorType:
-        shown = {m_colorPage};
-        break;
+        return {m_colorPage};
     case EnumType:
-        shown = {m_enumPage};
-        break;
+        return {m_enumPage};
     case ImageType:
-        shown = {m_imagePage};
-        break;
+        return {m_imagePage};
     case NodeType:
     case SkeletonType:
-        shown = {m_nodePage};
-        break;
+        return {m_nodePage};
     case NumericNodeType:
-        shown = {m_numericPage, m_floatPage, m_numericNodePage};
-        break;
+        return {m_numericPage, m_floatPage, m_numericNodePage};
     default:
-        break;
+        return {};
     }
-    for (QWidget *page : shown)
-        page->show();
+}
+
+void SgCreatePropertyDlg::updateDisplay() {
+    const int type = currentType();
+    const QList<SgPropertyPage *> shown = pagesOfType(type);
+    for (SgPropertyPage *page : allPages())
+        page->setVisible(shown.contains(page));
     m_typeRow->setVisible(!m_singleType);
     m_basePage->show();
     m_buttonRow->show();
-
-    if (type == SkeletonType) {
-        m_nodeLabel->setText(tr("Skeleton:"));
-        m_defaultNodeLabel->setText(tr("Default Skeleton:"));
-        m_nodePage->setTitle(tr("Skeleton Attributes"));
-    } else if (type == NodeType) {
-        m_nodeLabel->setText(tr("Node:"));
-        m_defaultNodeLabel->setText(tr("Default Node:"));
-        m_nodePage->setTitle(tr("Node Attributes"));
-    }
+    if (type == SkeletonType || type == NodeType)
+        m_nodePage->setSkeletonMode(type == SkeletonType);
+    alignLabelColumns();
+    updateTitle();
     fillChoosers();
-    m_nodeMenu->setCurrentNode(nullptr);
-    m_defaultNodeMenu->setCurrentNode(nullptr);
+    m_nodePage->clearChoice();
 }
 
 void SgCreatePropertyDlg::fillChoosers() {
     switch (currentType()) {
     case NumericNodeType:
-        m_numericNodeMenu->setNodes(sceneNodes());
+        m_numericNodePage->fillChooser(sceneNodes());
         break;
-    case NodeType: {
-        const QList<SgNode *> nodes = m_nodeMenuNodes.value_or(sceneNodes());
-        m_nodeMenu->setNodes(nodes);
-        m_defaultNodeMenu->setNodes(nodes);
+    case NodeType:
+        m_nodePage->fillChoosers(m_nodeMenuNodes.value_or(sceneNodes()));
         break;
-    }
-    case SkeletonType: {
-        const QList<SgNode *> skeletons = m_skeletonMenuNodes.value_or(sceneSkeletons());
-        m_nodeMenu->setNodes(skeletons);
-        m_defaultNodeMenu->setNodes(skeletons);
+    case SkeletonType:
+        m_nodePage->fillChoosers(m_skeletonMenuNodes.value_or(sceneSkeletons()));
         break;
-    }
-    case ImageType: {
-        QList<SgTexture *> images;
-        if (SgImageMgr *manager = sgApp->getImageMgr()) {
-            for (int i = 0; i < manager->getImageCount(); ++i)
-                images.append(manager->getImageAt(i));
-        }
-        m_imageMenu->setImages(images);
+    case ImageType:
+        m_imagePage->fillChooser();
         break;
-    }
     default:
         break;
     }
@@ -587,7 +412,9 @@ void SgCreatePropertyDlg::setPathReadOnly(bool readOnly) {
 }
 
 void SgCreatePropertyDlg::setCreationNodes(SgNodeList &list) {
-    m_creationNodes = list;
+    m_creationNodes.clear();
+    for (SgNode *node : list)
+        insertCreationNode(node);
 }
 
 void SgCreatePropertyDlg::insertCreationNode(SgNode *node) {
@@ -639,32 +466,6 @@ void SgCreatePropertyDlg::warn(const QString &text) {
     box.exec();
 }
 
-namespace {
-
-// Appends the range lines of a numeric type: min above max always; value and default outside
-// the range only when the limits are obeyed. Equal values pass.
-template <typename T>
-bool checkRange(T min, T max, T value, T defaultValue, bool obeyLimits, QString &message) {
-    bool valid = true;
-    if (max < min) {
-        message += SgCreatePropertyDlg::tr("   - Min is greater than Max\n");
-        valid = false;
-    }
-    if (obeyLimits) {
-        if (value < min || value > max) {
-            message += SgCreatePropertyDlg::tr("   - Value is not within limits\n");
-            valid = false;
-        }
-        if (defaultValue < min || defaultValue > max) {
-            message += SgCreatePropertyDlg::tr("   - Default Value is not within limits\n");
-            valid = false;
-        }
-    }
-    return valid;
-}
-
-} // namespace
-
 bool SgCreatePropertyDlg::validate() {
     QString message = tr("Could not create properties for the following reasons:\n");
     bool valid = true;
@@ -681,33 +482,18 @@ bool SgCreatePropertyDlg::validate() {
         valid = false;
     }
     const int type = currentType();
-    if (type == FloatType) {
-        valid &=
-            checkRange(m_floatMin->getValue(), m_floatMax->getValue(), m_floatValue->getValue(),
-                       m_floatDefault->getValue(), m_obeyLimits->isOn(), message);
-    } else if (type == IntType) {
-        valid &= checkRange(m_intMin->getValue(), m_intMax->getValue(), m_intValue->getValue(),
-                            m_intDefault->getValue(), m_obeyLimits->isOn(), message);
-    } else if (type == EnumType && m_enumValue->count() == 0) {
+    if (type == FloatType)
+        valid &= m_floatPage->checkRange(m_numericPage->obeyLimits(), message);
+    else if (type == IntType)
+        valid &= m_intPage->checkRange(m_numericPage->obeyLimits(), message);
+    else if (type == EnumType && !m_enumPage->hasItems())
         valid = false;
-    }
     if (valid) {
         accept();
         return true;
     }
     warn(message);
     return false;
-}
-
-void SgCreatePropertyDlg::configureFloat(SgProperty *property) const {
-    auto *numeric = static_cast<SgFloatProperty *>(property);
-    numeric->setValue(m_floatValue->getValue());
-    numeric->setDefaultValue(m_floatDefault->getValue());
-    numeric->setMin(m_floatMin->getValue());
-    numeric->setMax(m_floatMax->getValue());
-    numeric->setSensitivity(m_floatSensitivity->getValue());
-    numeric->setDisplayAsPercent(m_displayAsPercent->isOn());
-    numeric->setIsClamped(m_obeyLimits->isOn());
 }
 
 void SgCreatePropertyDlg::configureBase(SgProperty *property) const {
@@ -729,10 +515,18 @@ SgProperty *SgCreatePropertyDlg::createProperty() {
 SgProperty *SgCreatePropertyDlg::createProperty(SgElement **owner) {
     if (owner)
         *owner = nullptr;
-    SgProperty *property = nullptr;
+    SgProperty *property = createTypedProperty(owner);
+    if (property)
+        configureBase(property);
+    return property;
+}
+
+// A new property of the current type, configured by the type's pages (the base step follows).
+SgProperty *SgCreatePropertyDlg::createTypedProperty(SgElement **owner) const {
     switch (currentType()) {
-    case FloatType:
-        if (m_createAsMorph->isChecked()) {
+    case FloatType: {
+        SgFloatProperty *property = nullptr;
+        if (m_morphOptionsPage->createAsMorph()) {
             auto *morph = new SgMorph;
             morph->setName(m_nameEdit->text());
             property = morph->getValueChannel();
@@ -747,76 +541,55 @@ SgProperty *SgCreatePropertyDlg::createProperty(SgElement **owner) {
         } else {
             property = new SgFloatProperty;
         }
-        configureFloat(property);
-        break;
+        m_floatPage->configure(property, m_numericPage->obeyLimits());
+        return property;
+    }
     case IntType: {
-        auto *intProperty = new SgIntProperty;
-        intProperty->setValue(m_intValue->getValue());
-        intProperty->setDefaultValue(m_intDefault->getValue());
-        intProperty->setMin(m_intMin->getValue());
-        intProperty->setMax(m_intMax->getValue());
-        intProperty->setSensitivity(m_intSensitivity->getValue());
-        property = intProperty;
-        break;
+        auto *property = new SgIntProperty;
+        m_intPage->configure(property);
+        return property;
     }
     case BoolType: {
-        auto *boolProperty = new SgBoolProperty;
-        boolProperty->setBoolValue(m_boolValue->isOn());
-        boolProperty->setDefaultValue(m_boolDefault->isOn() ? 1 : 0);
-        property = boolProperty;
-        break;
+        auto *property = new SgBoolProperty;
+        m_boolPage->configure(property);
+        return property;
     }
     case ColorType: {
-        auto *colorProperty = new SgColorProperty;
-        colorProperty->setColorValue(m_color->getColor());
-        colorProperty->setDefaultValue(m_defaultColor->getColor().rgb());
-        property = colorProperty;
-        break;
+        auto *property = new SgColorProperty;
+        m_colorPage->configure(property);
+        return property;
     }
     case EnumType: {
-        auto *enumProperty = new SgEnumProperty;
-        for (const QString &label : enumLabels())
-            enumProperty->addItem(label, -1);
-        enumProperty->setValue(m_enumValue->currentIndex());
-        enumProperty->setDefaultValue(m_enumDefault->currentIndex());
-        property = enumProperty;
-        break;
+        auto *property = new SgEnumProperty;
+        m_enumPage->configure(property);
+        return property;
     }
     case ImageType: {
-        auto *imageProperty = new SgImageProperty;
-        imageProperty->setValue(m_imageMenu->getCurrentImage());
-        property = imageProperty;
-        break;
+        auto *property = new SgImageProperty;
+        m_imagePage->configure(property);
+        return property;
     }
     case NodeType:
     case SkeletonType: {
-        auto *nodeProperty =
-            currentType() == NodeType ? new SgNodeProperty : new SgSkeletonProperty;
-        nodeProperty->setValue(m_nodeMenu->getCurrentNode());
-        nodeProperty->setDefaultValue(m_defaultNodeMenu->getCurrentNode());
-        property = nodeProperty;
-        break;
+        auto *property = currentType() == NodeType ? new SgNodeProperty : new SgSkeletonProperty;
+        m_nodePage->configure(property);
+        return property;
     }
     case NumericNodeType: {
-        auto *numericNode = new SgNumericNodeProperty;
-        numericNode->setNode(m_numericNodeMenu->getCurrentNode());
-        numericNode->setMustHaveNode(m_requiresNode->isOn());
-        configureFloat(numericNode);
-        property = numericNode;
-        break;
+        auto *property = new SgNumericNodeProperty;
+        m_numericNodePage->configure(property);
+        m_floatPage->configure(property, m_numericPage->obeyLimits());
+        return property;
     }
     default:
         return nullptr;
     }
-    configureBase(property);
-    return property;
 }
 
 void SgCreatePropertyDlg::createProperties() {
     if (!validate())
         return;
-    const int morphIndex =
-        m_createAfterJoint->isEnabled() && m_createAfterJoint->isChecked() ? -1 : 0;
+    const int morphIndex = m_morphOptionsPage->morphIndex();
     for (SgNode *node : std::as_const(m_creationNodes)) {
         SgElement *owner = nullptr;
         SgProperty *property = createProperty(&owner);
@@ -853,28 +626,8 @@ void SgCreatePropertyDlg::autoFillPropLabel() {
 // Defaults, saving and cancelling
 
 void SgCreatePropertyDlg::restoreDefaults() {
-    clearEnumList();
-    m_color->setColor(Qt::black);
-    m_defaultColor->setColor(Qt::black);
-    m_boolValue->setOn(false);
-    m_boolDefault->setOn(false);
-    m_nodeMenu->setCurrentNode(nullptr);
-    m_defaultNodeMenu->setCurrentNode(nullptr);
-    m_numericNodeMenu->setCurrentNode(nullptr);
-    m_requiresNode->setOn(false);
-    m_obeyLimits->setOn(true);
-    m_floatMin->setValue(-1.0f);
-    m_floatMax->setValue(1.0f);
-    m_floatSensitivity->setValue(0.04f);
-    m_floatValue->setValue(0.0f);
-    m_floatDefault->setValue(0.0f);
-    m_displayAsPercent->setOn(true);
-    m_intMin->setValue(-1);
-    m_intMax->setValue(1);
-    m_intSensitivity->setValue(1);
-    m_intValue->setValue(0);
-    m_intDefault->setValue(0);
-    m_imageMenu->setCurrentImage(nullptr);
+    for (SgPropertyPage *page : allPages())
+        page->restoreDefaults();
     m_hidden->setOn(false);
     m_locked->setOn(false);
     m_canAnimate->setOn(true);
@@ -893,39 +646,10 @@ void SgCreatePropertyDlg::restoreDefaults() {
 void SgCreatePropertyDlg::saveCurrentValues() {
     if (m_resetValuesOnShow)
         return;
-    m_saved.path = m_pathEdit->text();
-    m_saved.name = m_nameEdit->text();
-    m_saved.label = m_labelEdit->text();
-    m_saved.hidden = m_hidden->isOn();
-    m_saved.locked = m_locked->isOn();
-    m_saved.canAnimate = m_canAnimate->isOn();
-    m_saved.obeyLimits = m_obeyLimits->isOn();
-    m_saved.displayAsPercent = m_displayAsPercent->isOn();
-    m_saved.boolValue = m_boolValue->isOn();
-    m_saved.boolDefault = m_boolDefault->isOn();
-    m_saved.requiresNode = m_requiresNode->isOn();
-    m_saved.emptyMorph = m_createAsMorph->isChecked();
-    m_saved.floatValue = m_floatValue->getValue();
-    m_saved.floatDefault = m_floatDefault->getValue();
-    m_saved.floatMin = m_floatMin->getValue();
-    m_saved.floatMax = m_floatMax->getValue();
-    m_saved.floatSensitivity = m_floatSensitivity->getValue();
-    m_saved.intValue = m_intValue->getValue();
-    m_saved.intDefault = m_intDefault->getValue();
-    m_saved.intMin = m_intMin->getValue();
-    m_saved.intMax = m_intMax->getValue();
-    m_saved.intSensitivity = m_intSensitivity->getValue();
-    m_saved.color = m_color->getColor();
-    m_saved.defaultColor = m_defaultColor->getColor();
-    m_saved.enumLabels = enumLabels();
-    if (!m_saved.enumLabels.isEmpty()) {
-        m_saved.enumValue = m_enumValue->currentIndex();
-        m_saved.enumDefault = m_enumDefault->currentIndex();
-    }
-    m_saved.image = m_imageMenu->getCurrentImage();
-    m_saved.node = m_nodeMenu->getCurrentNode();
-    m_saved.defaultNode = m_defaultNodeMenu->getCurrentNode();
-    m_saved.numericNode = m_numericNodeMenu->getCurrentNode();
+    m_saved = {m_pathEdit->text(), m_nameEdit->text(), m_labelEdit->text(),
+               m_hidden->isOn(),   m_locked->isOn(),   m_canAnimate->isOn()};
+    for (SgPropertyPage *page : allPages())
+        page->saveValues();
 }
 
 void SgCreatePropertyDlg::resetValues() {
@@ -936,160 +660,35 @@ void SgCreatePropertyDlg::resetValues() {
         m_hidden->setOn(m_saved.hidden);
         m_locked->setOn(m_saved.locked);
         m_canAnimate->setOn(m_saved.canAnimate);
-        m_obeyLimits->setOn(m_saved.obeyLimits);
-        m_displayAsPercent->setOn(m_saved.displayAsPercent);
-        m_boolValue->setOn(m_saved.boolValue);
-        m_boolDefault->setOn(m_saved.boolDefault);
-        m_requiresNode->setOn(m_saved.requiresNode);
-        m_createAsMorph->setChecked(m_saved.emptyMorph);
-        m_floatValue->setValue(m_saved.floatValue);
-        m_floatDefault->setValue(m_saved.floatDefault);
-        m_floatMin->setValue(m_saved.floatMin);
-        m_floatMax->setValue(m_saved.floatMax);
-        m_floatSensitivity->setValue(m_saved.floatSensitivity);
-        m_intValue->setValue(m_saved.intValue);
-        m_intDefault->setValue(m_saved.intDefault);
-        m_intMin->setValue(m_saved.intMin);
-        m_intMax->setValue(m_saved.intMax);
-        m_intSensitivity->setValue(m_saved.intSensitivity);
-        m_color->setColor(m_saved.color);
-        m_defaultColor->setColor(m_saved.defaultColor);
-        clearEnumList();
-        for (const QString &label : std::as_const(m_saved.enumLabels)) {
-            QTreeWidgetItem *placeholder = enumPlaceholder();
-            {
-                const QSignalBlocker blocker(m_enumList);
-                placeholder->setText(LabelColumn, label);
-            }
-            renameEnum(placeholder, LabelColumn, label);
-        }
-        if (!m_saved.enumLabels.isEmpty()) {
-            m_enumValue->setCurrentIndex(m_saved.enumValue);
-            m_enumDefault->setCurrentIndex(m_saved.enumDefault);
-        }
-        m_imageMenu->setCurrentImage(m_saved.image);
-        m_nodeMenu->setCurrentNode(m_saved.node);
-        m_defaultNodeMenu->setCurrentNode(m_saved.defaultNode);
-        m_numericNodeMenu->setCurrentNode(m_saved.numericNode);
+        for (SgPropertyPage *page : allPages())
+            page->restoreValues();
     }
     reject();
 }
 
 // ---------------------------------------------------------------------------------------------
-// The enum list editor. Row k of the list is item k of both enum sliders, followed by one
-// placeholder row. After a removal the rows below are renumbered, so that every row's "Int Val"
-// is always its slider index and later edits address the right slider item.
-
-void SgCreatePropertyDlg::clearEnumList() {
-    {
-        const QSignalBlocker blocker(m_enumList);
-        m_enumList->clear();
-    }
-    m_enumValue->clear();
-    m_enumDefault->clear();
-    addDefaultEnumItem();
-}
-
-QStringList SgCreatePropertyDlg::enumLabels() const {
-    QStringList labels;
-    for (int row = 0; row + 1 < m_enumList->topLevelItemCount(); ++row)
-        labels.append(m_enumList->topLevelItem(row)->text(LabelColumn));
-    return labels;
-}
-
-QTreeWidgetItem *SgCreatePropertyDlg::enumPlaceholder() const {
-    return m_enumList->topLevelItem(m_enumList->topLevelItemCount() - 1);
-}
+// The enum list editor (see SgEnumPropertyPage)
 
 void SgCreatePropertyDlg::addDefaultEnumItem() {
-    const QSignalBlocker blocker(m_enumList);
-    auto *item = new QTreeWidgetItem(m_enumList);
-    item->setText(LabelColumn, enumPlaceholderText());
-    item->setFlags(item->flags() | Qt::ItemIsEditable);
+    m_enumPage->addPlaceholder();
 }
 
 void SgCreatePropertyDlg::beginRenameEnum(QTreeWidgetItem *item, QPoint, int col) {
-    if (item && col == LabelColumn)
-        m_enumList->editItem(item, LabelColumn);
+    m_enumPage->beginRename(item, col);
 }
 
 void SgCreatePropertyDlg::renameEnum(QTreeWidgetItem *item, int, QString text) {
-    if (!item)
-        return;
-    const int row = m_enumList->indexOfTopLevelItem(item);
-    if (row < 0)
-        return;
-    if (item != enumPlaceholder()) {
-        m_enumValue->renameItem(row, text);
-        m_enumDefault->renameItem(row, text);
-        return;
-    }
-    const int index = m_enumValue->addItem(text);
-    m_enumDefault->addItem(text);
-    {
-        const QSignalBlocker blocker(m_enumList);
-        item->setText(IndexColumn, QString::number(index));
-    }
-    addDefaultEnumItem();
-}
-
-void SgCreatePropertyDlg::swapEnumLabels(QTreeWidgetItem *upper, QTreeWidgetItem *lower) {
-    const int upperRow = m_enumList->indexOfTopLevelItem(upper);
-    const QString upperLabel = upper->text(LabelColumn);
-    const QString lowerLabel = lower->text(LabelColumn);
-    {
-        const QSignalBlocker blocker(m_enumList);
-        upper->setText(LabelColumn, lowerLabel);
-        lower->setText(LabelColumn, upperLabel);
-    }
-    for (SgEnumSlider *slider : {m_enumValue, m_enumDefault}) {
-        slider->renameItem(upperRow, lowerLabel);
-        slider->renameItem(upperRow + 1, upperLabel);
-    }
+    m_enumPage->rename(item, text);
 }
 
 void SgCreatePropertyDlg::moveEnumUp() {
-    QTreeWidgetItem *current = m_enumList->currentItem();
-    if (!current || current == enumPlaceholder())
-        return;
-    const int row = m_enumList->indexOfTopLevelItem(current);
-    if (row <= 0)
-        return;
-    QTreeWidgetItem *previous = m_enumList->topLevelItem(row - 1);
-    swapEnumLabels(previous, current);
-    m_enumList->setCurrentItem(previous);
+    m_enumPage->moveUp();
 }
 
 void SgCreatePropertyDlg::moveEnumDown() {
-    QTreeWidgetItem *current = m_enumList->currentItem();
-    if (!current)
-        return;
-    const int row = m_enumList->indexOfTopLevelItem(current);
-    QTreeWidgetItem *next = m_enumList->topLevelItem(row + 1);
-    if (row < 0 || !next || next == enumPlaceholder())
-        return;
-    swapEnumLabels(current, next);
-    m_enumList->setCurrentItem(next);
+    m_enumPage->moveDown();
 }
 
 void SgCreatePropertyDlg::removeEnum() {
-    QTreeWidgetItem *current = m_enumList->currentItem();
-    if (!current || current == enumPlaceholder())
-        return;
-    const int row = m_enumList->indexOfTopLevelItem(current);
-    if (row < 0)
-        return;
-    {
-        const QSignalBlocker blocker(m_enumList);
-        delete current;
-    }
-    m_enumValue->removeItem(row);
-    m_enumDefault->removeItem(row);
-    renumberEnumRows();
-}
-
-void SgCreatePropertyDlg::renumberEnumRows() {
-    const QSignalBlocker blocker(m_enumList);
-    for (int row = 0; row + 1 < m_enumList->topLevelItemCount(); ++row)
-        m_enumList->topLevelItem(row)->setText(IndexColumn, QString::number(row));
+    m_enumPage->remove();
 }

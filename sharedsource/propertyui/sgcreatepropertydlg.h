@@ -1,6 +1,5 @@
 #pragma once
 
-#include <QColor>
 #include <QDialog>
 #include <QList>
 #include <QPoint>
@@ -9,32 +8,40 @@
 
 #include "sgcore/scene/sglistiterator.h"
 
-class QCheckBox;
 class QComboBox;
 class QGroupBox;
 class QGridLayout;
 class QLabel;
 class QLineEdit;
-class QTreeWidget;
 class QTreeWidgetItem;
 class QVBoxLayout;
 class SgBoolButton;
-class SgColorWgt;
+class SgBoolPropertyPage;
+class SgColorPropertyPage;
 class SgElement;
-class SgEnumSlider;
-class SgFloatSlider;
-class SgImageMenu;
-class SgIntSlider;
+class SgEnumPropertyPage;
+class SgFloatPropertyPage;
+class SgImagePropertyPage;
+class SgIntPropertyPage;
+class SgMorphOptionsPage;
 class SgNode;
-class SgNodeMenu;
+class SgNodePropertyPage;
+class SgNumericNodePropertyPage;
+class SgNumericPropertyPage;
 class SgProperty;
+class SgPropertyPage;
 class SgSkeleton;
-class SgTexture;
 
 // The modal dialog in which the user defines one new property: its type (one of nine), its
 // identity (path, name, label) and the attributes of its type. On "Create" the input is validated;
 // with create-on-accept the dialog then creates one property on every creation node, otherwise it
 // only closes accepted and the caller asks `createProperty` for one unattached property.
+//
+// The dialog holds the base attributes (path, name, label, hidden, locked, can animate) and
+// dispatches the rest to its pages (`SgPropertyPage`), one per group box: each page builds its
+// rows, restores its defaults, saves and restores its values, and validates and configures the
+// property of the types that show it. The window title is set at construction and kept current,
+// so that the dialog run with `exec` shows it too.
 //
 // Every node, texture and property pointer the dialog holds is non-owning. Properties returned by
 // `createProperty` belong to the caller; properties added to nodes belong to the nodes.
@@ -89,7 +96,7 @@ public slots:
     void setDefaultPath(QString path);
     // Hides (true) or shows the path edit and its label; the path defaults box stays.
     void setPathReadOnly(bool readOnly);
-    // Replaces the creation nodes by `list`, in order.
+    // Replaces the creation nodes by `list`, in order, without null entries and repeats.
     void setCreationNodes(SgNodeList &list);
     // Appends `node` unless it is null or already a creation node.
     void insertCreationNode(SgNode *node);
@@ -128,67 +135,53 @@ protected:
     bool eventFilter(QObject *watched, QEvent *event) override;
 
 private:
-    struct SavedValues {
+    // The base attributes' values as saved when the dialog is shown.
+    struct BaseValues {
         QString path, name, label;
-        bool hidden = false, locked = false, canAnimate = true, obeyLimits = true;
-        bool displayAsPercent = true, boolValue = false, boolDefault = false, requiresNode = false;
-        bool emptyMorph = false;
-        float floatValue = 0, floatDefault = 0, floatMin = -1, floatMax = 1, floatSensitivity = 0;
-        qint32 intValue = 0, intDefault = 0, intMin = -1, intMax = 1, intSensitivity = 1;
-        qint32 enumValue = 0, enumDefault = 0;
-        QColor color, defaultColor;
-        QStringList enumLabels;
-        SgTexture *image = nullptr;
-        SgNode *node = nullptr, *defaultNode = nullptr, *numericNode = nullptr;
+        bool hidden = false, locked = false, canAnimate = true;
     };
 
-    // Page building.
-    QGroupBox *newPage(const QString &title, const QString &name, QGridLayout *&grid);
-    QLabel *addRow(QGridLayout *grid, int row, const QString &text, const QString &labelName,
-                   QWidget *widget);
-    SgBoolButton *newYesNoButton(QWidget *parent, const QString &name);
-    SgFloatSlider *newFloatSlider(QWidget *parent, const QString &name);
-    SgIntSlider *newIntSlider(QWidget *parent, const QString &name, bool textEditable);
     void buildTypeRow();
     void buildBasePage();
-    void buildImagePage();
-    void buildNodePage();
-    void buildNumericPage();
-    void buildFloatPage();
-    void buildNumericNodePage();
-    void buildIntPage();
-    void buildBoolPage();
-    void buildColorPage();
-    void buildEnumPage();
-    void buildAdditionalOptionsPage();
+    void buildPages();
     void buildButtonRow();
+    void connectEnumEditor();
+    void alignLabelColumns();
+    void updateTitle();
+    // The pages the current type shows, in the dialog's order.
+    QList<SgPropertyPage *> pagesOfType(int type) const;
+    QList<SgPropertyPage *> allPages() const;
 
-    // State.
     void restoreDefaults();
-    void clearEnumList();
-    QStringList enumLabels() const;
-    QTreeWidgetItem *enumPlaceholder() const;
-    void renumberEnumRows();
-    void swapEnumLabels(QTreeWidgetItem *upper, QTreeWidgetItem *lower);
     void fillChoosers();
-    void configureFloat(SgProperty *property) const;
+    SgProperty *createTypedProperty(SgElement **owner) const;
     void configureBase(SgProperty *property) const;
     void warn(const QString &text);
     QList<SgNode *> sceneNodes() const;
     QList<SgNode *> sceneSkeletons() const;
 
-    // Pages, type row and main layout.
+    // Type row, base attributes, button row and main layout.
     QWidget *m_typeRow = nullptr;
-    QGroupBox *m_basePage = nullptr, *m_imagePage = nullptr, *m_nodePage = nullptr;
-    QGroupBox *m_numericPage = nullptr, *m_floatPage = nullptr, *m_numericNodePage = nullptr;
-    QGroupBox *m_intPage = nullptr, *m_boolPage = nullptr, *m_colorPage = nullptr;
-    QGroupBox *m_enumPage = nullptr, *m_additionalOptionsPage = nullptr, *m_buttonRow = nullptr;
+    QGroupBox *m_basePage = nullptr, *m_buttonRow = nullptr;
     QVBoxLayout *m_mainLayout = nullptr;
-
     QComboBox *m_typeBox = nullptr;
     QComboBox *m_pathDefaults = nullptr;
-    QCheckBox *m_createAsMorph = nullptr;
-    QCheckBox *m_createAfterJoint = nullptr;
+    SgBoolButton *m_hidden = nullptr, *m_locked = nullptr, *m_canAnimate = nullptr;
+    QLineEdit *m_pathEdit = nullptr, *m_nameEdit = nullptr, *m_labelEdit = nullptr;
+    QLabel *m_pathLabel = nullptr;
+    QList<QLabel *> m_baseLabels;
+
+    // The pages, in the dialog's order.
+    SgImagePropertyPage *m_imagePage = nullptr;
+    SgNodePropertyPage *m_nodePage = nullptr;
+    SgNumericPropertyPage *m_numericPage = nullptr;
+    SgFloatPropertyPage *m_floatPage = nullptr;
+    SgNumericNodePropertyPage *m_numericNodePage = nullptr;
+    SgIntPropertyPage *m_intPage = nullptr;
+    SgBoolPropertyPage *m_boolPage = nullptr;
+    SgColorPropertyPage *m_colorPage = nullptr;
+    SgEnumPropertyPage *m_enumPage = nullptr;
+    SgMorphOptionsPage *m_morphOptionsPage = nullptr;
 
     bool m_singleType = false;
     bool m_defaultLabelSet = false;
@@ -201,24 +194,5 @@ private:
     std::optional<QList<SgNode *>> m_nodeMenuNodes;
     std::optional<QList<SgNode *>> m_skeletonMenuNodes;
 
-    // Page widgets.
-    QTreeWidget *m_enumList = nullptr;
-    SgEnumSlider *m_enumValue = nullptr, *m_enumDefault = nullptr;
-    SgColorWgt *m_color = nullptr, *m_defaultColor = nullptr;
-    SgBoolButton *m_boolValue = nullptr, *m_boolDefault = nullptr;
-    QLabel *m_nodeLabel = nullptr, *m_defaultNodeLabel = nullptr;
-    SgNodeMenu *m_nodeMenu = nullptr, *m_defaultNodeMenu = nullptr, *m_numericNodeMenu = nullptr;
-    SgBoolButton *m_requiresNode = nullptr;
-    SgBoolButton *m_obeyLimits = nullptr;
-    SgFloatSlider *m_floatMin = nullptr, *m_floatMax = nullptr, *m_floatSensitivity = nullptr;
-    SgFloatSlider *m_floatValue = nullptr, *m_floatDefault = nullptr;
-    SgBoolButton *m_displayAsPercent = nullptr;
-    SgIntSlider *m_intMin = nullptr, *m_intMax = nullptr, *m_intSensitivity = nullptr;
-    SgIntSlider *m_intValue = nullptr, *m_intDefault = nullptr;
-    SgImageMenu *m_imageMenu = nullptr;
-    SgBoolButton *m_hidden = nullptr, *m_locked = nullptr, *m_canAnimate = nullptr;
-    QLineEdit *m_pathEdit = nullptr, *m_nameEdit = nullptr, *m_labelEdit = nullptr;
-    QLabel *m_pathLabel = nullptr;
-
-    SavedValues m_saved;
+    BaseValues m_saved;
 };

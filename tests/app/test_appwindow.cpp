@@ -26,6 +26,7 @@
 #include "sgcore/scene/sgscene.h"
 #include "sgcore/scene/sgskeleton.h"
 #include "tests/support/sgtestmain.h"
+#include "tests/support/sgwidgetfit.h"
 #include "tests/ui/uitesthelpers.h"
 
 #include <QApplication>
@@ -39,6 +40,7 @@
 #include <QLineEdit>
 #include <QMenu>
 #include <QMenuBar>
+#include <QMessageBox>
 #include <QPushButton>
 #include <QTimer>
 #include <QToolBar>
@@ -157,11 +159,6 @@ TEST(AppWindow, ShowsThePluginActionTheSceneAndItsProperties) {
     // The host log reaches the log pane.
     sgApp->log(QStringLiteral("window smoke test"));
     EXPECT_TRUE(window.logPane()->toPlainText().contains(QStringLiteral("window smoke test")));
-
-    const QString artifacts = qEnvironmentVariable("SG_TEST_ARTIFACTS", QDir::tempPath());
-    QDir().mkpath(artifacts);
-    const QString shot = QDir(artifacts).filePath(QStringLiteral("scenara-window.png"));
-    EXPECT_TRUE(window.grab().save(shot)) << shot.toStdString();
     scene->clear();
 }
 
@@ -223,9 +220,16 @@ TEST(AppWindow, SavesReopensAndNeverLosesChangesSilently) {
     actionNamed(window, "SgFrameSelectionAction")->trigger();
     EXPECT_GT(view->framedBox().max.y, framed.max.y); // the grown figure alone
 
-    // Closing asks; "Cancel" keeps the window and the changes.
+    // Closing asks, in a box whose texts fit; "Cancel" keeps the window and the changes.
     QString question;
-    uitest::answerMessageBox(&question, QStringLiteral("Cancel"));
+    uitest::onNextModal([&question](QWidget *modal) {
+        auto *box = qobject_cast<QMessageBox *>(modal);
+        ASSERT_NE(box, nullptr);
+        question = box->text();
+        const QStringList cut = sgCutTexts(box);
+        EXPECT_TRUE(cut.isEmpty()) << cut.join('\n').toStdString();
+        box->button(QMessageBox::Cancel)->click();
+    });
     EXPECT_FALSE(window.close());
     EXPECT_TRUE(question.contains(QStringLiteral("scene.json has unsaved changes")));
     EXPECT_TRUE(window.isVisible());
@@ -301,6 +305,8 @@ TEST(AppWindow, PreferencesHoldTheModelerPathAndTheImportRoad) {
         const QString artifacts = qEnvironmentVariable("SG_TEST_ARTIFACTS", QDir::tempPath());
         QDir().mkpath(artifacts);
         dialog->grab().save(QDir(artifacts).filePath(QStringLiteral("scenara-preferences.png")));
+        const QStringList cut = sgCutTexts(dialog);
+        EXPECT_TRUE(cut.isEmpty()) << cut.join('\n').toStdString();
         dialog->installPathEdit()->setText(QStringLiteral("/opt/facetor"));
         dialog->bridgeToolsBox()->setChecked(true);
         dialog->accept();
@@ -342,6 +348,10 @@ TEST(AppWindow, PictureAtTheDefaultSize) {
     control->setIsClamped(true);
     control->setValue(1);
     figure->addProperty(control);
+    auto *named = new SgFloatProperty(QStringLiteral("BellySmootherLeft"));
+    named->setLabel(QStringLiteral("Belly Smoother Left"));
+    named->setPath(QStringLiteral("Morphs/Body"));
+    figure->addProperty(named);
     for (SgBone *bone : figure->getAllBones()) {
         const SgVertexMesh *base = bone->getObject()->getCurrentShape()->getGeometry();
         auto *deltas = new SgMorphDeltas;
@@ -369,6 +379,9 @@ TEST(AppWindow, PictureAtTheDefaultSize) {
     QDir().mkpath(artifacts);
     const QString shot = QDir(artifacts).filePath(QStringLiteral("scenara-main-window.png"));
     EXPECT_TRUE(window.grab().save(shot)) << shot.toStdString();
+    // Every menu title, tree row (the property panel's whole labels) and tool button fits.
+    const QStringList cut = sgCutTexts(&window);
+    EXPECT_TRUE(cut.isEmpty()) << cut.join('\n').toStdString();
     scene->clear();
 }
 

@@ -6,6 +6,7 @@
 #include "sgcore/app/sghelpmgr.h"
 #include "sgcore/properties/sgfloatproperty.h"
 #include "sgcore/scene/sgnode.h"
+#include "tests/support/sgwidgetfit.h"
 
 #include <QCheckBox>
 #include <QComboBox>
@@ -82,6 +83,8 @@ TEST(BridgeMorphDlg, OnlyMorphActionsEnableTheMorphSettings) {
     bridgetest::app();
     SgBridgeMorphDlg dlg(QStringLiteral("Hat"), nullptr, nullptr);
     dlg.show();
+    // At its default size every text of the dialog is whole.
+    EXPECT_EQ(sgCutTexts(&dlg), QStringList());
     const auto morphControlsEnabled = [&] {
         return groupCombo(dlg)->isEnabled() + nameEdit(dlg)->isEnabled() +
                overrideBox(dlg)->isEnabled();
@@ -93,6 +96,19 @@ TEST(BridgeMorphDlg, OnlyMorphActionsEnableTheMorphSettings) {
         EXPECT_EQ(morphControlsEnabled(), expected[index]) << index;
         EXPECT_EQ(dlg.getActionText(), actionCombo(dlg)->itemText(index));
     }
+
+    // A blank morph name cannot be taken for a morph action; the other actions need none.
+    QPushButton *ok = dlg.buttonBox()->button(QDialogButtonBox::Ok);
+    nameEdit(dlg)->setText("  ");
+    EXPECT_FALSE(ok->isEnabled());
+    QTest::keyClick(&dlg, Qt::Key_Return);
+    EXPECT_TRUE(dlg.isVisible());
+    pickAction(dlg, 3);
+    EXPECT_TRUE(ok->isEnabled());
+    pickAction(dlg, 0);
+    EXPECT_FALSE(ok->isEnabled());
+    QTest::keyClicks(nameEdit(dlg), "x");
+    EXPECT_TRUE(ok->isEnabled());
 }
 
 TEST(BridgeMorphDlg, TypedValuesComeBackWithForwardSlashes) {

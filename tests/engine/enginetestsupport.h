@@ -11,6 +11,7 @@
 #include "sgcore/scene/sgbone.h"
 #include "sgcore/scene/sgscene.h"
 #include "sgcore/scene/sgskeleton.h"
+#include "sharedsource/engine/sgmorphloaderquestions.h"
 
 #include <QApplication>
 #include <QDialog>
@@ -23,8 +24,10 @@
 
 #include <gtest/gtest.h>
 
+#include <deque>
 #include <functional>
 #include <memory>
+#include <optional>
 #include <vector>
 
 namespace enginetest {
@@ -78,6 +81,33 @@ inline void answerMessageBox(QMessageBox::StandardButton button, QStringList *se
             box->close();
     });
 }
+
+// Answers the loader's questions without dialogs: each name question takes the next of `names`
+// (nullopt cancels; none left cancels too) and records the name it was asked about; each pose
+// question takes the next of `poses` (none left: false).
+struct ScriptedQuestions : SgMorphLoaderQuestions {
+    std::deque<std::optional<QString>> names;
+    std::deque<bool> poses;
+    QStringList askedAbout;
+
+    bool askNewMorphName(const QString &name, QString &newName) override {
+        askedAbout << name;
+        if (names.empty() || !names.front()) {
+            names.clear();
+            return false;
+        }
+        newName = *names.front();
+        names.pop_front();
+        return true;
+    }
+    bool continueWithoutPose(const QString &poseFile, const QString &) override {
+        askedAbout << poseFile;
+        const bool answer = !poses.empty() && poses.front();
+        if (!poses.empty())
+            poses.pop_front();
+        return answer;
+    }
+};
 
 // A polygon mesh of `count` vertices at (i, 2i, 3i) with quads over consecutive vertices.
 inline SgPolyMesh *makeMesh(int count, float offset = 0.0f) {

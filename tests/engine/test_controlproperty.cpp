@@ -80,6 +80,26 @@ TEST_F(ControlProperty, WithoutControlNodeMorphsAreMadeUnlinkedWithOneWarningEac
                              "could not be created."));
 }
 
+TEST_F(ControlProperty, ANamesakeThatIsNotAFloatPropertyGetsNoLinkAndTheLogSaysSo) {
+    TwoProps props;
+    auto *controls = new SgNode("Controls");
+    scene()->addNode(controls);
+    controls->addProperty(new SgIntProperty("Smile"));
+    props.loader.setControlNode(controls);
+    MessageCatcher catcher;
+    props.run();
+    ASSERT_TRUE(channelOf(props.a, "Smile") && channelOf(props.b, "Smile"));
+    EXPECT_EQ(channelOf(props.a, "Smile")->getControllerCount(), 0);
+    EXPECT_EQ(props.loader.controlProperty(), nullptr);
+    EXPECT_TRUE(catcher.lines().contains("The control node's property of the morph's name is not "
+                                         "a float property - control link could not be created."));
+    EXPECT_TRUE(props.log.hasProblems());
+    EXPECT_TRUE(props.log.toHtml().contains("Warning: </FONT>The property Smile on Controls is "
+                                            "not a float property: the morph is not linked to a "
+                                            "control property.<BR>\n</BODY>"))
+        << props.log.toHtml().toStdString();
+}
+
 TEST_F(ControlProperty, FirstMorphOnTheControlNodeDrivesTheOthers) {
     TwoProps props;
     QSignalSpy spy(&props.loader, &SgMorphLoader::controlPropertyChanged);

@@ -95,6 +95,15 @@ TEST_F(Deltas, CountMismatchAndInvalidTargetsGiveNoTable) {
                       QString("Morph target has invalid coordinates - delta calculation failed."));
         }
     }
+    // The fault in the node's own geometry is named as such, in a full block and in the tail.
+    for (int at : {3, 70}) {
+        std::unique_ptr<SgPolyMesh> broken(makeMesh(72));
+        std::unique_ptr<SgPolyMesh> morph(copyVertices(*broken));
+        broken->setVertex(at, SgVec3(std::numeric_limits<float>::infinity(), 0.0f, 0.0f));
+        EXPECT_EQ(SgMorphLoader::computeDeltas(*broken, *morph), nullptr);
+        EXPECT_EQ(statusLines().last(),
+                  QString("Base geometry has invalid coordinates - delta calculation failed."));
+    }
 }
 
 TEST_F(Deltas, TableKeepsVertexOrderAndAppliesWithWeight) {

@@ -10,6 +10,7 @@
 
 #include "tests/support/sgtestfigure.h"
 
+#include <limits>
 #include <memory>
 
 using namespace enginetest;
@@ -96,40 +97,45 @@ TEST_F(MorphCreation, UnchangedOrMismatchedTargetsLeaveTheNodeAlone) {
     EXPECT_EQ(logLines().last(), QString("No object found, skipping node."));
 }
 
-TEST_F(MorphCreation, MakeUniqueAsksUntilTheNameIsFreeOrTheUserCancels) {
+TEST_F(MorphCreation, MakeUniqueAsksUntilTheNameIsFreeAndNotBlankOrTheUserCancels) {
     Prop prop;
     prop.create(prop.target(1, SgVec3(1, 0, 0)));
     ASSERT_TRUE(morphOn(prop.node, "Smile"));
 
-    // The first answer is taken too, the second is free.
+    // A taken name and a blank one are both asked again; the third answer is free.
+    ScriptedQuestions questions;
+    questions.names = {QString("Smile"), QString("  "), QString(""), QString("Grin")};
+    prop.loader.setQuestions(&questions);
     SgPolyMesh *target = prop.target(2, SgVec3(1, 0, 0));
     target->ref();
-    int asked = 0;
-    QString title, label;
-    whenModal([&](QWidget *first) {
-        ++asked;
-        title = first->windowTitle();
-        label = static_cast<QInputDialog *>(first)->labelText();
-        answerInput("Grin");
-        static_cast<QInputDialog *>(first)->setTextValue("Smile");
-        static_cast<QInputDialog *>(first)->accept();
-    });
     prop.loader.createMorphForNode(target, prop.node, prop.log);
-    EXPECT_EQ(asked, 1);
-    EXPECT_EQ(title, QString("Morph Already Exists"));
-    EXPECT_EQ(label, QString("A morph named \"Smile\" already exists. Please enter a new name for "
-                             "the morph:"));
+    EXPECT_EQ(questions.askedAbout, QStringList({"Smile", "Smile", "  ", ""}));
     EXPECT_EQ(prop.loader.morphName(), QString("Grin"));
     ASSERT_TRUE(morphOn(prop.node, "Grin"));
     EXPECT_EQ(morphOn(prop.node, "Grin")->getDeltas()->getVertex(0), 2);
+    EXPECT_FALSE(morphOn(prop.node, ""));
 
     SgMorphLoadLog cancelled;
     prop.loader.setMorphName("Smile");
-    answerInput(QString(), false);
+    questions.names = {std::nullopt};
     prop.loader.createMorphForNode(target, prop.node, cancelled);
     EXPECT_EQ(cancelled.toHtml(), QString("<HTML><HEAD></HEAD><BODY>\n<FONT COLOR=#0000ff>"
                                           "Warning: </FONT>User cancelled.<BR>\n</BODY>"));
     EXPECT_EQ(prop.node->getObject()->getModifierCount(), 2);
+
+    // Without questions of its own the loader asks with the host's input dialog.
+    prop.loader.setQuestions(nullptr);
+    QString title, label;
+    whenModal([&](QWidget *modal) {
+        auto *dialog = qobject_cast<QInputDialog *>(modal);
+        title = modal->windowTitle();
+        label = dialog ? dialog->labelText() : QString();
+        modal->close();
+    });
+    prop.loader.createMorphForNode(target, prop.node, cancelled);
+    EXPECT_EQ(title, QString("Morph Already Exists"));
+    EXPECT_EQ(label, QString("A morph named \"Smile\" already exists. Please enter a new name for "
+                             "the morph:"));
     target->unref();
 }
 
@@ -175,18 +181,62 @@ TEST_F(MorphCreation, OverrideReplacesDeltasKeepsPlaceAndHandlesLinks) {
     EXPECT_EQ(prop.node->getObject()->getModifierIndex(smile), 0);
 }
 
-TEST_F(MorphCreation, OrphanCleanUpRemovesUnlinkedMorphsOnlyWhenOverriding) {
+TEST_F(MorphCreation, OrphanCleanUpFollowsOnlyARunThatMadeMorphsAndNamesWhatItRemoves) {
+    // Two props with an unlinked "Smile" each, reloaded with override and clean-up on.
     Prop prop;
-    prop.create(prop.target(1, SgVec3(1, 0, 0))); // "Smile" without any link
+    auto *other = makeNodeWithMesh("Other", makeMesh(12));
+    scene()->addNode(other);
+    prop.create(prop.target(1, SgVec3(1, 0, 0)));
+    SgPolyMesh *first = prop.target(1, SgVec3(1, 0, 0));
+    first->ref();
+    prop.loader.createMorphForNode(first, other, prop.log);
+    first->unref();
+    ASSERT_TRUE(morphOn(prop.node, "Smile") && morphOn(other, "Smile"));
     prop.loader.setOverride(SgMorphLoader::DeltasAndLinks);
+    const auto reload = [&](SgPolyMesh *target, QList<SgNode *> nodes) {
+        auto log = std::make_unique<SgMorphLoadLog>();
+        target->ref();
+        prop.loader.createMorphForNodes(target, nodes, *log);
+        target->unref();
+        return log->toHtml();
+    };
 
+    // A target that moves nothing, one of the wrong size, and a single node without deltas
+    // make no morph: nothing is removed.
+    QString html = reload(copyVertices(*baseOf(prop.node)), {prop.node, other});
+    EXPECT_TRUE(html.contains("Geometry did not match, no morphs created.")) << html.toStdString();
+    html = reload(makeMesh(10), {prop.node, other});
+    EXPECT_TRUE(html.contains("The vertex count of Box does not match the target (12:10, "
+                              "Base:Morph). No morphs created."))
+        << html.toStdString();
+    prop.create(copyVertices(*baseOf(prop.node)));
+    EXPECT_TRUE(morphOn(prop.node, "Smile") && morphOn(other, "Smile"));
+    EXPECT_FALSE(html.contains("Removed"));
+
+    // With clean-up off nothing goes either.
     prop.loader.setCleanUpOrphans(false);
-    prop.create(copyVertices(*baseOf(prop.node)));
-    EXPECT_TRUE(morphOn(prop.node, "Smile"));
+    auto *twoNodes = new SgPolyMesh; // Box moves, Other does not: one shared target
+    twoNodes->setVertexArray(12);
+    for (int i = 0; i < 12; ++i)
+        twoNodes->setVertex(i, baseOf(prop.node)->getVertex(i));
+    twoNodes->setVertex(4, twoNodes->getVertex(4) + SgVec3(0, 0, 1));
+    auto *otherBase = baseOf(other);
+    otherBase->setVertex(4, otherBase->getVertex(4) + SgVec3(0, 0, 1)); // Other sees no motion
+    twoNodes->ref();
+    reload(twoNodes, {prop.node, other});
+    EXPECT_TRUE(morphOn(other, "Smile"));
 
+    // A run that made a morph removes the orphan of the node that got none, and says so.
     prop.loader.setCleanUpOrphans(true);
-    prop.create(copyVertices(*baseOf(prop.node)));
-    EXPECT_FALSE(morphOn(prop.node, "Smile"));
+    html = reload(twoNodes, {prop.node, other});
+    twoNodes->unref();
+    EXPECT_TRUE(html.contains("Created morph successfully.<BR>\nRemoved orphaned morph Smile "
+                              "from Other.<BR>"))
+        << html.toStdString();
+    ASSERT_TRUE(morphOn(prop.node, "Smile"));
+    EXPECT_EQ(morphOn(prop.node, "Smile")->getDeltas()->getVertex(0), 4);
+    EXPECT_FALSE(morphOn(other, "Smile"));
+    EXPECT_TRUE(logLines().contains("Removed orphaned morph Smile from Other."));
 }
 
 namespace {
@@ -283,6 +333,131 @@ TEST_F(MorphCreation, NodeListMatchesBoneGroupsByNameOrLabelAndFiguresByBody) {
     loader.createMorphForNodes(fig.target, {tail}, none);
     EXPECT_TRUE(logLines().contains("No morph geometry found, skipping node."));
     EXPECT_TRUE(none.toHtml().contains("Geometry did not match, no morphs created."));
+}
+
+namespace {
+
+// Two bones "a" and "b" of `count` vertices each and a target whose face groups "a" and "b"
+// hold vertices 0..count-1 and count..2*count-1, equal to the bones' own.
+struct TwoBones {
+    static constexpr int count = 130; // two full 64-vertex scan blocks and a tail of 2
+    SgSkeleton *figure = new SgSkeleton("Fig");
+    SgBone *a = makeNodeWithMesh<SgBone>("a", makeMesh(count));
+    SgBone *b = makeNodeWithMesh<SgBone>("b", makeMesh(count, 500.0f));
+    SgPolyMesh *target = new SgPolyMesh;
+
+    TwoBones() {
+        figure->addBone(a);
+        figure->addBone(b, a);
+        sgApp->getScene()->addNode(figure);
+        target->ref();
+        regroup(false);
+    }
+    ~TwoBones() { target->unref(); }
+    // Rebuilds the target; `swapped` gives group "a" the second half and "b" the first.
+    void regroup(bool swapped) {
+        target->beginEdit(true);
+        SgVec3 *v = target->setVertexArray(2 * count);
+        for (int i = 0; i < count; ++i) {
+            v[i] = baseOf(swapped ? b : a)->getVertex(i);
+            v[count + i] = baseOf(swapped ? a : b)->getVertex(i);
+        }
+        // The groups keep their indices; only the halves they cover change.
+        const int a = target->addFaceGroup("a");
+        const int b = target->addFaceGroup("b");
+        for (int half = 0; half < 2; ++half) {
+            target->setActiveFaceGroup((half == 0) != swapped ? a : b);
+            for (int i = 0; i + 2 < count; ++i) {
+                target->startFace();
+                for (int k : {0, 1, 2})
+                    target->addFaceEdge(half * count + i + k);
+                target->finishFace();
+            }
+        }
+        target->finishEdit();
+    }
+};
+
+} // namespace
+
+TEST_F(MorphCreation, ATargetThatFailsOnOneBoneMakesNoMorphOnAny) {
+    const float nan = std::numeric_limits<float>::quiet_NaN();
+    const float inf = std::numeric_limits<float>::infinity();
+    // Bone a moves validly; bone b's part of the target is broken in a full scan block (vertex
+    // 10), in the tail (vertex 129), or only in the block after a block that moved throughout.
+    for (int bad : {10, TwoBones::count - 1, 64}) {
+        TwoBones bones;
+        auto *controls = new SgNode("Controls");
+        scene()->addNode(controls);
+        SgMorphLoader loader;
+        loader.setMorphName("Sculpt");
+        loader.setControlNode(controls);
+        const SgVec3 at = bones.target->getVertex(3);
+        bones.target->setVertex(3, at + SgVec3(0, 1, 0));
+        if (bad == 64) // every vertex of b's first block moves, then the fault
+            for (int i = 0; i < 64; ++i)
+                bones.target->setVertex(TwoBones::count + i,
+                                        bones.target->getVertex(TwoBones::count + i) +
+                                            SgVec3(1, 0, 0));
+        bones.target->setVertex(TwoBones::count + bad, SgVec3(0, bad == 10 ? nan : inf, 0));
+        SgMorphLoadLog log;
+        loader.createMorphForNodes(bones.target, {bones.a, bones.b}, log);
+        EXPECT_EQ(log.toHtml(), QString("<HTML><HEAD></HEAD><BODY>\n<FONT COLOR=#ff0000>Error: "
+                                        "</FONT>The target for b has coordinates that are not "
+                                        "finite numbers. No morphs created.<BR>\n</BODY>"))
+            << bad;
+        EXPECT_EQ(bones.a->getObject()->getModifierCount(), 0) << bad;
+        EXPECT_EQ(bones.b->getObject()->getModifierCount(), 0) << bad;
+        EXPECT_EQ(controls->getPropertyCount(), 0) << bad;
+        scene()->clear();
+    }
+
+    // A broken node mesh is named as such; one node alone says the same.
+    TwoBones bones;
+    SgMorphLoader loader;
+    loader.setMorphName("Sculpt");
+    bones.target->setVertex(3, bones.target->getVertex(3) + SgVec3(0, 1, 0));
+    baseOf(bones.b)->setVertex(5, SgVec3(nan, 0, 0));
+    SgMorphLoadLog log;
+    loader.createMorphForNodes(bones.target, {bones.a, bones.b}, log);
+    EXPECT_TRUE(log.toHtml().contains("The geometry of b has coordinates that are not finite "
+                                      "numbers. No morphs created."))
+        << log.toHtml().toStdString();
+    EXPECT_EQ(bones.a->getObject()->getModifierCount(), 0);
+    SgPolyMesh *alone = copyVertices(*baseOf(bones.a));
+    alone->setVertex(100, SgVec3(0, 0, inf));
+    alone->ref();
+    SgMorphLoadLog single;
+    loader.createMorphForNode(alone, bones.a, single);
+    alone->unref();
+    EXPECT_TRUE(single.toHtml().contains("Error: </FONT>The target for a has coordinates that "
+                                         "are not finite numbers. No morph created."))
+        << single.toHtml().toStdString();
+    EXPECT_EQ(bones.a->getObject()->getModifierCount(), 0);
+}
+
+TEST_F(MorphCreation, FaceGroupsAreGatheredAgainForEveryRun) {
+    // The same mesh object regrouped between two runs: the second run must not use the groups
+    // of the first.
+    TwoBones bones;
+    SgMorphLoader loader;
+    loader.setMorphName("First");
+    loader.setCreateControl(false);
+    const int moved = 7; // vertex 7 of the first half
+    bones.target->setVertex(moved, bones.target->getVertex(moved) + SgVec3(0, 0, 2));
+    SgMorphLoadLog log;
+    loader.createMorphForNodes(bones.target, {bones.a, bones.b}, log);
+    ASSERT_TRUE(morphOn(bones.a, "First"));
+    EXPECT_FALSE(morphOn(bones.b, "First"));
+
+    bones.regroup(true); // now the first half is b's
+    bones.target->setVertex(moved, bones.target->getVertex(moved) + SgVec3(0, 0, 2));
+    loader.setMorphName("Second");
+    loader.createMorphForNodes(bones.target, {bones.a, bones.b}, log);
+    EXPECT_FALSE(morphOn(bones.a, "Second"));
+    ASSERT_TRUE(morphOn(bones.b, "Second"));
+    EXPECT_EQ(morphOn(bones.b, "Second")->getDeltas()->getVertex(0), moved);
+    EXPECT_FALSE(log.hasProblems()) << log.toHtml().toStdString();
 }
 
 TEST_F(MorphCreation, WeldedFigureTargetsBecomeOneLinkedMorphPerMovedBone) {

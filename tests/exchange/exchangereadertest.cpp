@@ -114,9 +114,9 @@ TEST_F(ExchangeReaderTest, ReturnedRecordBecomesAShape) {
     EXPECT_FLOAT_EQ(m0->getBumpStrength(), 0.5f);
     ASSERT_TRUE(m0->getColorMap());
     EXPECT_TRUE(m0->getColorMap()->getFileName().endsWith("skin.jpg"));
-    // The returned bump image maps the bump strength and leaves the colour map alone.
-    ASSERT_TRUE(m0->getBumpMap());
-    EXPECT_TRUE(m0->getBumpMap()->getFileName().endsWith("bump.jpg"));
+    // The returned bump image is ignored: nothing is mapped to the bump strength.
+    EXPECT_FALSE(m0->getBumpControl()->isMapped());
+    EXPECT_FALSE(m0->getBumpControl()->getMapValue());
     EXPECT_EQ(materialAt(*shape, 1)->getSpecularColor(), QColor(0, 0, 255));
     EXPECT_FALSE(materialAt(*shape, 1)->getColorMap());
 }

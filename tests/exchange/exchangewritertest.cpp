@@ -19,6 +19,7 @@
 #include <QFile>
 #include <QFileInfo>
 #include <QImage>
+#include <QRegularExpression>
 
 #include <gtest/gtest.h>
 
@@ -27,6 +28,12 @@
 using namespace exchangetest;
 
 namespace {
+
+// Maps the material's "Bump Strength" to `texture` through the property, as the host does.
+void mapBump(SgDefaultMaterial &material, SgTexture *texture) {
+    material.getBumpControl()->setMapValue(texture);
+    material.getBumpControl()->setMapped(true);
+}
 
 class ExchangeWriterTest : public ::testing::Test {
 protected:
@@ -212,24 +219,32 @@ TEST_F(ExchangeWriterTest, MaterialEntryRules) {
     EXPECT_EQ(f32At(r, at + 10), 0.0f);
 }
 
-TEST_F(ExchangeWriterTest, ImagesAreCopiedAsJpegOncePerImageFile) {
+TEST_F(ExchangeWriterTest, ImagesAreCopiedAsJpegOncePerImageFileUnderSafeUniqueNames) {
     const QString source = writeImage(tempPath() + "/images/a/wood.png", Qt::red);
     const QString other = writeImage(tempPath() + "/images/b/wood.png", Qt::blue);
     SgTexture *wood = sgApp->getImageMgr()->getImage(source);
     SgTexture *otherWood = sgApp->getImageMgr()->getImage(other);
 
+    // A copy that an earlier run left under the plain base name is another image's: unused.
+    QDir().mkpath(tempPath() + "/FacetorMaps");
+    const QString stale = tempPath() + "/FacetorMaps/wood.jpg";
+    ASSERT_TRUE(QImage(4, 4, QImage::Format_RGB32).save(stale, "JPEG"));
+
     auto *first = new SgDefaultMaterial("first");
     first->setColorMap(wood);
     auto *second = new SgDefaultMaterial("second");
     second->setColorMap(wood);
-    second->setBumpMap(otherWood);
+    mapBump(*second, otherWood);
     auto node = prop("W", makeMesh({}), {first, second});
 
-    const QString copy = tempPath() + "/FacetorMaps/wood.jpg";
+    const QString copy = SgMaterialBlockWriter::jpegCopyPath(wood);
+    EXPECT_TRUE(QRegularExpression(".*/FacetorMaps/wood-[0-9a-f]{8}\\.jpg").match(copy).hasMatch())
+        << copy.toStdString();
     QFile::remove(copy);
     const QByteArray r = writeNode(node.get());
     ASSERT_FALSE(r.isEmpty());
-    EXPECT_TRUE(QFile::exists(copy));
+    EXPECT_FALSE(r.contains("/FacetorMaps/wood.jpg"));
+    EXPECT_GT(QImage(copy).pixelColor(1, 1).red(), 200);
     // Both materials name the same copy; its folder string is the image's folder.
     const QByteArray folder = (tempPath() + "/images/a").toLatin1();
     EXPECT_EQ(r.count(copy.toLatin1()), 2);
@@ -242,10 +257,19 @@ TEST_F(ExchangeWriterTest, ImagesAreCopiedAsJpegOncePerImageFile) {
     EXPECT_GT(otherPixel.blue(), 200);
     EXPECT_LT(otherPixel.red(), 60);
 
-    // An existing copy is not written again.
+    // An existing copy that is not older than its image is not written again.
     QFile::resize(copy, 3);
     EXPECT_EQ(SgMaterialBlockWriter::exportTextureAsJpeg(wood), copy);
     EXPECT_EQ(QFileInfo(copy).size(), 3);
+
+    // A name beyond 8 bits travels as an ASCII name the modeler can open.
+    const QString accented =
+        writeImage(tempPath() + QString::fromUtf8("/images/c/\u00e9t\u00e9 \u6728.png"), Qt::green);
+    const QString safe =
+        SgMaterialBlockWriter::exportTextureAsJpeg(sgApp->getImageMgr()->getImage(accented));
+    EXPECT_TRUE(QRegularExpression(".*/FacetorMaps/_t___-[0-9a-f]{8}\\.jpg").match(safe).hasMatch())
+        << safe.toStdString();
+    EXPECT_TRUE(QFile::exists(safe));
 
     // An image that cannot be read gives an empty copy path.
     SgTexture missing(tempPath() + "/images/none.png");
@@ -260,7 +284,7 @@ TEST_F(ExchangeWriterTest, LongImagePathsStayInsideTheMeasuredSize) {
         writeImage(deep + "/" + QString(200, QLatin1Char('n')) + ".png", Qt::green);
     auto *material = new SgDefaultMaterial("long");
     material->setColorMap(sgApp->getImageMgr()->getImage(source));
-    material->setBumpMap(sgApp->getImageMgr()->getImage(source));
+    mapBump(*material, sgApp->getImageMgr()->getImage(source));
     auto node = prop("L", makeMesh({}), {material});
 
     SgExchangeWriter writer(node.get(), QString());

@@ -186,7 +186,7 @@ TEST(HostSceneSave, AFailedSaveLeavesTheFileAndABadMorphIsRefusedWhole) {
     ASSERT_TRUE(file.save(path, &scene));
     const QByteArray saved = readAll(path);
     // Deltas that do not fit the geometry, or a link to nothing, are refused with their place,
-    // and nothing is added.
+    // and nothing is added (the deltas file's order and range checks are fuzzed).
     const QJsonObject root = QJsonDocument::fromJson(saved).object();
     using Edit = std::function<void(QJsonObject &)>;
     auto deltasFile = [](const char *name, const QByteArray &text) {
@@ -195,22 +195,14 @@ TEST(HostSceneSave, AFailedSaveLeavesTheFileAndABadMorphIsRefusedWhole) {
         file.write(text);
         return file.fileName();
     };
-    const QString descending = deltasFile("descending.deltas", "deltas 10\n4 0 0 0\n1 0 0 0\n");
-    const QString outside = deltasFile("outside.deltas", "deltas 10\n10 0 0 0\n");
     const QString shortLine = deltasFile("short.deltas", "deltas 10\n1 0.5 0\n");
     const Edit edits[] = {
         [](QJsonObject &m) { m.insert(QStringLiteral("vertexCount"), 11); },
-        [&](QJsonObject &m) { m.insert(QStringLiteral("deltas"), descending); },
-        [&](QJsonObject &m) { m.insert(QStringLiteral("deltas"), outside); },
         [&](QJsonObject &m) { m.insert(QStringLiteral("deltas"), shortLine); },
         [](QJsonObject &m) { m.insert(QStringLiteral("deltas"), QStringLiteral("missing")); },
         [](QJsonObject &m) {
             m.insert(QStringLiteral("vertices"), QJsonArray{1, 4});
             m.insert(QStringLiteral("deltas"), QJsonArray{1, 2, 3});
-        },
-        [](QJsonObject &m) {
-            m.insert(QStringLiteral("vertices"), QJsonArray{4, 1});
-            m.insert(QStringLiteral("deltas"), QJsonArray{1, 2, 3, 4, 5, 6});
         },
         [](QJsonObject &m) {
             QJsonObject channel = m.value(QStringLiteral("channel")).toObject();

@@ -4,6 +4,7 @@
 
 #include "sgcore/app/sgapp.h"
 #include "sgcore/app/sgappsettings.h"
+#include "sgcore/app/sgmessagesink.h"
 #include "sgcore/geometry/sgobject.h"
 #include "sgcore/geometry/sgpolyshape.h"
 #include "sgcore/io/sgobjreader.h"
@@ -28,6 +29,8 @@
 #include <QDomDocument>
 #include <QFile>
 #include <QFileDialog>
+#include <QLabel>
+#include <QLineEdit>
 #include <QMessageBox>
 #include <QPushButton>
 #include <QRadioButton>
@@ -414,6 +417,23 @@ TEST_F(MorphLoaderDlgTest, SaveThenLoadReproducesEveryRowAndTheControlProperty) 
     SgPropertySettings loadedAttributes;
     loaded->getAttributes(loadedAttributes);
     EXPECT_TRUE(loadedAttributes == savedAttributes);
+
+    // Loading again over a source whose control property is one of the scene's leaves that
+    // property as it is: the file's attributes go to a new, unattached property.
+    auto *existing = new SgFloatProperty("Existing");
+    existing->setLabel("Existing Label");
+    existing->setMax(5.0f);
+    m_figure->addProperty(existing);
+    topSource(dialog)->loader().setControlProperty(existing);
+    dialog.loadConfigurationFile(path("head.obj.scx"), m_dir.path());
+    EXPECT_EQ(existing->getName(), QString("Existing"));
+    EXPECT_EQ(existing->getLabel(), QString("Existing Label"));
+    EXPECT_FLOAT_EQ(existing->getMax(), 5.0f);
+    EXPECT_EQ(m_figure->findProperty("Existing"), existing);
+    loaded = topSource(dialog)->loader().controlProperty();
+    ASSERT_TRUE(loaded && loaded != existing);
+    EXPECT_EQ(loaded->getOwner(), nullptr);
+    EXPECT_EQ(loaded->getLabel(), QString("Smile Control"));
 }
 
 TEST_F(MorphLoaderDlgTest, SaveOptionsCancelAbsoluteAndWithoutObjects) {
@@ -489,9 +509,27 @@ TEST_F(MorphLoaderDlgTest, RunThenSecondOkAcceptsOnlyWithoutProblems) {
                             ->toHtml()
                             .contains("Created morph successfully."));
         }
-        ok->click();
+        // The heading and the status line tell how the run ended.
+        EXPECT_EQ(dialog.findChild<QLabel *>("MorphLoaderLogHeading")->text(),
+                  broken ? "Morphs Loaded, with Warnings or Errors:" : "Morphs Loaded:");
+        EXPECT_EQ(sgApp->getMessageSink()->currentStatus(),
+                  broken ? "Morphs loaded, with warnings or errors." : "Morphs loaded.");
+        // After the run Escape (or the close box) ends the dialog as the second "Ok" does.
+        if (broken)
+            ok->click();
+        else
+            QTest::keyClick(&dialog, Qt::Key_Escape);
         EXPECT_FALSE(dialog.isVisible());
         EXPECT_EQ(dialog.result(), broken ? QDialog::Rejected : QDialog::Accepted);
+    }
+    {
+        // Before the run Escape cancels.
+        SgMorphLoaderDlg dialog(nullptr, true, nullptr, nullptr);
+        dialog.show();
+        QTest::keyClick(&dialog, Qt::Key_Escape);
+        EXPECT_FALSE(dialog.isVisible());
+        EXPECT_EQ(dialog.result(), QDialog::Rejected);
+        EXPECT_EQ(dialog.findChild<QTextBrowser *>("MorphLoaderLog")->toPlainText(), "");
     }
     // The stored index comes back, unless the nodes box is fixed on the selected node.
     SgMorphLoaderDlg offered(nullptr, true, nullptr, nullptr);
@@ -539,4 +577,18 @@ TEST_F(MorphLoaderDlgTest, ChooseFilesStartsInDocumentsAndRemembersFolder) {
     EXPECT_EQ(directory, documents);
     EXPECT_EQ(listedPaths(dialog.sourceList()), QStringList{path("geo/a.obj")});
     EXPECT_EQ(SgAppSettings("TargetImporter").getString("LastDirectory"), path("geo"));
+
+    // A remembered folder that is gone opens its nearest existing parent, with no name typed.
+    SgAppSettings("TargetImporter").setString("LastDirectory", path("geo/gone/Scenara"));
+    QString typed = "unset";
+    ModalScript again({[&](QWidget *widget) {
+        auto *chooser = qobject_cast<QFileDialog *>(widget);
+        directory = chooser ? chooser->directory().absolutePath() : QString();
+        auto *name = chooser ? chooser->findChild<QLineEdit *>("fileNameEdit") : nullptr;
+        typed = name ? name->text() : QString();
+        widget->close();
+    }});
+    dialog.findChild<QPushButton *>("MorphLoaderBrowseBtn")->click();
+    EXPECT_EQ(directory, path("geo"));
+    EXPECT_EQ(typed, "");
 }

@@ -16,7 +16,6 @@
 #include <QDir>
 #include <QFile>
 #include <QImage>
-#include <QTemporaryDir>
 #include <QTextBrowser>
 #include <gtest/gtest.h>
 
@@ -45,11 +44,14 @@ bool saveShot(QWidget *widget, const QString &name) {
 
 class TargetImporterPictures : public ::testing::Test {
 protected:
-    QTemporaryDir dir;
+    // The sample targets live in a folder of a stable name, so that the pictures show the same
+    // paths on every run.
+    QDir dir{QDir::tempPath() + QStringLiteral("/Targets")};
     SgScene *scene = sgApp->getScene();
     SgSkeleton *figure = new SgSkeleton("Figure");
 
     void SetUp() override {
+        dir.mkpath(QStringLiteral("."));
         scene->clear();
         auto *neck = new SgBone("neck");
         auto *head = new SgBone("head");
@@ -78,7 +80,6 @@ protected:
 
 TEST_F(TargetImporterPictures, FileModeAndItsLogPage) {
     SgMorphLoaderDlg dialog(nullptr, true, nullptr, figure);
-    dialog.resize(620, 680);
     dialog.findChild<QComboBox *>("MorphLoaderNodes")->setCurrentIndex(0);
     SgMorphSourceList *list = dialog.sourceList();
     list->addFiles({writeTarget("smile.obj", 0.25), writeTarget("blink.obj", 0.5),
@@ -86,8 +87,7 @@ TEST_F(TargetImporterPictures, FileModeAndItsLogPage) {
     ASSERT_EQ(list->topLevelItemCount(), 3);
     list->topLevelItem(0)->setExpanded(true);
     list->topLevelItem(1)->setExpanded(true);
-    list->resizeColumnToContents(0);
-    dialog.show();
+    dialog.show(); // at its default size
     EXPECT_TRUE(saveShot(&dialog, "target-importer-file-mode.png"));
 
     dialog.accept();
@@ -105,9 +105,7 @@ TEST_F(TargetImporterPictures, BridgeMode) {
     ASSERT_TRUE(reader.readBuffer(HeadObj, qstrlen(HeadObj), "Figure"));
     SgPolyShape *shape = reader.takeShape("Figure");
     SgMorphLoaderDlg dialog(nullptr, false, shape->getGeometry(), figure);
-    dialog.resize(620, 560);
-    dialog.sourceList()->resizeColumnToContents(0);
-    dialog.show();
+    dialog.show(); // at its default size
     EXPECT_TRUE(saveShot(&dialog, "target-importer-bridge-mode.png"));
     dialog.reject();
     delete shape;

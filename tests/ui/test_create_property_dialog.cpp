@@ -36,6 +36,7 @@
 #include <QMetaMethod>
 #include <QMouseEvent>
 #include <QPushButton>
+#include <QSlider>
 #include <QTest>
 #include <QTreeWidget>
 #include <memory>
@@ -173,8 +174,9 @@ TEST_F(CreatePropertyDialog, MetaObjectLayoutAndPages) {
     EXPECT_FALSE(afterJoint->isEnabled());
     EXPECT_TRUE(afterJoint->isChecked());
 
+    // The title is there from the start, so a dialog run with exec() has it too.
     auto single = std::make_unique<Dlg>(nullptr, "single", true, Dlg::FloatType, false, true);
-    EXPECT_EQ(single->windowTitle(), "");
+    EXPECT_EQ(single->windowTitle(), "Create Float Property");
     single->show();
     EXPECT_EQ(single->windowTitle(), "Create Float Property");
     EXPECT_FALSE(child<QWidget>(*single, "SgPropTypeBox")->isVisible());
@@ -240,6 +242,27 @@ TEST_F(CreatePropertyDialog, IntAndNumericNodeRangesAndEqualValues) {
     EXPECT_EQ(created->getMin(), 2.0f);
     EXPECT_EQ(created->getMax(), 4.0f);
     EXPECT_FALSE(created->isClamped());
+
+    // The Max slider takes no typed text, yet reaches the host's default limit of 100; the
+    // value sliders then span the new limits.
+    auto *maxSlider = child<QSlider>(*dialog, "SgIntMaxAttribSlider");
+    auto *valueSlider = child<QSlider>(*dialog, "SgIntValSlider");
+    maxSlider->setValue(maxSlider->maximum());
+    EXPECT_GE(child<SgIntSlider>(*dialog, "SgIntMaxAttrib")->getValue(), 100);
+    EXPECT_EQ(child<SgIntSlider>(*dialog, "SgIntMinAttrib")->getValue(), 2); // untouched
+    valueSlider->setValue(valueSlider->maximum());
+    EXPECT_EQ(child<SgIntSlider>(*dialog, "SgIntVal")->getValue(),
+              child<SgIntSlider>(*dialog, "SgIntMaxAttrib")->getValue());
+    dialog->show();
+    setText(*dialog, "SgPropertyInternalNameAttrib", "many");
+    setInt(*dialog, "SgIntMinAttrib", 0);
+    maxSlider->setValue(100 - -1000); // the span starts at -1000
+    EXPECT_EQ(child<SgIntSlider>(*dialog, "SgIntMaxAttrib")->getValue(), 100);
+    setInt(*dialog, "SgIntVal", 50);
+    clickCreate(*dialog, false);
+    ASSERT_EQ(node->getPropertyCount(), 2);
+    EXPECT_EQ(dynamic_cast<SgIntProperty *>(node->getProperty(1))->getMax(), 100.0f);
+    node->removeProperty("many");
 
     // Numeric node: min above max is accepted.
     auto numericNode = makeDialog(Dlg::NumericNodeType);
@@ -386,6 +409,9 @@ TEST_F(CreatePropertyDialog, CreatesOnEveryNodeAndWarnsForARefusingOne) {
     dialog->insertCreationNode(third);
     dialog->setCreationNode(nullptr);
     EXPECT_EQ(dialog->getCreationNodes(), QList<SgNode *>({first, refusing, third}));
+    // A list with a null entry (a node gone from the scene) must not crash "Create" later.
+    SgNodeList withNull{first, nullptr, refusing, third};
+    dialog->setCreationNodes(withNull);
     setText(*dialog, "SgPropertyInternalNameAttrib", "wink");
     setText(*dialog, "SgPropertyLabelAttrib", "Wink");
     EXPECT_EQ(clickCreate(*dialog, true), "Unable to add property to refusing node");

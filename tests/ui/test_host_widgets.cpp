@@ -17,7 +17,13 @@
 #include <QTest>
 #include <gtest/gtest.h>
 
+#include "tests/support/sgwidgetfit.h"
 #include "uitesthelpers.h"
+
+#include <QLabel>
+#include <QPushButton>
+#include <QTreeWidget>
+#include <QVBoxLayout>
 
 TEST(HostWidgets, BoolButtonFlipsBetweenItsTwoTexts) {
     SgBoolButton button(nullptr, "b", "Off", "On");
@@ -216,4 +222,41 @@ TEST(HostSettings, NumericPropertyAttributesRoundTripThroughTheDom) {
     EXPECT_TRUE(target.isHidden());
     EXPECT_FALSE(target.isLocked());
     EXPECT_EQ(target.getName(), "smile");
+}
+
+TEST(WidgetFit, CutTextsFindsCutLabelsButtonsAndTreeRows) {
+    QWidget window;
+    auto *layout = new QVBoxLayout(&window);
+    auto *whole = new QLabel("Whole label", &window);
+    auto *cut = new QLabel("A label far too long for its width", &window);
+    cut->setObjectName("CutLabel");
+    cut->setMinimumWidth(1); // the layout may squeeze it below its text
+    cut->setFixedWidth(40);
+    auto *button = new QPushButton("A button with a long text", &window);
+    button->setFixedWidth(50);
+    auto *tree = new QTreeWidget(&window);
+    tree->setHeaderLabels({"Item", "Value"});
+    auto *top = new QTreeWidgetItem(tree, {"Source", "x"});
+    new QTreeWidgetItem(top, {"A setting row with a long label:", "Yes"});
+    tree->setColumnWidth(0, 80);
+    layout->addWidget(whole);
+    layout->addWidget(cut);
+    layout->addWidget(button);
+    layout->addWidget(tree);
+    window.resize(400, 300);
+    window.show();
+
+    // The child row is hidden while its parent is collapsed.
+    QStringList texts = sgCutTexts(&window);
+    EXPECT_EQ(texts.size(), 2) << texts.join('\n').toStdString();
+    EXPECT_TRUE(texts.filter("CutLabel \"A label far too long").size() == 1);
+    EXPECT_TRUE(texts.filter("button QPushButton \"A button").size() == 1);
+    tree->expandAll();
+    texts = sgCutTexts(&window);
+    EXPECT_EQ(texts.filter("A setting row with a long label:").size(), 1)
+        << texts.join('\n').toStdString();
+    tree->resizeColumnToContents(0);
+    cut->setFixedWidth(cut->sizeHint().width());
+    button->setFixedWidth(button->sizeHint().width());
+    EXPECT_EQ(sgCutTexts(&window), QStringList());
 }
