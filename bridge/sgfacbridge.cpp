@@ -547,9 +547,10 @@ void SgFacBridge::receiveGeometry() {
     queueOrPost(SgHostMessage::GeometryRead, 0);
     if (!shape)
         return;
-    // The import and its dialogs run outside the poll step, so that the poll goes on.
+    // The import and its dialogs run outside the poll step, so that the poll goes on; from a
+    // timer, so that the window's own events (input, painting) are handled between the two.
     m_pendingImports.push_back(std::move(shape));
-    QMetaObject::invokeMethod(this, &SgFacBridge::importPending, Qt::QueuedConnection);
+    QTimer::singleShot(0, this, &SgFacBridge::importPending);
 }
 
 void SgFacBridge::importPending() {

@@ -42,7 +42,8 @@ struct FaceIndexMax {
 
 namespace detail {
 
-constexpr double kPowersOfTen[] = {1e0, 1e1, 1e2, 1e3, 1e4, 1e5, 1e6, 1e7};
+constexpr double kPowersOfTen[] = {1e0, 1e1, 1e2,  1e3,  1e4,  1e5,  1e6,  1e7,
+                                   1e8, 1e9, 1e10, 1e11, 1e12, 1e13, 1e14, 1e15};
 
 // The value of the first `count` (1 to 8) decimal digits of the word `chunk` (in memory
 // order).
@@ -76,11 +77,11 @@ constexpr double kPowersOfTen[] = {1e0, 1e1, 1e2, 1e3, 1e4, 1e5, 1e6, 1e7};
 
 constexpr double kInversePowersOfTen[] = {1e0, 1e-1, 1e-2, 1e-3, 1e-4, 1e-5, 1e-6, 1e-7};
 
-// The float nearest to ±mantissa / 10^fractionDigits (mantissa below 10^8, at most seven
+// The float nearest to ±mantissa / 10^fractionDigits (mantissa below 10^15, at most fifteen
 // fraction digits), as std::from_chars rounds it; false in the one case this cannot decide.
 [[gnu::always_inline]] inline bool toFloat(bool negative, std::uint64_t mantissa,
                                            int fractionDigits, float &out) {
-    if (mantissa <= (1u << 24)) {
+    if (mantissa <= (1u << 24) && fractionDigits <= 7) {
         // A double product with the rounded inverse is within 2^-52 of the quotient, relative,
         // while such a quotient lies at least 2^-48 (relative) from any point halfway between
         // two floats (it would need 25 significant bits for a mantissa of at most 24), so it
@@ -89,7 +90,8 @@ constexpr double kInversePowersOfTen[] = {1e0, 1e-1, 1e-2, 1e-3, 1e-4, 1e-5, 1e-
         out = negative ? -value : value;
         return true;
     }
-    // Otherwise one division of exact values rounds the double correctly, and rounding that
+    // Otherwise one division of exact values (a mantissa of at most 53 bits, a power of ten
+    // up to 10^22) rounds the double correctly, and rounding that
     // to float is correct unless it lies exactly halfway between two floats (its 29 bits
     // beyond a float's 24 are exactly one half).
     const double value = double(mantissa) / kPowersOfTen[fractionDigits];

@@ -41,16 +41,10 @@ bool isIgnoredStatement(std::string_view k) {
     return false;
 }
 
-// Powers of ten that doubles hold exactly.
-constexpr double kPowersOfTen[] = {1e0, 1e1, 1e2,  1e3,  1e4,  1e5,  1e6,  1e7,
-                                   1e8, 1e9, 1e10, 1e11, 1e12, 1e13, 1e14, 1e15};
-
 // The common short forms of an OBJ number ("-0.125", "12", "3.000000": at most 15 digits, no
-// exponent) to the float std::from_chars gives, that is correctly rounded, in a few
-// instructions. The digits make an exact double and one division by an exact power of ten
-// rounds it correctly; rounding that double to float is then correct unless it lies exactly
-// halfway between two floats. Returns the end of the number, or null when the text needs the
-// general parser (other forms, and that halfway case).
+// exponent) to the float std::from_chars gives, correctly rounded (see
+// SgObjPlainLine::detail::toFloat), in a few instructions. Returns the end of the number, or
+// null when the text needs the general parser (other forms, and the one case toFloat leaves).
 const char *parseShortDecimal(const char *p, const char *end, float &out) {
     const bool negative = p < end && *p == '-';
     p += negative;
@@ -69,15 +63,7 @@ const char *parseShortDecimal(const char *p, const char *end, float &out) {
     if (integerDigits + fractionDigits == 0 || integerDigits + fractionDigits > 15 ||
         (p < end && (*p | 0x20) == 'e'))
         return nullptr;
-    const double value = double(mantissa) / kPowersOfTen[fractionDigits];
-    std::uint64_t bits = 0;
-    std::memcpy(&bits, &value, sizeof bits);
-    // The 29 bits a double has beyond a float's 24: exactly a half there is the one case in
-    // which the double's own rounding may have decided the float's.
-    if ((bits & 0x1FFFFFFFu) == 0x10000000u)
-        return nullptr;
-    out = negative ? -float(value) : float(value);
-    return p;
+    return SgObjPlainLine::detail::toFloat(negative, mantissa, fractionDigits, out) ? p : nullptr;
 }
 
 } // namespace
