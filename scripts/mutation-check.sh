@@ -108,7 +108,7 @@ restore() {
     [ -n "$current_file" ] && cp "$backup" "$current_file"
     current_file=""
 }
-trap 'restore; rm -f "$backup"; exit 130' INT TERM
+trap 'restore; rm -f "$backup"; exit 130' INT TERM HUP
 
 killed=0; survived=0; other=0; holes=()
 start=$(date +%s)
@@ -155,7 +155,7 @@ for i in "${!ids[@]}"; do
     printf '%-9s %-28s %4ss  %s\n' "$verdict" "$id" "$seconds" "$caught_by"
 done
 rm -f "$backup"
-trap - INT TERM
+trap - INT TERM HUP
 
 echo "== restoring the build"
 cmake --build "$BUILD" -j "$(nproc)" >/dev/null
