@@ -30,6 +30,7 @@
 #include "facetor/sgfacetorreturn.h"
 #include "sgcore/app/sgapp.h"
 #include "sgcore/app/sgappsettings.h"
+#include "sgcore/app/sgheappolicy.h"
 #include "sgcore/geometry/sgmap.h"
 #include "sgcore/geometry/sgobject.h"
 #include "sgcore/geometry/sgpolymesh.h"
@@ -55,7 +56,9 @@
 #include <cstdio>
 #include <cstring>
 #include <ctime>
+
 #include <memory>
+#include <sys/resource.h>
 #include <vector>
 
 namespace {
@@ -64,6 +67,7 @@ constexpr int kBones = 20;
 constexpr int kRings = 1000;        // rings of the welded figure
 constexpr int kRingVertices = 1000; // vertices per ring: 1,000,000 welded vertices
 constexpr char kMorph[] = "MyMorph";
+constexpr char kReturnKey[] = "SG_ROUNDTRIP_BENCH_RETURN";
 
 // Bone b holds rings b * 50 to b * 50 + 50 (the last ring is the next bone's first, carried in
 // both as a figure split into bones carries its seams), each ring closed, quads between rings.
@@ -127,6 +131,13 @@ double geometryBytes(SgSkeleton *figure) {
     return bytes;
 }
 
+// Minor page faults of this thread so far (first touches of fresh memory).
+double threadFaults() {
+    rusage usage{};
+    getrusage(RUSAGE_THREAD, &usage);
+    return double(usage.ru_minflt);
+}
+
 double threadSeconds() {
     timespec t{};
     clock_gettime(CLOCK_THREAD_CPUTIME_ID, &t);
@@ -180,7 +191,7 @@ std::unique_ptr<SgSharedMemory> modelerEdit(SgSharedMemory &sent) {
         return nullptr;
     edit.apply(node);
     const QByteArray record = SgFacetorReturn::encode(node);
-    auto returned = std::make_unique<SgSharedMemory>("SG_ROUNDTRIP_BENCH_RETURN");
+    auto returned = std::make_unique<SgSharedMemory>(kReturnKey);
     if (!returned->create(std::int32_t(record.size())) ||
         !returned->attach(SgSharedMemory::kReadWrite))
         return nullptr;
@@ -202,54 +213,88 @@ void measureRecords() {
     sent.remove(SgSharedMemory::kRemoveUnlocked);
 }
 
+// The CPU time and the first touches of fresh memory of each host phase of one round trip.
+struct Phases {
+    static constexpr int kCount = 4;
+    static constexpr const char *kNames[kCount] = {"gather", "write", "read", "import"};
+    double seconds[kCount] = {};
+    double faults[kCount] = {};
+
+    // Closes phase `phase` begun at `since` (seconds, faults).
+    void close(int phase, const double since[2]) {
+        seconds[phase] += threadSeconds() - since[0];
+        faults[phase] += threadFaults() - since[1];
+    }
+    static void open(double since[2]) {
+        since[0] = threadSeconds();
+        since[1] = threadFaults();
+    }
+    double total() const { return seconds[0] + seconds[1] + seconds[2] + seconds[3]; }
+};
+
+// One round trip of the host's part, the modeler's part in between untimed (`pause` and
+// `resume` around it); false when no morph came of it on every bone.
+template <typename Pause, typename Resume>
+bool hostRoundTrip(BenchBridge &bridge, Phases &phases, Pause &&pause, Resume &&resume) {
+    double since[2];
+    Phases::open(since);
+    SgExchangeWriter writer(g_figure, QString());
+    phases.close(0, since);
+    Phases::open(since);
+    SgSharedMemory sent("SG_ROUNDTRIP_BENCH_SENT");
+    bool ok =
+        sent.create(writer.getSize()) && sent.attach(SgSharedMemory::kReadWrite) && sent.lock();
+    ok = ok && writer.write(sent.data(), sent.size()) > 0;
+    sent.unlock();
+    phases.close(1, since);
+
+    pause();
+    std::unique_ptr<SgSharedMemory> returned = ok ? modelerEdit(sent) : nullptr;
+    resume();
+
+    // As the bridge reads it: the sent record let go, the returned one attached in a mapping of
+    // the host's own, read under its lock and let go. The modeler lets go of it last (untimed).
+    Phases::open(since);
+    sent.detach();
+    sent.remove(SgSharedMemory::kRemoveUnlocked);
+    std::unique_ptr<SgPolyShape> shape;
+    SgSharedMemory received(kReturnKey);
+    if (returned && received.attach(SgSharedMemory::kReadWrite) && received.lock()) {
+        QString trailer;
+        shape.reset(SgExchangeReader(received.data(), size_t(received.size())).readShape(trailer));
+        received.unlock();
+    }
+    received.detach();
+    received.remove(SgSharedMemory::kRemoveUnlocked);
+    phases.close(2, since);
+    pause();
+    returned.reset();
+    resume();
+    Phases::open(since);
+    ok = shape && bridge.importReturnedShape(shape.get(), g_figure) && hasMorphOnEveryBone();
+    phases.close(3, since);
+
+    pause();
+    shape.reset();
+    removeMorphs();
+    resume();
+    return ok;
+}
+
 void BM_HostRoundTrip(benchmark::State &state) {
     BenchBridge bridge;
-    double gather = 0, write = 0, read = 0, import = 0;
+    Phases phases;
     for (auto _ : state) {
-        double t0 = threadSeconds();
-        SgExchangeWriter writer(g_figure, QString());
-        double t1 = threadSeconds();
-        SgSharedMemory sent("SG_ROUNDTRIP_BENCH_SENT");
-        bool ok =
-            sent.create(writer.getSize()) && sent.attach(SgSharedMemory::kReadWrite) && sent.lock();
-        ok = ok && writer.write(sent.data(), sent.size()) > 0;
-        sent.unlock();
-        const double t2 = threadSeconds();
-
-        state.PauseTiming();
-        std::unique_ptr<SgSharedMemory> returned = ok ? modelerEdit(sent) : nullptr;
-        state.ResumeTiming();
-
-        const double t3 = threadSeconds();
-        sent.detach();
-        sent.remove(SgSharedMemory::kRemoveUnlocked);
-        std::unique_ptr<SgPolyShape> shape;
-        if (returned && returned->lock()) {
-            QString trailer;
-            shape.reset(
-                SgExchangeReader(returned->data(), size_t(returned->size())).readShape(trailer));
-            returned->unlock();
-        }
-        returned.reset();
-        const double t4 = threadSeconds();
-        if (!shape || !bridge.importReturnedShape(shape.get(), g_figure) || !hasMorphOnEveryBone())
+        if (!hostRoundTrip(
+                bridge, phases, [&] { state.PauseTiming(); }, [&] { state.ResumeTiming(); }))
             state.SkipWithError("the round trip made no morph on every bone");
-        const double t5 = threadSeconds();
-        gather += t1 - t0;
-        write += t2 - t1;
-        read += t4 - t3;
-        import += t5 - t4;
-
-        state.PauseTiming();
-        shape.reset();
-        removeMorphs();
-        state.ResumeTiming();
     }
     const double n = double(state.iterations());
-    state.counters["gather_ms"] = 1e3 * gather / n;
-    state.counters["write_ms"] = 1e3 * write / n;
-    state.counters["read_ms"] = 1e3 * read / n;
-    state.counters["import_ms"] = 1e3 * import / n;
+    for (int phase = 0; phase < Phases::kCount; ++phase) {
+        state.counters[std::string(Phases::kNames[phase]) + "_ms"] =
+            1e3 * phases.seconds[phase] / n;
+        state.counters[std::string(Phases::kNames[phase]) + "_faults"] = phases.faults[phase] / n;
+    }
 }
 
 // The import's parts on their own, as the engine runs them on the same returned geometry: the
@@ -307,9 +352,15 @@ BENCHMARK(BM_HostRoundTrip)->Unit(benchmark::kMillisecond)->Iterations(1)->Repet
 BENCHMARK(BM_ImportParts)->Unit(benchmark::kMillisecond)->Iterations(1)->Repetitions(5);
 BENCHMARK(BM_MemcpyRecords)->Unit(benchmark::kMillisecond)->MinTime(0.2)->Repetitions(5);
 
-// One live round trip with the reference modeler: the longest gap between turns of a 1 ms
-// timer on the GUI thread, in milliseconds; negative when the round trip did not complete.
-double liveRoundTrip(const QString &modelerFolder) {
+// What one live round trip with the reference modeler showed: the longest gap between turns of
+// a 1 ms timer on the GUI thread and the GUI thread's CPU time from the send to the morphs, in
+// milliseconds; the block is negative when the round trip did not complete.
+struct LiveRun {
+    double block = -1;
+    double cpu = 0;
+};
+
+LiveRun liveRoundTrip(const QString &modelerFolder) {
     qputenv("FACETOR_INSTALL_PATH", modelerFolder.toUtf8());
     qputenv("FACETOR_EDIT", "scale=1.01");
     qputenv("FACETOR_EXPECT", "1");
@@ -331,14 +382,19 @@ double liveRoundTrip(const QString &modelerFolder) {
         }
         sinceTurn.restart();
     });
+    double cpu = 0;
     {
         BenchBridge bridge;
+        cpu = threadSeconds();
         timer.start();
         sinceTurn.start();
         turns.start();
         bridge.executeAction();
+        // Waits for events (the 1 ms timer's at least) instead of spinning, so that the
+        // thread's CPU time is the host's work.
         while (!hasMorphOnEveryBone() && timer.elapsed() < 120000)
-            QApplication::processEvents(QEventLoop::AllEvents, 1);
+            QApplication::processEvents(QEventLoop::AllEvents | QEventLoop::WaitForMoreEvents);
+        cpu = threadSeconds() - cpu;
         turns.stop();
         // Let the modeler say goodbye before the next round uses the keys.
         QElapsedTimer goodbye;
@@ -351,7 +407,7 @@ double liveRoundTrip(const QString &modelerFolder) {
         std::printf("longest block %.0f ms, ending %.0f ms after the send\n", longest,
                     longestEndsAt);
     removeMorphs();
-    return done ? longest : -1;
+    return {done ? longest : -1, 1e3 * cpu};
 }
 
 } // namespace
@@ -373,13 +429,18 @@ int main(int argc, char **argv) {
     sgApp->getScene()->addNode(g_figure);
     const double geometry = geometryBytes(g_figure);
 
+    // The heap as the application keeps it.
+    SgHeapPolicy::keepLargeBlocks();
     // The live round trips first, so that the peak memory is the live host's.
-    std::vector<double> blocks;
+    std::vector<double> blocks, liveCpu;
     const int liveRuns = qEnvironmentVariableIsSet("SG_BENCH_LIVE_RUNS")
                              ? qEnvironmentVariableIntValue("SG_BENCH_LIVE_RUNS")
                              : 5;
-    for (int run = 0; run < liveRuns; ++run)
-        blocks.push_back(liveRoundTrip(QStringLiteral(FACETOR_BIN_DIR)));
+    for (int run = 0; run < liveRuns; ++run) {
+        const LiveRun live = liveRoundTrip(QStringLiteral(FACETOR_BIN_DIR));
+        blocks.push_back(live.block);
+        liveCpu.push_back(live.cpu);
+    }
     const double peak = statusBytes("VmHWM:") - before;
 
     measureRecords();
@@ -397,13 +458,14 @@ int main(int argc, char **argv) {
     std::printf("  records: node %.1f MB, returned %.1f MB\n", g_nodeRecordBytes / 1e6,
                 g_returnRecordBytes / 1e6);
     const double memcpyMs = 1e3 * reporter.median("BM_MemcpyRecords");
-    const char *phases[][2] = {{"gather + weld", "gather_ms"},
-                               {"write into the segment", "write_ms"},
-                               {"read the returned record", "read_ms"},
-                               {"import (un-weld to links)", "import_ms"}};
+    const char *phases[][3] = {{"gather + weld", "gather_ms", "gather_faults"},
+                               {"write into the segment", "write_ms", "write_faults"},
+                               {"read the returned record", "read_ms", "read_faults"},
+                               {"import (un-weld to links)", "import_ms", "import_faults"}};
     for (const auto &phase : phases)
-        std::printf("  %-32s %8.1f ms  %6.2f x memcpy\n", phase[0],
-                    ms("BM_HostRoundTrip", phase[1]), ms("BM_HostRoundTrip", phase[1]) / memcpyMs);
+        std::printf("  %-32s %8.1f ms  %6.2f x memcpy  %7.0f page faults\n", phase[0],
+                    ms("BM_HostRoundTrip", phase[1]), ms("BM_HostRoundTrip", phase[1]) / memcpyMs,
+                    ms("BM_HostRoundTrip", phase[2]));
     const double unweld = ms("BM_ImportParts", "unweld_ms");
     const double groups = ms("BM_ImportParts", "groups_ms");
     const double deltas = ms("BM_ImportParts", "deltas_ms");
@@ -430,6 +492,13 @@ int main(int argc, char **argv) {
                 sgMedian(blocks), complete && sgMedian(blocks) <= 250 ? "met" : "NOT MET");
     std::printf("  %-46s %7.0f ms\n", "longest block, worst of the runs",
                 *std::max_element(blocks.begin(), blocks.end()));
+    // The first round trip of the process maps all its memory afresh; the later ones reuse the
+    // heap the application keeps. Polling and painting between the steps are included.
+    std::printf("  GUI-thread CPU time of a live round trip: first %.0f ms (%.1f x memcpy), later "
+                "median %.0f ms (%.1f x memcpy)\n",
+                liveCpu.front(), liveCpu.front() / memcpyMs,
+                sgMedian(std::vector<double>(liveCpu.begin() + 1, liveCpu.end())),
+                sgMedian(std::vector<double>(liveCpu.begin() + 1, liveCpu.end())) / memcpyMs);
     std::printf("  peak memory of the host %.0f MB for %.0f MB of geometry and %.0f MB of "
                 "records: %.2f x (target <= 3)\n",
                 peak / 1e6, geometry / 1e6, records / 1e6, peak / (geometry + records));
