@@ -138,10 +138,20 @@ double threadFaults() {
     return double(usage.ru_minflt);
 }
 
-double threadSeconds() {
+double clockSeconds(clockid_t clock) {
     timespec t{};
-    clock_gettime(CLOCK_THREAD_CPUTIME_ID, &t);
+    clock_gettime(clock, &t);
     return double(t.tv_sec) + double(t.tv_nsec) * 1e-9;
+}
+
+// The GUI thread's CPU time: how long it is kept from its events.
+double threadSeconds() {
+    return clockSeconds(CLOCK_THREAD_CPUTIME_ID);
+}
+
+// The CPU time of all threads: the work done, on however many cores.
+double processSeconds() {
+    return clockSeconds(CLOCK_PROCESS_CPUTIME_ID);
 }
 
 // The peak and current resident memory of this process, in bytes.
@@ -213,30 +223,33 @@ void measureRecords() {
     sent.remove(SgSharedMemory::kRemoveUnlocked);
 }
 
-// The CPU time and the first touches of fresh memory of each host phase of one round trip.
+// The GUI thread's CPU time, all threads' CPU time and the GUI thread's first touches of fresh
+// memory in each host phase of one round trip.
 struct Phases {
     static constexpr int kCount = 4;
     static constexpr const char *kNames[kCount] = {"gather", "write", "read", "import"};
     double seconds[kCount] = {};
+    double work[kCount] = {};
     double faults[kCount] = {};
 
-    // Closes phase `phase` begun at `since` (seconds, faults).
-    void close(int phase, const double since[2]) {
+    // Closes phase `phase` begun at `since`.
+    void close(int phase, const double since[3]) {
         seconds[phase] += threadSeconds() - since[0];
-        faults[phase] += threadFaults() - since[1];
+        work[phase] += processSeconds() - since[1];
+        faults[phase] += threadFaults() - since[2];
     }
-    static void open(double since[2]) {
+    static void open(double since[3]) {
         since[0] = threadSeconds();
-        since[1] = threadFaults();
+        since[1] = processSeconds();
+        since[2] = threadFaults();
     }
-    double total() const { return seconds[0] + seconds[1] + seconds[2] + seconds[3]; }
 };
 
 // One round trip of the host's part, the modeler's part in between untimed (`pause` and
 // `resume` around it); false when no morph came of it on every bone.
 template <typename Pause, typename Resume>
 bool hostRoundTrip(BenchBridge &bridge, Phases &phases, Pause &&pause, Resume &&resume) {
-    double since[2];
+    double since[3];
     Phases::open(since);
     SgExchangeWriter writer(g_figure, QString());
     phases.close(0, since);
@@ -290,11 +303,18 @@ void BM_HostRoundTrip(benchmark::State &state) {
             state.SkipWithError("the round trip made no morph on every bone");
     }
     const double n = double(state.iterations());
+    double gui = 0, work = 0;
     for (int phase = 0; phase < Phases::kCount; ++phase) {
+        gui += phases.seconds[phase];
+        work += phases.work[phase];
         state.counters[std::string(Phases::kNames[phase]) + "_ms"] =
             1e3 * phases.seconds[phase] / n;
+        state.counters[std::string(Phases::kNames[phase]) + "_work_ms"] =
+            1e3 * phases.work[phase] / n;
         state.counters[std::string(Phases::kNames[phase]) + "_faults"] = phases.faults[phase] / n;
     }
+    state.counters["total_ms"] = 1e3 * gui / n;
+    state.counters["total_work_ms"] = 1e3 * work / n;
 }
 
 // The import's parts on their own, as the engine runs them on the same returned geometry: the
@@ -452,20 +472,26 @@ int main(int argc, char **argv) {
     auto ms = [&](const char *name, const char *counter) {
         return reporter.counterMedian(name, counter);
     };
-    std::printf("\nRound trip of %d vertices in %d bones (medians of 5, CPU time of the GUI "
-                "thread):\n",
+    std::printf("\nRound trip of %d vertices in %d bones (medians of 5, CPU time, ratios to the "
+                "memcpy):\n",
                 kRings * kRingVertices, kBones);
+    std::printf("  segments mapped and unmapped %s\n",
+                qEnvironmentVariableIsSet("SG_SHM_ONE_THREAD") ? "on the GUI thread alone"
+                                                               : "with a helper thread");
     std::printf("  records: node %.1f MB, returned %.1f MB\n", g_nodeRecordBytes / 1e6,
                 g_returnRecordBytes / 1e6);
     const double memcpyMs = 1e3 * reporter.median("BM_MemcpyRecords");
-    const char *phases[][3] = {{"gather + weld", "gather_ms", "gather_faults"},
-                               {"write into the segment", "write_ms", "write_faults"},
-                               {"read the returned record", "read_ms", "read_faults"},
-                               {"import (un-weld to links)", "import_ms", "import_faults"}};
-    for (const auto &phase : phases)
-        std::printf("  %-32s %8.1f ms  %6.2f x memcpy  %7.0f page faults\n", phase[0],
-                    ms("BM_HostRoundTrip", phase[1]), ms("BM_HostRoundTrip", phase[1]) / memcpyMs,
-                    ms("BM_HostRoundTrip", phase[2]));
+    std::printf("  %-32s %17s %17s %12s\n", "", "all threads", "GUI thread", "page faults");
+    const char *labels[Phases::kCount] = {"gather + weld", "write into the segment",
+                                          "read the returned record", "import (un-weld to links)"};
+    for (int phase = 0; phase < Phases::kCount; ++phase) {
+        const std::string name = Phases::kNames[phase];
+        const double work = ms("BM_HostRoundTrip", (name + "_work_ms").c_str());
+        const double gui = ms("BM_HostRoundTrip", (name + "_ms").c_str());
+        std::printf("  %-32s %6.1f ms %5.2f x  %6.1f ms %5.2f x  %8.0f\n", labels[phase], work,
+                    work / memcpyMs, gui, gui / memcpyMs,
+                    ms("BM_HostRoundTrip", (name + "_faults").c_str()));
+    }
     const double unweld = ms("BM_ImportParts", "unweld_ms");
     const double groups = ms("BM_ImportParts", "groups_ms");
     const double deltas = ms("BM_ImportParts", "deltas_ms");
@@ -474,8 +500,13 @@ int main(int argc, char **argv) {
                 "links %.1f ms\n",
                 unweld, groups, deltas, import - unweld - groups - deltas);
     std::printf("  memcpy of both records          %8.1f ms\n", memcpyMs);
-    sgPrintRatio("host total / memcpy of the records", reporter.median("BM_HostRoundTrip"),
-                 reporter.median("BM_MemcpyRecords"), 10.0);
+    // The target is judged on the work of all threads (what one core would take: run with
+    // SG_SHM_ONE_THREAD=1, so that no segment is unmapped after its phase has been timed); the
+    // GUI thread's share is what the user waits for when a second core takes the rest.
+    sgPrintRatio("host total, all threads / memcpy of the records",
+                 ms("BM_HostRoundTrip", "total_work_ms"), memcpyMs, 10.0);
+    sgPrintRatio("host total, GUI thread / memcpy of the records",
+                 ms("BM_HostRoundTrip", "total_ms"), memcpyMs);
 
     std::printf("\nLive round trips with the reference modeler (longest GUI-thread block):\n ");
     bool complete = true;
