@@ -249,16 +249,23 @@ template <typename Slices> std::vector<std::vector<SgBox3>> seamRegions(const Sl
     return regions;
 }
 
+// For each bone, its vertices inside its seam regions, in ascending order (the only ones the
+// weld probes); `count` is their number in all.
 template <typename Slices>
-size_t seamVertexCount(const Slices &slices, const std::vector<std::vector<SgBox3>> &regions) {
-    size_t count = 0;
+std::vector<std::vector<int32_t>>
+seamVertices(const Slices &slices, const std::vector<std::vector<SgBox3>> &regions, size_t &count) {
+    std::vector<std::vector<int32_t>> seams(slices.size());
+    count = 0;
     for (size_t b = 0; b < slices.size(); ++b) {
         const int32_t n = slices[b].base->getVertexCount();
         for (int32_t i = 0; i < n && !regions[b].empty(); ++i) {
-            count += insideAny(regions[b], slices[b].source[size_t(i)]);
+            if (insideAny(regions[b], slices[b].source[size_t(i)])) {
+                seams[b].push_back(i);
+            }
         }
+        count += seams[b].size();
     }
-    return count;
+    return seams;
 }
 
 } // namespace
@@ -387,9 +394,11 @@ void SgFigureWelder::build(SgSkeleton *figure, bool ignoreInvisible, bool weldGe
             s.source = s.base->getVertices();
         }
     }
-    const std::vector<std::vector<SgBox3>> seams =
-        weldGeometry ? seamRegions(m_slices) : std::vector<std::vector<SgBox3>>(m_slices.size());
-    PositionTable table(weldGeometry ? seamVertexCount(m_slices, seams) : 0);
+    size_t seamCount = 0;
+    const std::vector<std::vector<int32_t>> seams =
+        weldGeometry ? seamVertices(m_slices, seamRegions(m_slices), seamCount)
+                     : std::vector<std::vector<int32_t>>(m_slices.size());
+    PositionTable table(seamCount);
     int32_t outStart = 0;
     int32_t uvOffset = 0;
     for (size_t b = 0; b < m_slices.size(); ++b) {
@@ -398,9 +407,11 @@ void SgFigureWelder::build(SgSkeleton *figure, bool ignoreInvisible, bool weldGe
         std::vector<uint8_t> used(size_t(n), 0);
         forEachCorner(*s.base, [&](const SgFaceCorner &c) { used[size_t(c.vertex)] = 1; });
         s.weldIndex.reserve(size_t(n));
-        const std::vector<SgBox3> &meets = seams[b];
-        const bool probe = weldGeometry && !meets.empty();
+        const int32_t *seam = seams[b].data();
+        const int32_t *seamEnd = seam + seams[b].size();
         for (int32_t i = 0; i < n; ++i) {
+            const bool onSeam = seam != seamEnd && *seam == i;
+            seam += onSeam;
             if (!used[size_t(i)]) {
                 s.unused.push_back(i);
                 if (removeUnused) {
@@ -411,7 +422,7 @@ void SgFigureWelder::build(SgSkeleton *figure, bool ignoreInvisible, bool weldGe
             const SgVec3 &p = s.source[size_t(i)];
             const auto added = static_cast<int32_t>(wv.size());
             int32_t w = added;
-            if (probe && insideAny(meets, p)) {
+            if (onSeam) {
                 PositionTable::Slot &slot = table.slotFor(p);
                 if (slot.index < 0) {
                     slot = {p, added, int32_t(b)};
