@@ -8,6 +8,7 @@
 
 #include "sgcore/app/sgapp.h"
 #include "sgcore/app/sgappsettings.h"
+#include "sgcore/app/sgheappolicy.h"
 #include "sgcore/io/sgscenefile.h"
 #include "sgcore/plugin/sgaction.h"
 
@@ -75,6 +76,7 @@ int runScript(const SgCommandLine &line, SgPluginHost &plugins) {
 } // namespace
 
 int main(int argc, char **argv) {
+    SgHeapPolicy::keepLargeBlocks();
     const SgCommandLine line = SgCommandLine::parse(argumentList(argc, argv));
     if (line.help || !line.error.isEmpty()) {
         if (!line.error.isEmpty())

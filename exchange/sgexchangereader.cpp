@@ -9,6 +9,7 @@
 #include "sgcore/geometry/sgpolyshape.h"
 
 #include <algorithm>
+#include <bit>
 #include <cmath>
 #include <cstring>
 
@@ -24,24 +25,29 @@ struct MeshUnderConstruction {
     SgPolyMesh *release() { return std::exchange(mesh, nullptr); }
 };
 
-// A coordinate that is not a finite number, or becomes one only in host units, would tear
-// any morph made from the record: the record is refused.
-float toHostUnits(float value) {
-    const auto scaled = float(value * kToHostUnits);
-    if (!std::isfinite(scaled))
-        throw SgRecordError("vertex coordinate not finite");
-    return scaled;
+// Whether the float bits `bits` are infinite or not a number (all exponent bits set).
+inline std::uint32_t notFinite(std::uint32_t bits) {
+    return std::uint32_t((bits & 0x7F800000u) == 0x7F800000u);
 }
 
+// A coordinate that is not a finite number, or becomes one only in host units, would tear
+// any morph made from the record: the record is refused. Branch-free over all coordinates, so
+// that the loop runs in vector code; the check comes once, at the end.
 void readVertices(SgRecordInput &input, SgPolyMesh &mesh) {
     const std::int32_t count = input.count(12);
-    SgVec3 *vertices = mesh.setVertexArray(count);
+    static_assert(sizeof(SgVec3) == 12);
+    auto *to = reinterpret_cast<float *>(mesh.setVertexArray(count));
     const unsigned char *source = input.take(size_t(count) * 12);
-    for (std::int32_t i = 0; i < count; ++i) {
-        float xyz[3];
-        std::memcpy(xyz, source + size_t(i) * 12, 12);
-        vertices[i] = SgVec3(toHostUnits(xyz[0]), toHostUnits(xyz[1]), toHostUnits(xyz[2]));
+    std::uint32_t bad = 0;
+    for (size_t i = 0; i < size_t(count) * 3; ++i) {
+        float value;
+        std::memcpy(&value, source + 4 * i, 4);
+        const auto scaled = float(double(value) * kToHostUnits);
+        bad |= notFinite(std::bit_cast<std::uint32_t>(scaled));
+        to[i] = scaled;
     }
+    if (bad)
+        throw SgRecordError("vertex coordinate not finite");
 }
 
 void readUVs(SgRecordInput &input, SgPolyMesh &mesh) {
@@ -52,9 +58,12 @@ void readUVs(SgRecordInput &input, SgPolyMesh &mesh) {
     mesh.setUVList(uvList);
     uvList->values().resize(size_t(count));
     std::memcpy(uvList->values().data(), input.take(size_t(count) * 8), size_t(count) * 8);
-    for (const SgVec2 &uv : uvList->values())
-        if (!std::isfinite(uv.u) || !std::isfinite(uv.v))
-            throw SgRecordError("UV value not finite");
+    const auto *bits = reinterpret_cast<const std::uint32_t *>(uvList->values().data());
+    std::uint32_t bad = 0;
+    for (size_t i = 0; i < size_t(count) * 2; ++i)
+        bad |= notFinite(bits[i]);
+    if (bad)
+        throw SgRecordError("UV value not finite");
 }
 
 // Reads facet records into the mesh's arrays, checking every index first. A bad vertex index
@@ -70,11 +79,69 @@ public:
     void read(SgRecordInput &input) {
         const std::int32_t count = input.count(5);
         reserve(count, input.remaining());
-        for (std::int32_t i = 0; i < count; ++i)
-            readFacet(input);
+        for (std::int32_t done = 0; done < count;) {
+            // Runs of triangles or quads go in batches; anything else one facet at a time.
+            std::int32_t run = readRun<3>(input, count - done, 'T', m_mesh.triangleCorners(),
+                                          m_mesh.triangleMaterials(), m_mesh.triangleGroups());
+            if (run == 0)
+                run = readRun<4>(input, count - done, 'Q', m_mesh.quadCorners(),
+                                 m_mesh.quadMaterials(), m_mesh.quadGroups());
+            if (run == 0) {
+                readFacet(input);
+                run = 1;
+            }
+            done += run;
+        }
     }
 
 private:
+    // Facets per batch of readRun: its corners are gathered on the stack, then appended.
+    static constexpr size_t kBatch = 256;
+
+    // Reads up to `limit` facets of `corners` corners each that follow as a run of `type`
+    // records, up to a batch; returns how many (0 when the next facet is not of the kind).
+    // The same checks as readFacet, made branch-free over the batch.
+    template <size_t corners>
+    std::int32_t readRun(SgRecordInput &input, std::int32_t limit, unsigned char type,
+                         std::vector<SgFaceCorner> &toCorners,
+                         std::vector<std::uint8_t> &toMaterials,
+                         std::vector<std::int32_t> &toGroups) {
+        constexpr size_t recordBytes = 5 + 12 * corners;
+        const size_t available = std::min({input.remaining() / recordBytes, size_t(limit), kBatch});
+        if (available == 0)
+            return 0;
+        const unsigned char *source = input.take(0);
+        SgFaceCorner batch[kBatch * corners];
+        std::uint8_t materials[kBatch];
+        std::uint32_t bad = 0;
+        size_t n = 0;
+        for (; n < available; ++n) {
+            const unsigned char *record = source + n * recordBytes;
+            if (record[0] != type)
+                break;
+            std::uint32_t material;
+            std::memcpy(&material, record + 1, 4);
+            materials[n] = material < std::uint32_t(m_materialCount) ? std::uint8_t(material) : 0;
+            for (size_t k = 0; k < corners; ++k) {
+                std::int32_t indices[2];
+                std::memcpy(indices, record + 5 + 12 * k, 8);
+                bad |= std::uint32_t(std::uint32_t(indices[0]) >= m_vertexCount);
+                SgFaceCorner &corner = batch[n * corners + k];
+                corner.vertex = indices[0];
+                // Without a UV list the UV indices mean nothing; -1 is the host's "no UV".
+                corner.uv = std::uint32_t(indices[1]) < m_uvCount ? indices[1] : -1;
+                corner.third = -1;
+            }
+        }
+        if (bad)
+            throw SgRecordError("vertex index out of range");
+        input.skip(n * recordBytes);
+        toCorners.insert(toCorners.end(), batch, batch + n * corners);
+        toMaterials.insert(toMaterials.end(), materials, materials + n);
+        toGroups.insert(toGroups.end(), n, -1);
+        return std::int32_t(n);
+    }
+
     void reserve(std::int32_t count, size_t bytes) {
         const size_t triangles =
             std::min(size_t(count), bytes / size_t(SgFacetBlockWriter::kTriangleBytes));

@@ -30,6 +30,7 @@
 #include "facetor/sgfacetorreturn.h"
 #include "sgcore/app/sgapp.h"
 #include "sgcore/app/sgappsettings.h"
+#include "sgcore/app/sgheappolicy.h"
 #include "sgcore/geometry/sgmap.h"
 #include "sgcore/geometry/sgobject.h"
 #include "sgcore/geometry/sgpolymesh.h"
@@ -55,7 +56,9 @@
 #include <cstdio>
 #include <cstring>
 #include <ctime>
+
 #include <memory>
+#include <sys/resource.h>
 #include <vector>
 
 namespace {
@@ -64,6 +67,7 @@ constexpr int kBones = 20;
 constexpr int kRings = 1000;        // rings of the welded figure
 constexpr int kRingVertices = 1000; // vertices per ring: 1,000,000 welded vertices
 constexpr char kMorph[] = "MyMorph";
+constexpr char kReturnKey[] = "SG_ROUNDTRIP_BENCH_RETURN";
 
 // Bone b holds rings b * 50 to b * 50 + 50 (the last ring is the next bone's first, carried in
 // both as a figure split into bones carries its seams), each ring closed, quads between rings.
@@ -127,10 +131,27 @@ double geometryBytes(SgSkeleton *figure) {
     return bytes;
 }
 
-double threadSeconds() {
+// Minor page faults of this thread so far (first touches of fresh memory).
+double threadFaults() {
+    rusage usage{};
+    getrusage(RUSAGE_THREAD, &usage);
+    return double(usage.ru_minflt);
+}
+
+double clockSeconds(clockid_t clock) {
     timespec t{};
-    clock_gettime(CLOCK_THREAD_CPUTIME_ID, &t);
+    clock_gettime(clock, &t);
     return double(t.tv_sec) + double(t.tv_nsec) * 1e-9;
+}
+
+// The GUI thread's CPU time: how long it is kept from its events.
+double threadSeconds() {
+    return clockSeconds(CLOCK_THREAD_CPUTIME_ID);
+}
+
+// The CPU time of all threads: the work done, on however many cores.
+double processSeconds() {
+    return clockSeconds(CLOCK_PROCESS_CPUTIME_ID);
 }
 
 // The peak and current resident memory of this process, in bytes.
@@ -180,7 +201,7 @@ std::unique_ptr<SgSharedMemory> modelerEdit(SgSharedMemory &sent) {
         return nullptr;
     edit.apply(node);
     const QByteArray record = SgFacetorReturn::encode(node);
-    auto returned = std::make_unique<SgSharedMemory>("SG_ROUNDTRIP_BENCH_RETURN");
+    auto returned = std::make_unique<SgSharedMemory>(kReturnKey);
     if (!returned->create(std::int32_t(record.size())) ||
         !returned->attach(SgSharedMemory::kReadWrite))
         return nullptr;
@@ -202,54 +223,98 @@ void measureRecords() {
     sent.remove(SgSharedMemory::kRemoveUnlocked);
 }
 
+// The GUI thread's CPU time, all threads' CPU time and the GUI thread's first touches of fresh
+// memory in each host phase of one round trip.
+struct Phases {
+    static constexpr int kCount = 4;
+    static constexpr const char *kNames[kCount] = {"gather", "write", "read", "import"};
+    double seconds[kCount] = {};
+    double work[kCount] = {};
+    double faults[kCount] = {};
+
+    // Closes phase `phase` begun at `since`.
+    void close(int phase, const double since[3]) {
+        seconds[phase] += threadSeconds() - since[0];
+        work[phase] += processSeconds() - since[1];
+        faults[phase] += threadFaults() - since[2];
+    }
+    static void open(double since[3]) {
+        since[0] = threadSeconds();
+        since[1] = processSeconds();
+        since[2] = threadFaults();
+    }
+};
+
+// One round trip of the host's part, the modeler's part in between untimed (`pause` and
+// `resume` around it); false when no morph came of it on every bone.
+template <typename Pause, typename Resume>
+bool hostRoundTrip(BenchBridge &bridge, Phases &phases, Pause &&pause, Resume &&resume) {
+    double since[3];
+    Phases::open(since);
+    SgExchangeWriter writer(g_figure, QString());
+    phases.close(0, since);
+    Phases::open(since);
+    SgSharedMemory sent("SG_ROUNDTRIP_BENCH_SENT");
+    bool ok =
+        sent.create(writer.getSize()) && sent.attach(SgSharedMemory::kReadWrite) && sent.lock();
+    ok = ok && writer.write(sent.data(), sent.size()) > 0;
+    sent.unlock();
+    phases.close(1, since);
+
+    pause();
+    std::unique_ptr<SgSharedMemory> returned = ok ? modelerEdit(sent) : nullptr;
+    resume();
+
+    // As the bridge reads it: the sent record let go, the returned one attached in a mapping of
+    // the host's own, read under its lock and let go. The modeler lets go of it last (untimed).
+    Phases::open(since);
+    sent.detach();
+    sent.remove(SgSharedMemory::kRemoveUnlocked);
+    std::unique_ptr<SgPolyShape> shape;
+    SgSharedMemory received(kReturnKey);
+    if (returned && received.attach(SgSharedMemory::kReadWrite) && received.lock()) {
+        QString trailer;
+        shape.reset(SgExchangeReader(received.data(), size_t(received.size())).readShape(trailer));
+        received.unlock();
+    }
+    received.detach();
+    received.remove(SgSharedMemory::kRemoveUnlocked);
+    phases.close(2, since);
+    pause();
+    returned.reset();
+    resume();
+    Phases::open(since);
+    ok = shape && bridge.importReturnedShape(shape.get(), g_figure) && hasMorphOnEveryBone();
+    phases.close(3, since);
+
+    pause();
+    shape.reset();
+    removeMorphs();
+    resume();
+    return ok;
+}
+
 void BM_HostRoundTrip(benchmark::State &state) {
     BenchBridge bridge;
-    double gather = 0, write = 0, read = 0, import = 0;
+    Phases phases;
     for (auto _ : state) {
-        double t0 = threadSeconds();
-        SgExchangeWriter writer(g_figure, QString());
-        double t1 = threadSeconds();
-        SgSharedMemory sent("SG_ROUNDTRIP_BENCH_SENT");
-        bool ok =
-            sent.create(writer.getSize()) && sent.attach(SgSharedMemory::kReadWrite) && sent.lock();
-        ok = ok && writer.write(sent.data(), sent.size()) > 0;
-        sent.unlock();
-        const double t2 = threadSeconds();
-
-        state.PauseTiming();
-        std::unique_ptr<SgSharedMemory> returned = ok ? modelerEdit(sent) : nullptr;
-        state.ResumeTiming();
-
-        const double t3 = threadSeconds();
-        sent.detach();
-        sent.remove(SgSharedMemory::kRemoveUnlocked);
-        std::unique_ptr<SgPolyShape> shape;
-        if (returned && returned->lock()) {
-            QString trailer;
-            shape.reset(
-                SgExchangeReader(returned->data(), size_t(returned->size())).readShape(trailer));
-            returned->unlock();
-        }
-        returned.reset();
-        const double t4 = threadSeconds();
-        if (!shape || !bridge.importReturnedShape(shape.get(), g_figure) || !hasMorphOnEveryBone())
+        if (!hostRoundTrip(
+                bridge, phases, [&] { state.PauseTiming(); }, [&] { state.ResumeTiming(); }))
             state.SkipWithError("the round trip made no morph on every bone");
-        const double t5 = threadSeconds();
-        gather += t1 - t0;
-        write += t2 - t1;
-        read += t4 - t3;
-        import += t5 - t4;
-
-        state.PauseTiming();
-        shape.reset();
-        removeMorphs();
-        state.ResumeTiming();
     }
     const double n = double(state.iterations());
-    state.counters["gather_ms"] = 1e3 * gather / n;
-    state.counters["write_ms"] = 1e3 * write / n;
-    state.counters["read_ms"] = 1e3 * read / n;
-    state.counters["import_ms"] = 1e3 * import / n;
+    double gui = 0, work = 0;
+    for (int phase = 0; phase < Phases::kCount; ++phase) {
+        gui += phases.seconds[phase];
+        work += phases.work[phase];
+        state.counters[std::string(Phases::kNames[phase]) + "_ms"] =
+            1e3 * phases.seconds[phase] / n;
+        state.counters[std::string(Phases::kNames[phase]) + "_work_ms"] =
+            1e3 * phases.work[phase] / n;
+        state.counters[std::string(Phases::kNames[phase]) + "_faults"] = phases.faults[phase] / n;
+    }
+    state.counters["total_ms"] = 1e3 * gui / n;
+    state.counters["total_work_ms"] = 1e3 * work / n;
 }
 
 // The import's parts on their own, as the engine runs them on the same returned geometry: the
@@ -307,9 +372,15 @@ BENCHMARK(BM_HostRoundTrip)->Unit(benchmark::kMillisecond)->Iterations(1)->Repet
 BENCHMARK(BM_ImportParts)->Unit(benchmark::kMillisecond)->Iterations(1)->Repetitions(5);
 BENCHMARK(BM_MemcpyRecords)->Unit(benchmark::kMillisecond)->MinTime(0.2)->Repetitions(5);
 
-// One live round trip with the reference modeler: the longest gap between turns of a 1 ms
-// timer on the GUI thread, in milliseconds; negative when the round trip did not complete.
-double liveRoundTrip(const QString &modelerFolder) {
+// What one live round trip with the reference modeler showed: the longest gap between turns of
+// a 1 ms timer on the GUI thread and the GUI thread's CPU time from the send to the morphs, in
+// milliseconds; the block is negative when the round trip did not complete.
+struct LiveRun {
+    double block = -1;
+    double cpu = 0;
+};
+
+LiveRun liveRoundTrip(const QString &modelerFolder) {
     qputenv("FACETOR_INSTALL_PATH", modelerFolder.toUtf8());
     qputenv("FACETOR_EDIT", "scale=1.01");
     qputenv("FACETOR_EXPECT", "1");
@@ -331,14 +402,19 @@ double liveRoundTrip(const QString &modelerFolder) {
         }
         sinceTurn.restart();
     });
+    double cpu = 0;
     {
         BenchBridge bridge;
+        cpu = threadSeconds();
         timer.start();
         sinceTurn.start();
         turns.start();
         bridge.executeAction();
+        // Waits for events (the 1 ms timer's at least) instead of spinning, so that the
+        // thread's CPU time is the host's work.
         while (!hasMorphOnEveryBone() && timer.elapsed() < 120000)
-            QApplication::processEvents(QEventLoop::AllEvents, 1);
+            QApplication::processEvents(QEventLoop::AllEvents | QEventLoop::WaitForMoreEvents);
+        cpu = threadSeconds() - cpu;
         turns.stop();
         // Let the modeler say goodbye before the next round uses the keys.
         QElapsedTimer goodbye;
@@ -351,7 +427,7 @@ double liveRoundTrip(const QString &modelerFolder) {
         std::printf("longest block %.0f ms, ending %.0f ms after the send\n", longest,
                     longestEndsAt);
     removeMorphs();
-    return done ? longest : -1;
+    return {done ? longest : -1, 1e3 * cpu};
 }
 
 } // namespace
@@ -373,13 +449,18 @@ int main(int argc, char **argv) {
     sgApp->getScene()->addNode(g_figure);
     const double geometry = geometryBytes(g_figure);
 
+    // The heap as the application keeps it.
+    SgHeapPolicy::keepLargeBlocks();
     // The live round trips first, so that the peak memory is the live host's.
-    std::vector<double> blocks;
+    std::vector<double> blocks, liveCpu;
     const int liveRuns = qEnvironmentVariableIsSet("SG_BENCH_LIVE_RUNS")
                              ? qEnvironmentVariableIntValue("SG_BENCH_LIVE_RUNS")
                              : 5;
-    for (int run = 0; run < liveRuns; ++run)
-        blocks.push_back(liveRoundTrip(QStringLiteral(FACETOR_BIN_DIR)));
+    for (int run = 0; run < liveRuns; ++run) {
+        const LiveRun live = liveRoundTrip(QStringLiteral(FACETOR_BIN_DIR));
+        blocks.push_back(live.block);
+        liveCpu.push_back(live.cpu);
+    }
     const double peak = statusBytes("VmHWM:") - before;
 
     measureRecords();
@@ -391,19 +472,26 @@ int main(int argc, char **argv) {
     auto ms = [&](const char *name, const char *counter) {
         return reporter.counterMedian(name, counter);
     };
-    std::printf("\nRound trip of %d vertices in %d bones (medians of 5, CPU time of the GUI "
-                "thread):\n",
+    std::printf("\nRound trip of %d vertices in %d bones (medians of 5, CPU time, ratios to the "
+                "memcpy):\n",
                 kRings * kRingVertices, kBones);
+    std::printf("  segments mapped and unmapped %s\n",
+                qEnvironmentVariableIsSet("SG_SHM_ONE_THREAD") ? "on the GUI thread alone"
+                                                               : "with a helper thread");
     std::printf("  records: node %.1f MB, returned %.1f MB\n", g_nodeRecordBytes / 1e6,
                 g_returnRecordBytes / 1e6);
     const double memcpyMs = 1e3 * reporter.median("BM_MemcpyRecords");
-    const char *phases[][2] = {{"gather + weld", "gather_ms"},
-                               {"write into the segment", "write_ms"},
-                               {"read the returned record", "read_ms"},
-                               {"import (un-weld to links)", "import_ms"}};
-    for (const auto &phase : phases)
-        std::printf("  %-32s %8.1f ms  %6.2f x memcpy\n", phase[0],
-                    ms("BM_HostRoundTrip", phase[1]), ms("BM_HostRoundTrip", phase[1]) / memcpyMs);
+    std::printf("  %-32s %17s %17s %12s\n", "", "all threads", "GUI thread", "page faults");
+    const char *labels[Phases::kCount] = {"gather + weld", "write into the segment",
+                                          "read the returned record", "import (un-weld to links)"};
+    for (int phase = 0; phase < Phases::kCount; ++phase) {
+        const std::string name = Phases::kNames[phase];
+        const double work = ms("BM_HostRoundTrip", (name + "_work_ms").c_str());
+        const double gui = ms("BM_HostRoundTrip", (name + "_ms").c_str());
+        std::printf("  %-32s %6.1f ms %5.2f x  %6.1f ms %5.2f x  %8.0f\n", labels[phase], work,
+                    work / memcpyMs, gui, gui / memcpyMs,
+                    ms("BM_HostRoundTrip", (name + "_faults").c_str()));
+    }
     const double unweld = ms("BM_ImportParts", "unweld_ms");
     const double groups = ms("BM_ImportParts", "groups_ms");
     const double deltas = ms("BM_ImportParts", "deltas_ms");
@@ -412,8 +500,13 @@ int main(int argc, char **argv) {
                 "links %.1f ms\n",
                 unweld, groups, deltas, import - unweld - groups - deltas);
     std::printf("  memcpy of both records          %8.1f ms\n", memcpyMs);
-    sgPrintRatio("host total / memcpy of the records", reporter.median("BM_HostRoundTrip"),
-                 reporter.median("BM_MemcpyRecords"), 10.0);
+    // The target is judged on the work of all threads (what one core would take: run with
+    // SG_SHM_ONE_THREAD=1, so that no segment is unmapped after its phase has been timed); the
+    // GUI thread's share is what the user waits for when a second core takes the rest.
+    sgPrintRatio("host total, all threads / memcpy of the records",
+                 ms("BM_HostRoundTrip", "total_work_ms"), memcpyMs, 10.0);
+    sgPrintRatio("host total, GUI thread / memcpy of the records",
+                 ms("BM_HostRoundTrip", "total_ms"), memcpyMs);
 
     std::printf("\nLive round trips with the reference modeler (longest GUI-thread block):\n ");
     bool complete = true;
@@ -430,6 +523,13 @@ int main(int argc, char **argv) {
                 sgMedian(blocks), complete && sgMedian(blocks) <= 250 ? "met" : "NOT MET");
     std::printf("  %-46s %7.0f ms\n", "longest block, worst of the runs",
                 *std::max_element(blocks.begin(), blocks.end()));
+    // The first round trip of the process maps all its memory afresh; the later ones reuse the
+    // heap the application keeps. Polling and the 1 ms timer's turns are included.
+    std::printf("  GUI-thread CPU time of a live round trip, with polling and timer turns: first "
+                "%.0f ms (%.1f x memcpy), later median %.0f ms (%.1f x memcpy)\n",
+                liveCpu.front(), liveCpu.front() / memcpyMs,
+                sgMedian(std::vector<double>(liveCpu.begin() + 1, liveCpu.end())),
+                sgMedian(std::vector<double>(liveCpu.begin() + 1, liveCpu.end())) / memcpyMs);
     std::printf("  peak memory of the host %.0f MB for %.0f MB of geometry and %.0f MB of "
                 "records: %.2f x (target <= 3)\n",
                 peak / 1e6, geometry / 1e6, records / 1e6, peak / (geometry + records));

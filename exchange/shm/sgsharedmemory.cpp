@@ -84,6 +84,8 @@ struct SgSharedMemory::State {
     Platform::Access mappingAccess = Platform::Access::Read;
     // The wait of lock() and of the calls that lock on their own.
     std::uint32_t waitLimit = Platform::kInfinite;
+    // Created by this object and not attached for writing since: its creator fills it next.
+    bool freshlyCreated = false;
 };
 
 SgSharedMemory::SgSharedMemory(std::string_view key) {
@@ -214,6 +216,7 @@ bool SgSharedMemory::create(std::int32_t size) {
     closeMappings();
     d->dataView = {};
     d->referenceView = {};
+    d->freshlyCreated = false;
 
     if (size <= 0) {
         d->status = StatusBadSize;
@@ -245,6 +248,7 @@ bool SgSharedMemory::create(std::int32_t size) {
             Platform::unmapView(reference);
             d->size = size;
             d->mappingAccess = Platform::Access::ReadWrite;
+            d->freshlyCreated = true;
             return true;
         }
         if (reference.address)
@@ -311,6 +315,9 @@ bool SgSharedMemory::attach(int mode) {
         {recorded, d->dataView.length,
          static_cast<std::uint64_t>(std::numeric_limits<std::int32_t>::max())}));
     unlock();
+    if (d->freshlyCreated && access == Platform::Access::ReadWrite)
+        Platform::prepareForWriting(d->dataView);
+    d->freshlyCreated = false;
     return true;
 }
 

@@ -51,6 +51,10 @@ public:
     // Unmaps a view returned by mapView; false on failure.
     static bool unmapView(const View &view);
 
+    // Makes every page of a writable view present before the writer fills it, in one call
+    // instead of one fault per page; a hint that may do nothing.
+    static void prepareForWriting(const View &view);
+
     // Creates the semaphore `name` (initial count 1, maximum 1) or opens the one that exists.
     static Handle createSemaphore(const std::string &name);
 

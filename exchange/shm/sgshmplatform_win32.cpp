@@ -47,6 +47,8 @@ bool SgShmPlatform::unmapView(const View &view) {
     return UnmapViewOfFile(view.address) != 0;
 }
 
+void SgShmPlatform::prepareForWriting(const View &) {}
+
 SgShmPlatform::Handle SgShmPlatform::createSemaphore(const std::string &name) {
     return CreateSemaphoreA(nullptr, 1, 1, name.c_str());
 }

@@ -245,10 +245,6 @@ std::vector<int32_t> SgPolyMesh::getFaceGroupVertices(int group) const {
 std::vector<std::vector<int32_t>> SgPolyMesh::getAllFaceGroupVertices() const {
     const size_t groups = static_cast<size_t>(getFaceGroupCount());
     std::vector<std::vector<int32_t>> out(groups);
-    // The corners' vertices bucketed by group (counted, then placed), with each group's
-    // lowest and highest vertex.
-    std::vector<size_t> start(groups + 1, 0);
-    std::vector<int32_t> low(groups, INT32_MAX), high(groups, -1);
     auto forEachFacet = [&](auto &&visit) {
         for (size_t i = 0; i < m_triGroups.size(); ++i) {
             visit(m_triGroups[i], &m_triCorners[i * 3], size_t(3));
@@ -261,54 +257,71 @@ std::vector<std::vector<int32_t>> SgPolyMesh::getAllFaceGroupVertices() const {
                   size_t(m_polyStarts[i + 1] - m_polyStarts[i]));
         }
     };
+    // Each group's corners, lowest and highest vertex.
+    std::vector<size_t> count(groups, 0);
+    std::vector<int32_t> low(groups, INT32_MAX), high(groups, -1);
     forEachFacet([&](int32_t group, const SgFaceCorner *c, size_t n) {
         if (group >= 0 && size_t(group) < groups) {
-            start[size_t(group) + 1] += n;
+            count[size_t(group)] += n;
             for (size_t k = 0; k < n; ++k) {
                 low[size_t(group)] = std::min(low[size_t(group)], c[k].vertex);
                 high[size_t(group)] = std::max(high[size_t(group)], c[k].vertex);
             }
         }
     });
+    // A group whose span of vertices is not much wider than its corners (as with a figure's
+    // bones) marks its vertices in a byte per vertex of the span, read back in order; any other
+    // group collects its corners to be sorted. Linear in the corners either way, and the marks
+    // take at most four bytes per corner.
+    constexpr size_t kSorted = SIZE_MAX;
+    std::vector<size_t> marksAt(groups, kSorted), cornersAt(groups + 1, 0);
+    size_t markBytes = 0;
     for (size_t g = 0; g < groups; ++g) {
-        start[g + 1] += start[g];
+        const size_t span = count[g] ? size_t(high[g] - low[g]) + 1 : 0;
+        if (count[g] && span <= 4 * count[g]) {
+            marksAt[g] = markBytes;
+            markBytes += span;
+        } else {
+            cornersAt[g + 1] = count[g];
+        }
     }
-    std::vector<int32_t> corners(start[groups]);
-    std::vector<size_t> next(start.begin(), start.end() - 1);
+    for (size_t g = 0; g < groups; ++g) {
+        cornersAt[g + 1] += cornersAt[g];
+    }
+    std::vector<uint8_t> marks(markBytes, 0);
+    std::vector<int32_t> corners(cornersAt[groups]);
+    std::vector<size_t> next(cornersAt.begin(), cornersAt.end() - 1);
     forEachFacet([&](int32_t group, const SgFaceCorner *c, size_t n) {
-        if (group >= 0 && size_t(group) < groups) {
+        if (group < 0 || size_t(group) >= groups) {
+            return;
+        }
+        const size_t g = size_t(group);
+        if (marksAt[g] != kSorted) {
+            uint8_t *mark = marks.data() + marksAt[g] - size_t(low[g]);
             for (size_t k = 0; k < n; ++k) {
-                corners[next[size_t(group)]++] = c[k].vertex;
+                mark[size_t(c[k].vertex)] = 1;
+            }
+        } else {
+            for (size_t k = 0; k < n; ++k) {
+                corners[next[g]++] = c[k].vertex;
             }
         }
     });
-    // Each group's vertices in ascending order, each once: marked in a byte per vertex of the
-    // group's span and read back in order when the span is not much wider than the group's
-    // corners (as with a figure's bones), sorted otherwise. Linear in the corners either way.
-    std::vector<uint8_t> marks;
     for (size_t g = 0; g < groups; ++g) {
-        const int32_t *first = corners.data() + start[g];
-        const int32_t *last = corners.data() + start[g + 1];
         std::vector<int32_t> &list = out[g];
-        if (first == last) {
-            continue;
-        }
-        const size_t span = size_t(high[g] - low[g]) + 1;
-        if (span > 4 * size_t(last - first)) {
-            list.assign(first, last);
+        if (marksAt[g] != kSorted) {
+            const size_t span = size_t(high[g] - low[g]) + 1;
+            const uint8_t *mark = marks.data() + marksAt[g];
+            list.reserve(span);
+            for (size_t i = 0; i < span; ++i) {
+                if (mark[i]) {
+                    list.push_back(low[g] + int32_t(i));
+                }
+            }
+        } else if (count[g]) {
+            list.assign(corners.data() + cornersAt[g], corners.data() + cornersAt[g + 1]);
             std::sort(list.begin(), list.end());
             list.erase(std::unique(list.begin(), list.end()), list.end());
-            continue;
-        }
-        marks.assign(span, 0);
-        for (const int32_t *v = first; v != last; ++v) {
-            marks[size_t(*v - low[g])] = 1;
-        }
-        list.reserve(span);
-        for (size_t i = 0; i < span; ++i) {
-            if (marks[i]) {
-                list.push_back(low[g] + int32_t(i));
-            }
         }
     }
     return out;

@@ -1,5 +1,6 @@
 #include "sgcore/io/sgobjreader.h"
 
+#include "sgcore/geometry/sgbatchappender.h"
 #include "sgcore/geometry/sgpolymesh.h"
 #include "sgcore/geometry/sgpolyshape.h"
 #include "sgcore/io/sgfileio.h"
@@ -16,6 +17,7 @@
 #include <cstdint>
 #include <cstring>
 #include <limits>
+#include <optional>
 #include <string_view>
 
 namespace {
@@ -80,7 +82,7 @@ public:
         // The plain lines are read a word at a time, up to this far from the end.
         m_fastEnd = m_end - std::min<std::ptrdiff_t>(m_end - m_p, SgObjPlainLine::kReadAhead);
         while (m_p < m_end) {
-            if (m_p < m_fastEnd && readPlainLine()) {
+            if (m_p < m_fastEnd && readPlainRun()) {
                 continue;
             }
             ++m_line;
@@ -111,49 +113,141 @@ public:
     }
 
 private:
-    // The common lines in their plain forms (see SgObjPlainLine); false, with nothing taken,
-    // for any other line, which then goes through the general reader.
-    bool readPlainLine() {
+    // A run of common lines of one kind in their plain forms (see SgObjPlainLine), read in a
+    // loop of its own that appends in batches; false, with nothing taken, when the line at m_p
+    // is not one of them: it then goes through the general reader.
+    bool readPlainRun() {
         const char *p = m_p;
-        const char *next = nullptr;
+        const char *end = nullptr;
         if (p[0] == 'v' && p[1] == ' ') {
-            float xyz[3];
-            if ((next = SgObjPlainLine::vertex(p + 1, xyz))) {
-                m_vertices.emplace_back(xyz[0], xyz[1], xyz[2]);
-            }
+            end = readVertexRun();
         } else if (p[0] == 'f' && p[1] == ' ') {
-            next = readPlainFace(p + 1);
+            end = readFaceRun();
         } else if (p[0] == 'v' && p[1] == 't' && p[2] == ' ') {
-            float uv[2];
-            if ((next = SgObjPlainLine::uv(p + 2, uv))) {
-                m_uvs.push_back(SgVec2(uv[0], uv[1]));
-            }
+            end = readUVRun();
         }
-        if (!next) {
+        if (!end || end == m_p) {
             return false;
         }
-        m_p = next;
-        ++m_line;
+        m_p = end;
         return true;
     }
 
-    const char *readPlainFace(const char *p) {
-        int n = 0;
-        SgObjPlainLine::FaceIndexMax max;
-        const char *next = SgObjPlainLine::face(p, m_fastEnd, m_corners.data(), n, max);
-        // Faces before any material go through the general reader, which names "default".
-        if (!next || m_material < 0) {
-            return nullptr;
+    // Reads plain lines from m_p while each starts with `keyword` and `readLine(p)` (p just
+    // after the keyword) takes it, returning the start of the next line or null; counts the
+    // lines and returns where the run ends.
+    template <typename ReadLine>
+    const char *readRun(std::string_view keyword, ReadLine &&readLine) {
+        const char *p = m_p;
+        while (p < m_fastEnd && std::memcmp(p, keyword.data(), keyword.size()) == 0) {
+            const char *next = readLine(p + keyword.size() - 1);
+            if (!next) {
+                break;
+            }
+            p = next;
+            ++m_line;
         }
-        noteReference(max.vertex, m_maxVertexRef, m_maxVertexLine);
-        noteReference(max.uv, m_maxUVRef, m_maxUVLine);
-        noteReference(max.normal, m_maxNormalRef, m_maxNormalLine);
-        if (!m_facetsReserved) {
-            reserveFacets(size_t(n), size_t(next - m_p));
-        }
-        addFace(size_t(n));
-        return next;
+        return p;
     }
+
+    const char *readVertexRun() {
+        SgBatchAppender<SgVec3> out(m_vertices);
+        return readRun("v ", [&](const char *p) {
+            float xyz[3];
+            const char *next = SgObjPlainLine::vertex(p, xyz);
+            if (next) {
+                reserveFor(m_vertices, p - 1, next);
+                out.push(SgVec3(xyz[0], xyz[1], xyz[2]));
+            }
+            return next;
+        });
+    }
+
+    const char *readUVRun() {
+        SgBatchAppender<SgVec2> out(m_uvs);
+        return readRun("vt ", [&](const char *p) {
+            float uv[2];
+            const char *next = SgObjPlainLine::uv(p, uv);
+            if (next) {
+                reserveFor(m_uvs, p - 2, next);
+                out.push(SgVec2(uv[0], uv[1]));
+            }
+            return next;
+        });
+    }
+
+    // At the first line of a kind: room for as many more as the bytes left hold lines of this
+    // one's length, so that the array is not grown by doubling (each growth copies the array
+    // and touches fresh memory; room that stays unused costs address space only).
+    template <typename T>
+    void reserveFor(std::vector<T> &items, const char *line, const char *next) {
+        if (items.capacity() == 0) {
+            const auto lineBytes = size_t(next - line);
+            items.reserve(std::min(size_t(m_end - line) / lineBytes + 1, size_t(INT32_MAX / 2)));
+        }
+    }
+
+    // Faces of three and four corners go in batches, in the material and group of the run
+    // (a "usemtl" or "g" line ends it); longer ones one at a time.
+    const char *readFaceRun() {
+        // Faces before any material go through the general reader, which names "default".
+        if (m_material < 0) {
+            return m_p;
+        }
+        const auto material = static_cast<uint8_t>(m_material);
+        std::optional<FacetBatch<3>> triangles;
+        std::optional<FacetBatch<4>> quads;
+        return readRun("f ", [&](const char *p) {
+            int n = 0;
+            SgObjPlainLine::FaceIndexMax max;
+            const char *next = SgObjPlainLine::face(p, m_fastEnd, m_corners.data(), n, max);
+            if (!next) {
+                return next;
+            }
+            noteReference(max.vertex, m_maxVertexRef, m_maxVertexLine);
+            noteReference(max.uv, m_maxUVRef, m_maxUVLine);
+            noteReference(max.normal, m_maxNormalRef, m_maxNormalLine);
+            if (!m_facetsReserved) {
+                reserveFacets(size_t(n), size_t(next - p + 1));
+            }
+            if (n == 3) {
+                if (!triangles) {
+                    triangles.emplace(m_mesh->triangleCorners(), m_mesh->triangleMaterials(),
+                                      m_mesh->triangleGroups());
+                }
+                triangles->push(m_corners.data(), material, m_group);
+            } else if (n == 4) {
+                if (!quads) {
+                    quads.emplace(m_mesh->quadCorners(), m_mesh->quadMaterials(),
+                                  m_mesh->quadGroups());
+                }
+                quads->push(m_corners.data(), material, m_group);
+            } else {
+                addFace(size_t(n));
+            }
+            return next;
+        });
+    }
+
+    // The corners, materials and groups of facets of `corners` corners, appended in batches.
+    template <size_t corners> class FacetBatch {
+    public:
+        FacetBatch(std::vector<SgFaceCorner> &toCorners, std::vector<uint8_t> &toMaterials,
+                   std::vector<int32_t> &toGroups)
+            : m_corners(toCorners), m_materials(toMaterials), m_groups(toGroups) {}
+        void push(const SgFaceCorner *c, uint8_t material, int32_t group) {
+            for (size_t k = 0; k < corners; ++k) {
+                m_corners.push(c[k]);
+            }
+            m_materials.push(material);
+            m_groups.push(group);
+        }
+
+    private:
+        SgBatchAppender<SgFaceCorner, 256 * corners> m_corners;
+        SgBatchAppender<uint8_t, 256> m_materials;
+        SgBatchAppender<int32_t, 256> m_groups;
+    };
 
     void noteReference(std::uint32_t index, int64_t &maxRef, int &maxRefLine) const {
         if (int64_t(index) > maxRef) {

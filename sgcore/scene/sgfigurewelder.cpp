@@ -1,5 +1,6 @@
 #include "sgcore/scene/sgfigurewelder.h"
 
+#include "sgcore/geometry/sgbatchappender.h"
 #include "sgcore/geometry/sgbox3.h"
 #include "sgcore/geometry/sgmodifier.h"
 #include "sgcore/geometry/sgobject.h"
@@ -68,30 +69,27 @@ public:
         m_mask = cap - 1;
     }
 
-    // The welded index stored for exactly `p`; or -1, after storing `newIndex` for `p`
-    // (the caller then adds that vertex).
-    int32_t findOrAdd(const SgVec3 &p, int32_t newIndex) {
+    // A welded vertex at one position and the last bone slice that joined it.
+    struct Slot {
+        SgVec3 position;
+        int32_t index = -1;
+        int32_t lastBone = -1;
+    };
+
+    // The slot of exactly `p`: its welded vertex, or a free slot (index -1) that the caller
+    // fills for the vertex it adds.
+    Slot &slotFor(const SgVec3 &p) {
         size_t i = hash(p) & m_mask;
         while (true) {
             Slot &s = m_slots[i];
-            if (s.index < 0) {
-                s.position = p;
-                s.index = newIndex;
-                return -1;
-            }
-            if (s.position == p) {
-                return s.index;
+            if (s.index < 0 || s.position == p) {
+                return s;
             }
             i = (i + 1) & m_mask;
         }
     }
 
 private:
-    struct Slot {
-        SgVec3 position;
-        int32_t index = -1;
-    };
-
     static size_t hash(const SgVec3 &p) {
         // Adding 0 turns -0 into +0, so both zeros hash alike (they compare equal).
         const uint32_t x = std::bit_cast<uint32_t>(p.x + 0.0f);
@@ -130,23 +128,30 @@ SgFaceCorner remapCorner(const SgFaceCorner &c, int32_t vertex, int32_t uvCount,
     return out;
 }
 
+// Appends `from[i]` mapped by `map` to `to` for every i.
+template <typename T, typename U, typename Map>
+void appendMapped(std::vector<T> &to, const std::vector<U> &from, Map &&map) {
+    SgBatchAppender<T> out(to);
+    for (const U &item : from) {
+        out.push(map(item));
+    }
+}
+
 // Appends `bone`'s facets to `out` with vertex indices mapped by `vertexOf`.
 template <typename V>
 void appendFacets(SgPolyMesh &out, const SgPolyMesh &bone, const std::vector<uint8_t> &materialMap,
                   int32_t group, int32_t uvOffset, V &&vertexOf) {
     const int32_t uvCount = bone.getUVCount();
-    // Appended one by one into the room reserveFor made: each byte is written once (a resize
-    // would write every new element twice).
     auto copyCorners = [&](const std::vector<SgFaceCorner> &from, std::vector<SgFaceCorner> &to) {
-        for (const SgFaceCorner &c : from) {
-            to.push_back(remapCorner(c, vertexOf(c.vertex), uvCount, uvOffset));
-        }
+        appendMapped(to, from, [&](const SgFaceCorner &c) {
+            return remapCorner(c, vertexOf(c.vertex), uvCount, uvOffset);
+        });
     };
     auto copyFacets = [&](const std::vector<uint8_t> &mats, std::vector<uint8_t> &toMats,
                           std::vector<int32_t> &toGroups) {
-        for (uint8_t local : mats) {
-            toMats.push_back(local < materialMap.size() ? materialMap[local] : uint8_t(255));
-        }
+        appendMapped(toMats, mats, [&](uint8_t local) {
+            return local < materialMap.size() ? materialMap[local] : uint8_t(255);
+        });
         toGroups.insert(toGroups.end(), mats.size(), group);
     };
     copyCorners(bone.triangleCorners(), out.triangleCorners());
@@ -204,7 +209,7 @@ void appendCarriers(SgPolyMesh &out, const std::vector<int32_t> &vertices, int32
     }
 }
 
-bool insideAny(const std::vector<SgBox3> &boxes, const SgVec3 &p) {
+inline bool insideAny(const std::vector<SgBox3> &boxes, const SgVec3 &p) {
     for (const SgBox3 &b : boxes) {
         if (p.x >= b.min.x && p.x <= b.max.x && p.y >= b.min.y && p.y <= b.max.y &&
             p.z >= b.min.z && p.z <= b.max.z) {
@@ -244,16 +249,23 @@ template <typename Slices> std::vector<std::vector<SgBox3>> seamRegions(const Sl
     return regions;
 }
 
+// For each bone, its vertices inside its seam regions, in ascending order (the only ones the
+// weld probes); `count` is their number in all.
 template <typename Slices>
-size_t seamVertexCount(const Slices &slices, const std::vector<std::vector<SgBox3>> &regions) {
-    size_t count = 0;
+std::vector<std::vector<int32_t>>
+seamVertices(const Slices &slices, const std::vector<std::vector<SgBox3>> &regions, size_t &count) {
+    std::vector<std::vector<int32_t>> seams(slices.size());
+    count = 0;
     for (size_t b = 0; b < slices.size(); ++b) {
         const int32_t n = slices[b].base->getVertexCount();
         for (int32_t i = 0; i < n && !regions[b].empty(); ++i) {
-            count += insideAny(regions[b], slices[b].source[size_t(i)]);
+            if (insideAny(regions[b], slices[b].source[size_t(i)])) {
+                seams[b].push_back(i);
+            }
         }
+        count += seams[b].size();
     }
-    return count;
+    return seams;
 }
 
 } // namespace
@@ -370,8 +382,6 @@ void SgFigureWelder::build(SgSkeleton *figure, bool ignoreInvisible, bool weldGe
     // Welded vertices.
     std::vector<SgVec3> &wv = welded->vertices();
     wv.reserve(totalVertices);
-    std::vector<int32_t> lastBone; // per welded vertex: the last bone slice that joined it
-    lastBone.reserve(totalVertices);
     for (BoneSlice &s : m_slices) {
         if (s.hasMorphs) {
             SgVertexMesh *morphed = getMorphOnlyGeom(s.bone);
@@ -384,9 +394,11 @@ void SgFigureWelder::build(SgSkeleton *figure, bool ignoreInvisible, bool weldGe
             s.source = s.base->getVertices();
         }
     }
-    const std::vector<std::vector<SgBox3>> seams =
-        weldGeometry ? seamRegions(m_slices) : std::vector<std::vector<SgBox3>>(m_slices.size());
-    PositionTable table(weldGeometry ? seamVertexCount(m_slices, seams) : 0);
+    size_t seamCount = 0;
+    const std::vector<std::vector<int32_t>> seams =
+        weldGeometry ? seamVertices(m_slices, seamRegions(m_slices), seamCount)
+                     : std::vector<std::vector<int32_t>>(m_slices.size());
+    PositionTable table(seamCount);
     int32_t outStart = 0;
     int32_t uvOffset = 0;
     for (size_t b = 0; b < m_slices.size(); ++b) {
@@ -394,30 +406,35 @@ void SgFigureWelder::build(SgSkeleton *figure, bool ignoreInvisible, bool weldGe
         const int32_t n = s.base->getVertexCount();
         std::vector<uint8_t> used(size_t(n), 0);
         forEachCorner(*s.base, [&](const SgFaceCorner &c) { used[size_t(c.vertex)] = 1; });
-        s.weldIndex.assign(size_t(n), -1);
-        const std::vector<SgBox3> &meets = seams[b];
+        s.weldIndex.reserve(size_t(n));
+        const int32_t *seam = seams[b].data();
+        const int32_t *seamEnd = seam + seams[b].size();
         for (int32_t i = 0; i < n; ++i) {
+            const bool onSeam = seam != seamEnd && *seam == i;
+            seam += onSeam;
             if (!used[size_t(i)]) {
                 s.unused.push_back(i);
                 if (removeUnused) {
+                    s.weldIndex.push_back(-1);
                     continue;
                 }
             }
             const SgVec3 &p = s.source[size_t(i)];
-            int32_t w = -1;
-            if (weldGeometry && insideAny(meets, p)) {
-                const int32_t found = table.findOrAdd(p, static_cast<int32_t>(wv.size()));
-                if (found >= 0 && lastBone[size_t(found)] != int32_t(b)) {
-                    w = found;
-                    lastBone[size_t(w)] = int32_t(b);
+            const auto added = static_cast<int32_t>(wv.size());
+            int32_t w = added;
+            if (onSeam) {
+                PositionTable::Slot &slot = table.slotFor(p);
+                if (slot.index < 0) {
+                    slot = {p, added, int32_t(b)};
+                } else if (slot.lastBone != int32_t(b)) {
+                    w = slot.index;
+                    slot.lastBone = int32_t(b);
                 }
             }
-            if (w < 0) {
-                w = static_cast<int32_t>(wv.size());
+            if (w == added) {
                 wv.push_back(p);
-                lastBone.push_back(int32_t(b));
             }
-            s.weldIndex[size_t(i)] = w;
+            s.weldIndex.push_back(w);
         }
         s.outStart = outStart;
         outStart += n;
@@ -449,8 +466,11 @@ SgVertexMesh *SgFigureWelder::unWeld(const SgVertexMesh *edited) const {
     reserveFor(*out, m_slices);
     for (const BoneSlice &s : m_slices) {
         const int32_t group = out->addFaceGroup(s.bone->getName());
+        // The offset in a local: the batch's stores could otherwise alias it for the compiler,
+        // which then reloads it for every corner (twice the time of the whole copy).
+        const int32_t offset = s.outStart;
         appendFacets(*out, *s.base, s.materialMap, group, s.uvOffset,
-                     [&](int32_t v) { return v + s.outStart; });
+                     [offset](int32_t v) { return v + offset; });
         appendCarriers(*out, s.unused, s.outStart, group);
     }
     return out;

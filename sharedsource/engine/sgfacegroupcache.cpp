@@ -7,9 +7,10 @@ SgFaceGroupCache::~SgFaceGroupCache() {
 }
 
 void SgFaceGroupCache::release() {
-    if (m_mesh)
+    if (m_mesh && m_held)
         m_mesh->unref();
     m_mesh = nullptr;
+    m_held = false;
     m_groups.clear();
 }
 
@@ -17,9 +18,13 @@ const std::vector<int32_t> *SgFaceGroupCache::groupVertices(SgPolyMesh *mesh, in
     if (!mesh)
         return nullptr;
     if (mesh != m_mesh) {
-        mesh->ref(); // before the release: the old and the new mesh may be the same object
+        // Referenced before the release: the old and the new mesh may be the same object.
+        const bool held = mesh->getRefCount() > 0;
+        if (held)
+            mesh->ref();
         release();
         m_mesh = mesh;
+        m_held = held;
         m_groups = mesh->getAllFaceGroupVertices();
     }
     if (group < 0 || size_t(group) >= m_groups.size())

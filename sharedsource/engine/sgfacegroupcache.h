@@ -10,9 +10,11 @@ class SgPolyMesh;
 // node list keeps one, so matching a hundred bones costs one pass over the facets instead of
 // one per bone.
 //
-// The cache belongs to one run: it holds a reference on its mesh, so that the mesh cannot be
-// freed and its address taken by another mesh while the cache still describes it. Asking for a
-// group of another mesh gathers that mesh's groups instead. Not copyable.
+// The cache belongs to one run: it holds a reference on a reference-counted mesh, so that the
+// mesh cannot be freed and its address taken by another mesh while the cache still describes
+// it. A mesh that nobody holds a reference on (count 0: owned by its caller directly) is only
+// borrowed, never freed by the cache: the caller keeps it alive for the run. Asking for a group
+// of another mesh gathers that mesh's groups instead. Not copyable.
 class SgFaceGroupCache {
 public:
     SgFaceGroupCache() = default;
@@ -28,5 +30,6 @@ private:
     void release();
 
     SgPolyMesh *m_mesh = nullptr;
+    bool m_held = false; // whether the cache holds a reference on m_mesh
     std::vector<std::vector<int32_t>> m_groups;
 };

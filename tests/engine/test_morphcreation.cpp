@@ -5,6 +5,7 @@
 #include "sgcore/morph/sgmorphdeltas.h"
 #include "sgcore/properties/sgfloatproperty.h"
 #include "sgcore/scene/sgfigurewelder.h"
+#include "sharedsource/engine/sgfacegroupcache.h"
 #include "sharedsource/engine/sgmorphloader.h"
 #include "sharedsource/engine/sgmorphloadlog.h"
 
@@ -479,6 +480,34 @@ TEST_F(MorphCreation, FaceGroupsAreGatheredAgainForEveryRun) {
     ASSERT_TRUE(morphOn(bones.b, "Second"));
     EXPECT_EQ(morphOn(bones.b, "Second")->getDeltas()->getVertex(0), moved);
     EXPECT_FALSE(log.hasProblems()) << log.toHtml().toStdString();
+
+    // A mesh its caller owns directly (reference count 0) is borrowed, never freed, by the
+    // group lookups, with a run's cache or without one.
+    struct Watched : SgPolyMesh {
+        Watched(const SgPolyMesh &from, bool &flag) : gone(flag) {
+            vertices() = from.vertices();
+            for (int g = 0; g < from.getFaceGroupCount(); ++g)
+                addFaceGroup(from.getFaceGroupName(g));
+            triangleCorners() = from.triangleCorners();
+            triangleMaterials() = from.triangleMaterials();
+            triangleGroups() = from.triangleGroups();
+        }
+        ~Watched() override { gone = true; }
+        bool &gone;
+    };
+    bool gone = false;
+    {
+        Watched owned(*bones.target, gone);
+        SgFaceGroupCache run;
+        for (SgFaceGroupCache *cache : {&run, static_cast<SgFaceGroupCache *>(nullptr)}) {
+            SgVertexMesh *group = loader.groupGeometry(bones.a, &owned, cache);
+            ASSERT_TRUE(group);
+            EXPECT_EQ(group->getVertexCount(), TwoBones::count);
+            group->unref();
+            EXPECT_FALSE(gone);
+        }
+    }
+    EXPECT_TRUE(gone);
 }
 
 TEST_F(MorphCreation, WeldedFigureTargetsBecomeOneLinkedMorphPerMovedBone) {
