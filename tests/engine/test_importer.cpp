@@ -122,7 +122,8 @@ TEST_F(GeometryImport, FileLoadsMakeMorphsOrReportWhyNot) {
     loader.setCreateControl(false);
     SgFileIOSettings options;
 
-    loader.setFilename(writeFile(dir, "brow.obj", objOf(*sgTestGeometry(node), 6, SgVec3(0, 0, 0.25f))));
+    loader.setFilename(
+        writeFile(dir, "brow.obj", objOf(*sgTestGeometry(node), 6, SgVec3(0, 0, 0.25f))));
     SgMorphLoadLog log;
     loader.loadMorphForNode(options, node, log);
     EXPECT_EQ(log.toHtml(), QString("<HTML><HEAD></HEAD><BODY>\nLoading morph Brow...<BR>"
@@ -159,7 +160,8 @@ TEST_F(GeometryImport, FileLoadsMakeMorphsOrReportWhyNot) {
     // A target whose coordinates are not numbers never becomes a morph.
     for (const char *bad : {"nan", "inf", "1e39"}) {
         SgMorphLoadLog invalid;
-        loader.setFilename(writeFile(dir, "bad.obj", objOf(*sgTestGeometry(node), 3, SgVec3(), bad)));
+        loader.setFilename(
+            writeFile(dir, "bad.obj", objOf(*sgTestGeometry(node), 3, SgVec3(), bad)));
         loader.loadMorphForNode(options, node, invalid);
         EXPECT_TRUE(invalid.hasProblems()) << bad;
         EXPECT_FALSE(node->getObject()->findModifier("Other")) << bad;

@@ -53,7 +53,8 @@ TEST_F(ReverseDeformations, LoadedSculptOfAPoseIsReproducedWhenPosedAgain) {
         Arm arm;
         arm.pose();
         // Sculpt the posed lower bone: two vertices pushed out.
-        std::unique_ptr<SgPolyMesh> sculpt(sgTestCopyVertices(*arm.lower->getObject()->getCachedGeom()));
+        std::unique_ptr<SgPolyMesh> sculpt(
+            sgTestCopyVertices(*arm.lower->getObject()->getCachedGeom()));
         sculpt->setVertex(2, sculpt->getVertex(2) + SgVec3(0.3f, -0.2f, 0.1f));
         sculpt->setVertex(6, sculpt->getVertex(6) + SgVec3(0.0f, 0.0f, 0.5f));
 

@@ -15,8 +15,8 @@
 #include "sgcore/scene/sgbone.h"
 #include "sgcore/scene/sgscene.h"
 #include "sgcore/scene/sgskeleton.h"
-#include "tests/support/sgtestscene.h"
 #include "tests/support/sgtestmain.h"
+#include "tests/support/sgtestscene.h"
 
 #include <QDir>
 #include <QFile>
