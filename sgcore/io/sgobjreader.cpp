@@ -195,6 +195,7 @@ private:
             return m_p;
         }
         const auto material = static_cast<uint8_t>(m_material);
+        // The batches end (and append what they hold) before the run returns.
         std::optional<FacetBatch<3>> triangles;
         std::optional<FacetBatch<4>> quads;
         return readRun("f ", [&](const char *p) {
@@ -213,15 +214,15 @@ private:
             if (n == 3) {
                 if (!triangles) {
                     triangles.emplace(m_mesh->triangleCorners(), m_mesh->triangleMaterials(),
-                                      m_mesh->triangleGroups());
+                                      m_mesh->triangleGroups(), material, m_group);
                 }
-                triangles->push(m_corners.data(), material, m_group);
+                triangles->push(m_corners.data());
             } else if (n == 4) {
                 if (!quads) {
                     quads.emplace(m_mesh->quadCorners(), m_mesh->quadMaterials(),
-                                  m_mesh->quadGroups());
+                                  m_mesh->quadGroups(), material, m_group);
                 }
-                quads->push(m_corners.data(), material, m_group);
+                quads->push(m_corners.data());
             } else {
                 addFace(size_t(n));
             }
@@ -229,24 +230,35 @@ private:
         });
     }
 
-    // The corners, materials and groups of facets of `corners` corners, appended in batches.
+    // Facets of `corners` corners in one material and group: their corners appended in
+    // batches, their materials and groups all at once at the end.
     template <size_t corners> class FacetBatch {
     public:
         FacetBatch(std::vector<SgFaceCorner> &toCorners, std::vector<uint8_t> &toMaterials,
-                   std::vector<int32_t> &toGroups)
-            : m_corners(toCorners), m_materials(toMaterials), m_groups(toGroups) {}
-        void push(const SgFaceCorner *c, uint8_t material, int32_t group) {
+                   std::vector<int32_t> &toGroups, uint8_t material, int32_t group)
+            : m_corners(toCorners), m_materials(toMaterials), m_groups(toGroups),
+              m_material(material), m_group(group) {}
+        ~FacetBatch() {
+            m_materials.insert(m_materials.end(), m_count, m_material);
+            m_groups.insert(m_groups.end(), m_count, m_group);
+        }
+        FacetBatch(const FacetBatch &) = delete;
+        FacetBatch &operator=(const FacetBatch &) = delete;
+
+        void push(const SgFaceCorner *c) {
             for (size_t k = 0; k < corners; ++k) {
                 m_corners.push(c[k]);
             }
-            m_materials.push(material);
-            m_groups.push(group);
+            ++m_count;
         }
 
     private:
         SgBatchAppender<SgFaceCorner, 256 * corners> m_corners;
-        SgBatchAppender<uint8_t, 256> m_materials;
-        SgBatchAppender<int32_t, 256> m_groups;
+        std::vector<uint8_t> &m_materials;
+        std::vector<int32_t> &m_groups;
+        uint8_t m_material;
+        int32_t m_group;
+        size_t m_count = 0;
     };
 
     void noteReference(std::uint32_t index, int64_t &maxRef, int &maxRefLine) const {
