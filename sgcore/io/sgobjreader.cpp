@@ -19,6 +19,7 @@
 #include <limits>
 #include <optional>
 #include <string_view>
+#include <type_traits>
 
 namespace {
 
@@ -120,11 +121,11 @@ private:
         const char *p = m_p;
         const char *end = nullptr;
         if (p[0] == 'v' && p[1] == ' ') {
-            end = readVertexRun();
+            end = readNumberRun("v ", m_vertices);
         } else if (p[0] == 'f' && p[1] == ' ') {
             end = readFaceRun();
         } else if (p[0] == 'v' && p[1] == 't' && p[2] == ' ') {
-            end = readUVRun();
+            end = readNumberRun("vt ", m_uvs);
         }
         if (!end || end == m_p) {
             return false;
@@ -150,27 +151,21 @@ private:
         return p;
     }
 
-    const char *readVertexRun() {
-        SgBatchAppender<SgVec3> out(m_vertices);
-        return readRun("v ", [&](const char *p) {
-            float xyz[3];
-            const char *next = SgObjPlainLine::vertex(p, xyz);
+    // A run of "v" lines (three numbers each) or "vt" lines (two) into `items`.
+    template <typename T>
+    const char *readNumberRun(std::string_view keyword, std::vector<T> &items) {
+        constexpr bool vertices = std::is_same_v<T, SgVec3>;
+        SgBatchAppender<T> out(items);
+        return readRun(keyword, [&](const char *p) {
+            float v[3];
+            const char *next = vertices ? SgObjPlainLine::vertex(p, v) : SgObjPlainLine::uv(p, v);
             if (next) {
-                reserveFor(m_vertices, p - 1, next);
-                out.push(SgVec3(xyz[0], xyz[1], xyz[2]));
-            }
-            return next;
-        });
-    }
-
-    const char *readUVRun() {
-        SgBatchAppender<SgVec2> out(m_uvs);
-        return readRun("vt ", [&](const char *p) {
-            float uv[2];
-            const char *next = SgObjPlainLine::uv(p, uv);
-            if (next) {
-                reserveFor(m_uvs, p - 2, next);
-                out.push(SgVec2(uv[0], uv[1]));
+                reserveFor(items, p + 1 - keyword.size(), next);
+                if constexpr (vertices) {
+                    out.push(SgVec3(v[0], v[1], v[2]));
+                } else {
+                    out.push(SgVec2(v[0], v[1]));
+                }
             }
             return next;
         });
