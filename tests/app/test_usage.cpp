@@ -199,6 +199,9 @@ public:
     // quits with the host.
     void finish() {
         m_step = QStringLiteral("finish");
+        // The last Send is the user's: no modeler dies under it and no dialog is held.
+        m_finishing = true;
+        m_holdNext = false;
         if (sgApp->getScene()->getNodeCount() == 0)
             reload();
         sgApp->getScene()->selectNode(sgApp->getScene()->getNode(0));
@@ -359,7 +362,7 @@ private:
             m_answerAt.start();
             m_answerAfterMs = hold ? kHeldDialogMs : pick(0, 150);
             // Now and then the modeler dies while the user reads a dialog.
-            if (pick(0, 20) == 0)
+            if (pick(0, 20) == 0 && !m_finishing)
                 signalModeler(SIGKILL);
             return;
         }
@@ -467,6 +470,7 @@ private:
     QWidget *m_answering = nullptr;
     int m_answerAfterMs = 0;
     bool m_holdNext = false;
+    bool m_finishing = false;
     int m_dialogs = 0;
     int m_held = 0;
     int m_names = 0;
