@@ -122,7 +122,8 @@ TEST_F(ExchangeReaderTest, ReturnedRecordBecomesAShape) {
 }
 
 TEST_F(ExchangeReaderTest, EmptyBlocksAndUnknownFacetTypes) {
-    // name "E", V = 3, U = 0, M = 0, F = 3: 'X' (no corners), 'T', a 'P' of 2 corners; trailer.
+    // name "E", V = 3, U = 0, M = 0, F = 4: 'X' (no corners), 'T' in material 1 of 1 (read as
+    // 0), a 'P' of 2 corners, a 'P' of 5 corners in material 1; trailer.
     const QByteArray record = QByteArray::fromHex(
         "01000000"
         "45"
@@ -130,11 +131,11 @@ TEST_F(ExchangeReaderTest, EmptyBlocksAndUnknownFacetTypes) {
         "0000803f000000400000404000000000000000000000000000000000000000000000803f"
         "00000000"
         "00000000"
-        "03000000"
+        "04000000"
         "58"
         "00000000"
         "54"
-        "00000000"
+        "01000000"
         "000000000700000009000000"
         "010000000000000000000000"
         "020000000000000000000000"
@@ -143,14 +144,25 @@ TEST_F(ExchangeReaderTest, EmptyBlocksAndUnknownFacetTypes) {
         "02000000"
         "000000000000000000000000"
         "010000000000000000000000"
+        "50"
+        "01000000"
+        "05000000"
+        "000000000000000000000000"
+        "010000000000000000000000"
+        "020000000000000000000000"
+        "000000000000000000000000"
+        "010000000000000000000000"
         "00000000");
     auto shape = read(record);
     ASSERT_TRUE(shape);
     const SgPolyMesh *mesh = shape->getPolyMesh();
     EXPECT_EQ(mesh->getVertex(0), SgVec3(10, 20, 30));
     EXPECT_FALSE(mesh->getUVList());
-    ASSERT_EQ(mesh->getFacetCount(), 1);
+    ASSERT_EQ(mesh->getFacetCount(), 2);
     EXPECT_EQ(mesh->getTriangleCorners(0)[0], (SgFaceCorner{0, -1, -1})); // UV means nothing
+    EXPECT_EQ(mesh->getTriangleMaterial(0), 0);
+    ASSERT_EQ(mesh->getPolygonCount(), 1);
+    EXPECT_EQ(mesh->getPolygonMaterial(0), 0);
     ASSERT_EQ(shape->getMaterialCount(), 1);
     EXPECT_EQ(shape->getMaterial(0)->getName(), "default");
     EXPECT_TRUE(logLines().isEmpty());

@@ -133,7 +133,7 @@ TEST_F(ExchangeRobustnessTest, BadCountsAndIndicesAreRejected) {
         {v + 4, 0x7fc00000},
         {v + 8, 0x7f800000},
         {v + 12, 0x7ef00000},
-        {u + 4 + 8, 0x7fc00000},
+        {u + 4 + 3 * 8 - 4, 0x7fc00000}, // the last UV's v
     };
     for (const auto &c : cases) {
         QByteArray bad = record;

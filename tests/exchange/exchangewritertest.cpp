@@ -143,6 +143,20 @@ TEST_F(ExchangeWriterTest, RecordSizesAndScaling) {
     EXPECT_EQ(i32At(p, pf + 9), 7);
     EXPECT_EQ(i32At(p, pf + 13 + 6 * 12 + 8), 9); // third index of the last corner
     EXPECT_EQ(p.size(), pf + 4 + 9 + 84 + 4);
+
+    // Polygons of the most corners the host holds stay inside the measured size.
+    const int most = SgPolyMesh::kMaxPolygonCorners;
+    SgPolyMesh *wide = makeMesh(std::vector<SgVec3>(size_t(most)));
+    std::vector<std::vector<int>> corners;
+    for (int i = 0; i < most; ++i)
+        corners.push_back({i});
+    for (int n = 0; n < 3; ++n)
+        addFacet(*wide, 0, corners);
+    auto wideNode = prop("W", wide, {new BareMaterial("M")});
+    std::int32_t measured = 0;
+    const QByteArray w = writeNode(wideNode.get(), QString(), &measured);
+    EXPECT_EQ(w.size(), 9 + most * 12 + 4 + 67 + 4 + 3 * (9 + most * 12) + 4);
+    EXPECT_LE(w.size(), measured);
 }
 
 TEST_F(ExchangeWriterTest, FacetsGoInMaterialOrderAndUnknownMaterialsAreLeftOut) {
@@ -261,6 +275,15 @@ TEST_F(ExchangeWriterTest, ImagesAreCopiedAsJpegOncePerImageFileUnderSafeUniqueN
     QFile::resize(copy, 3);
     EXPECT_EQ(SgMaterialBlockWriter::exportTextureAsJpeg(wood), copy);
     EXPECT_EQ(QFileInfo(copy).size(), 3);
+    // One older than its image (the image was edited since) is written again.
+    {
+        QFile older(copy);
+        ASSERT_TRUE(older.open(QIODevice::ReadWrite));
+        older.setFileTime(QFileInfo(source).lastModified().addSecs(-60),
+                          QFileDevice::FileModificationTime);
+    }
+    EXPECT_EQ(SgMaterialBlockWriter::exportTextureAsJpeg(wood), copy);
+    EXPECT_GT(QFileInfo(copy).size(), 3);
 
     // A name beyond 8 bits travels as an ASCII name the modeler can open.
     const QString accented =
@@ -355,13 +378,18 @@ TEST_F(ExchangeWriterTest, ADestinationTooSmallIsNeverOverrun) {
     addFacet(*mesh, 0, {{0}, {1}, {2}});
     auto node = prop("A", mesh, {new BareMaterial("a-long-material-name")});
     SgExchangeWriter writer(node.get(), QString());
-    for (const int capacity : {3, 60, 130}) {
+    // Every capacity short of the record fails without a byte past it; the exact one fits.
+    QByteArray whole(200, '\x7f');
+    const std::int32_t size = writer.write(whole.data(), 200);
+    ASSERT_GT(size, 100);
+    for (int capacity = 0; capacity < size; ++capacity) {
         clearLog();
         QByteArray buffer(200, '\x7f');
-        EXPECT_EQ(writer.write(buffer.data(), capacity), 0);
-        EXPECT_EQ(buffer.mid(capacity), QByteArray(200 - capacity, '\x7f'));
-        EXPECT_TRUE(logLines().contains("Error writting node to shared memory map."));
+        ASSERT_EQ(writer.write(buffer.data(), capacity), 0) << capacity;
+        ASSERT_EQ(buffer.mid(capacity), QByteArray(200 - capacity, '\x7f')) << capacity;
+        EXPECT_EQ(logLines().isEmpty(), capacity == 0) << capacity; // the failure is logged
     }
+    EXPECT_EQ(writer.write(whole.data(), size), size);
     // A string that does not fit says so too.
     clearLog();
     QByteArray buffer(200, '\x7f');
