@@ -25,9 +25,10 @@
 #include "sgcore/scene/sgbone.h"
 #include "sgcore/scene/sgscene.h"
 #include "sgcore/scene/sgskeleton.h"
+#include "tests/support/sgtestdrivers.h"
 #include "tests/support/sgtestmain.h"
+#include "tests/support/sgtestmodal.h"
 #include "tests/support/sgwidgetfit.h"
-#include "tests/ui/uitesthelpers.h"
 
 #include <QApplication>
 #include <QCheckBox>
@@ -54,20 +55,6 @@ QMenu *submenu(const QList<QAction *> &actions, const QString &title) {
         if (action->menu() && action->text() == title)
             return action->menu();
     return nullptr;
-}
-
-// Answers the next file dialog with `path` (or cancels it when empty).
-void answerFileDialog(const QString &path) {
-    uitest::onNextModal([path](QWidget *modal) {
-        auto *dialog = qobject_cast<QFileDialog *>(modal);
-        ASSERT_NE(dialog, nullptr) << modal->metaObject()->className();
-        if (path.isEmpty()) {
-            dialog->reject();
-            return;
-        }
-        dialog->selectFile(path);
-        QMetaObject::invokeMethod(dialog, "accept");
-    });
 }
 
 QAction *actionNamed(const SgAppWindow &window, const char *name) {
@@ -222,23 +209,21 @@ TEST(AppWindow, SavesReopensAndNeverLosesChangesSilently) {
 
     // Closing asks, in a box whose texts fit; "Cancel" keeps the window and the changes.
     QString question;
-    uitest::onNextModal([&question](QWidget *modal) {
-        auto *box = qobject_cast<QMessageBox *>(modal);
-        ASSERT_NE(box, nullptr);
-        question = box->text();
-        const QStringList cut = sgCutTexts(box);
-        EXPECT_TRUE(cut.isEmpty()) << cut.join('\n').toStdString();
-        box->button(QMessageBox::Cancel)->click();
-    });
-    EXPECT_FALSE(window.close());
+    EXPECT_FALSE(sgTestAnswering({sgTestAs<QMessageBox>([&question](QMessageBox *box) {
+                                     question = box->text();
+                                     const QStringList cut = sgCutTexts(box);
+                                     EXPECT_TRUE(cut.isEmpty()) << cut.join('\n').toStdString();
+                                     box->button(QMessageBox::Cancel)->click();
+                                 })},
+                                 [&] { return window.close(); }));
     EXPECT_TRUE(question.contains(QStringLiteral("scene.json has unsaved changes")));
     EXPECT_TRUE(window.isVisible());
 
     // "Save Scene As..." writes the scene and its geometry and makes it the current file.
     const QString saved = sgTestPath(QStringLiteral("session/work.json"));
     QDir().mkpath(sgTestPath(QStringLiteral("session")));
-    answerFileDialog(saved);
-    actionNamed(window, "SgSaveSceneAsAction")->trigger();
+    sgTestAnswering({sgTestChooseFile(saved)},
+                    [&] { actionNamed(window, "SgSaveSceneAsAction")->trigger(); });
     EXPECT_TRUE(QFile::exists(saved));
     EXPECT_TRUE(QFile::exists(sgTestPath(QStringLiteral("session/work-geometry/Blobby-hip.obj"))));
     EXPECT_FALSE(window.isSceneModified());
@@ -246,9 +231,8 @@ TEST(AppWindow, SavesReopensAndNeverLosesChangesSilently) {
 
     // Opening another scene with changes asks first; "Discard" goes on to the file dialog.
     window.propertyPanel()->setValue(grow, 0.25);
-    uitest::answerMessageBox(nullptr, QStringLiteral("Discard"));
-    answerFileDialog(QString());
-    actionNamed(window, "SgOpenSceneAction")->trigger();
+    sgTestAnswering({sgTestPressButton(QMessageBox::Discard), sgTestChooseFile(QString())},
+                    [&] { actionNamed(window, "SgOpenSceneAction")->trigger(); });
     QApplication::processEvents();
     EXPECT_EQ(scene->findNodeByLabel(QStringLiteral("Blobby")), figure) << "cancelled: kept";
 
@@ -283,8 +267,8 @@ TEST(AppWindow, SavesReopensAndNeverLosesChangesSilently) {
 
     // Changed again, closing with "Save" saves to the current file and closes.
     window.propertyPanel()->setValue(reopened, -0.5);
-    uitest::answerMessageBox(nullptr, QStringLiteral("Save"));
-    EXPECT_TRUE(window.close());
+    EXPECT_TRUE(
+        sgTestAnswering({sgTestPressButton(QMessageBox::Save)}, [&] { return window.close(); }));
     SgScene check;
     SgSceneFile file;
     ASSERT_TRUE(file.load(saved, &check));
@@ -298,9 +282,7 @@ TEST(AppWindow, SavesReopensAndNeverLosesChangesSilently) {
 
 TEST(AppWindow, PreferencesHoldTheModelerPathAndTheImportRoad) {
     SgAppWindow window;
-    uitest::onNextModal([](QWidget *modal) {
-        auto *dialog = qobject_cast<SgPreferencesDlg *>(modal);
-        ASSERT_NE(dialog, nullptr);
+    SgTestModalAnswer answer(sgTestAs<SgPreferencesDlg>([](SgPreferencesDlg *dialog) {
         EXPECT_EQ(dialog->windowTitle(), QStringLiteral("Preferences"));
         const QString artifacts = qEnvironmentVariable("SG_TEST_ARTIFACTS", QDir::tempPath());
         QDir().mkpath(artifacts);
@@ -310,7 +292,7 @@ TEST(AppWindow, PreferencesHoldTheModelerPathAndTheImportRoad) {
         dialog->installPathEdit()->setText(QStringLiteral("/opt/facetor"));
         dialog->bridgeToolsBox()->setChecked(true);
         dialog->accept();
-    });
+    }));
     actionNamed(window, "SgPreferencesAction")->trigger();
     SgAppSettings settings;
     EXPECT_EQ(settings.getString(QStringLiteral("FacetorInstallPath")),
@@ -400,10 +382,10 @@ TEST(AppWindow, DeleteRemovesSelectedPropsAndFiguresButNoLoneBone) {
     scene->selectNode(box, true);
     ASSERT_EQ(window.propertyPanel()->node(), box);
     QString question;
-    uitest::answerMessageBox(&question, QStringLiteral("&Yes"));
     QAction *remove = actionNamed(window, "SgDeleteAction");
     ASSERT_NE(remove, nullptr);
-    remove->trigger();
+    sgTestAnswering({sgTestPressButton(QMessageBox::Yes, nullptr, &question)},
+                    [&] { remove->trigger(); });
     EXPECT_EQ(question, QStringLiteral("Delete Box?"));
     EXPECT_EQ(scene->findNodeByLabel(QStringLiteral("Box")), nullptr);
     EXPECT_EQ(window.sceneTree()->itemOf(box), nullptr);

@@ -15,14 +15,16 @@ using namespace enginetest;
 class Deltas : public EngineTest {};
 
 TEST_F(Deltas, ThresholdIsStrictlyAboveOneThousandth) {
-    std::unique_ptr<SgPolyMesh> base(makeMesh(200));
+    std::unique_ptr<SgPolyMesh> base(sgTestRowMesh(200));
     // Moved vertices sit at the origin, where 0.001 and 0.0011 are differences as written.
-    for (int i : {3, 70, 150, 199})
+    for (int i : {3, 70, 71, 150, 198, 199})
         base->setVertex(i, SgVec3());
-    std::unique_ptr<SgPolyMesh> morph(copyVertices(*base));
+    std::unique_ptr<SgPolyMesh> morph(sgTestCopyVertices(*base));
 
-    // Exactly 0.001 (as a float) in one axis, in both directions: no delta.
-    morph->setVertex(3, base->getVertex(3) + SgVec3(0.001f, 0.0f, 0.0f));
+    // Exactly 0.001 (as a float) in one axis, in both directions: no delta, in a block or tail
+    // of its own and beside a vertex that moves.
+    for (int i : {3, 71, 198})
+        morph->setVertex(i, base->getVertex(i) + SgVec3(0.001f, 0.0f, 0.0f));
     morph->setVertex(150, base->getVertex(150) - SgVec3(0.0f, 0.0f, 0.001f));
     EXPECT_EQ(SgMorphLoader::computeDeltas(*base, *morph), nullptr);
 
@@ -45,8 +47,8 @@ TEST_F(Deltas, MatchAPlainLoopWhateverTheMixOfMovedAndQuietVertices) {
     // quiet, or with a single moved vertex, at shifting positions; single moved axes at every
     // position of a vertex; and a tail shorter than a block.
     const int count = 64 * 40 + 23;
-    std::unique_ptr<SgPolyMesh> base(makeMesh(count));
-    std::unique_ptr<SgPolyMesh> morph(copyVertices(*base));
+    std::unique_ptr<SgPolyMesh> base(sgTestRowMesh(count));
+    std::unique_ptr<SgPolyMesh> morph(sgTestCopyVertices(*base));
     std::uint32_t seed = 7;
     for (int i = 0; i < count; ++i) {
         seed = seed * 1664525u + 1013904223u;
@@ -78,16 +80,17 @@ TEST_F(Deltas, MatchAPlainLoopWhateverTheMixOfMovedAndQuietVertices) {
 }
 
 TEST_F(Deltas, CountMismatchAndInvalidTargetsGiveNoTable) {
-    std::unique_ptr<SgPolyMesh> base(makeMesh(12));
-    std::unique_ptr<SgPolyMesh> shorter(makeMesh(10, 1.0f));
+    std::unique_ptr<SgPolyMesh> base(sgTestRowMesh(200));
+    std::unique_ptr<SgPolyMesh> shorter(sgTestRowMesh(10, 1.0f));
     EXPECT_EQ(SgMorphLoader::computeDeltas(*base, *shorter), nullptr);
     EXPECT_EQ(statusLines().last(), QString("Vertex Count mismatch - delta calculation failed."));
 
-    // A coordinate that is not a number or infinite must never become a delta, wherever it is.
+    // A coordinate that is not a number or infinite must never become a delta, wherever it is:
+    // beside a move, in a block without one, or in the tail.
     for (float bad :
          {std::numeric_limits<float>::quiet_NaN(), std::numeric_limits<float>::infinity()}) {
-        for (int at : {0, 11}) {
-            std::unique_ptr<SgPolyMesh> morph(copyVertices(*base));
+        for (int at : {0, 100, 199}) {
+            std::unique_ptr<SgPolyMesh> morph(sgTestCopyVertices(*base));
             morph->setVertex(5, base->getVertex(5) + SgVec3(1.0f, 0.0f, 0.0f));
             morph->setVertex(at, SgVec3(0.0f, bad, 0.0f));
             EXPECT_EQ(SgMorphLoader::computeDeltas(*base, *morph), nullptr);
@@ -97,8 +100,8 @@ TEST_F(Deltas, CountMismatchAndInvalidTargetsGiveNoTable) {
     }
     // The fault in the node's own geometry is named as such, in a full block and in the tail.
     for (int at : {3, 70}) {
-        std::unique_ptr<SgPolyMesh> broken(makeMesh(72));
-        std::unique_ptr<SgPolyMesh> morph(copyVertices(*broken));
+        std::unique_ptr<SgPolyMesh> broken(sgTestRowMesh(72));
+        std::unique_ptr<SgPolyMesh> morph(sgTestCopyVertices(*broken));
         broken->setVertex(at, SgVec3(std::numeric_limits<float>::infinity(), 0.0f, 0.0f));
         EXPECT_EQ(SgMorphLoader::computeDeltas(*broken, *morph), nullptr);
         EXPECT_EQ(statusLines().last(),

@@ -115,14 +115,15 @@ TEST_F(GeometryImport, ObjImporterKeepsOrderAndAppliesAxesInversionAndScale) {
 
 TEST_F(GeometryImport, FileLoadsMakeMorphsOrReportWhyNot) {
     QTemporaryDir dir;
-    auto *node = makeNodeWithMesh("Head", makeMesh(12));
+    auto *node = sgTestNode("Head", sgTestRowMesh(12));
     scene()->addNode(node);
     SgMorphLoader loader;
     loader.setMorphName("Brow");
     loader.setCreateControl(false);
     SgFileIOSettings options;
 
-    loader.setFilename(writeFile(dir, "brow.obj", objOf(*baseOf(node), 6, SgVec3(0, 0, 0.25f))));
+    loader.setFilename(
+        writeFile(dir, "brow.obj", objOf(*sgTestGeometry(node), 6, SgVec3(0, 0, 0.25f))));
     SgMorphLoadLog log;
     loader.loadMorphForNode(options, node, log);
     EXPECT_EQ(log.toHtml(), QString("<HTML><HEAD></HEAD><BODY>\nLoading morph Brow...<BR>"
@@ -159,7 +160,8 @@ TEST_F(GeometryImport, FileLoadsMakeMorphsOrReportWhyNot) {
     // A target whose coordinates are not numbers never becomes a morph.
     for (const char *bad : {"nan", "inf", "1e39"}) {
         SgMorphLoadLog invalid;
-        loader.setFilename(writeFile(dir, "bad.obj", objOf(*baseOf(node), 3, SgVec3(), bad)));
+        loader.setFilename(
+            writeFile(dir, "bad.obj", objOf(*sgTestGeometry(node), 3, SgVec3(), bad)));
         loader.loadMorphForNode(options, node, invalid);
         EXPECT_TRUE(invalid.hasProblems()) << bad;
         EXPECT_FALSE(node->getObject()->findModifier("Other")) << bad;

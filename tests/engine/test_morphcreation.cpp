@@ -9,7 +9,10 @@
 #include "sharedsource/engine/sgmorphloader.h"
 #include "sharedsource/engine/sgmorphloadlog.h"
 
-#include "tests/support/sgtestfigure.h"
+#include "tests/support/sgtestmodal.h"
+#include "tests/support/sgtestscene.h"
+
+#include <QInputDialog>
 
 #include <limits>
 #include <memory>
@@ -24,7 +27,7 @@ SgMorph *morphOn(SgNode *node, const QString &name) {
 
 // A 12-vertex prop in the scene and a loader that makes the morph "Smile" in "Morphs/Face".
 struct Prop {
-    SgNode *node = makeNodeWithMesh("Box", makeMesh(12));
+    SgNode *node = sgTestNode("Box", sgTestRowMesh(12));
     SgMorphLoader loader;
     SgMorphLoadLog log;
 
@@ -36,7 +39,7 @@ struct Prop {
     }
     // A target with vertex `vertex` moved by `by`.
     SgPolyMesh *target(int vertex, const SgVec3 &by) const {
-        SgPolyMesh *mesh = copyVertices(*baseOf(node));
+        SgPolyMesh *mesh = sgTestCopyVertices(*sgTestGeometry(node));
         mesh->setVertex(vertex, mesh->getVertex(vertex) + by);
         return mesh;
     }
@@ -72,19 +75,19 @@ TEST_F(MorphCreation, NewMorphCarriesDeltasChannelSettingsAndLogEntries) {
     // The channel drives the cached geometry, clamped to its range.
     channel->setValue(2.0f);
     const SgVertexMesh *shown = prop.node->getObject()->getCachedGeom();
-    EXPECT_NEAR(shown->getVertex(4).y, baseOf(prop.node)->getVertex(4).y + 0.5f, 1e-6);
+    EXPECT_NEAR(shown->getVertex(4).y, sgTestGeometry(prop.node)->getVertex(4).y + 0.5f, 1e-6);
 }
 
 TEST_F(MorphCreation, UnchangedOrMismatchedTargetsLeaveTheNodeAlone) {
     Prop prop;
-    prop.create(copyVertices(*baseOf(prop.node)));
+    prop.create(sgTestCopyVertices(*sgTestGeometry(prop.node)));
     EXPECT_TRUE(logLines().contains("No deltas for morph, skipping node."));
     EXPECT_EQ(prop.node->getObject()->getModifierCount(), 0);
     EXPECT_TRUE(prop.log.hasProblems());
     EXPECT_TRUE(prop.log.toHtml().contains("Geometry did not match, failed to create morph."));
 
     SgMorphLoadLog second;
-    std::unique_ptr<SgPolyMesh> shorter(makeMesh(10, 1.0f));
+    std::unique_ptr<SgPolyMesh> shorter(sgTestRowMesh(10, 1.0f));
     shorter->ref();
     prop.loader.createMorphForNode(shorter.get(), prop.node, second);
     EXPECT_EQ(statusLines().last(), QString("Vertex Count mismatch 12:10 (Base:Morph)."));
@@ -94,7 +97,7 @@ TEST_F(MorphCreation, UnchangedOrMismatchedTargetsLeaveTheNodeAlone) {
     // A node without an object is skipped with its own log line.
     SgNode bare("Empty");
     SgNumericProperty *channel = nullptr;
-    EXPECT_FALSE(prop.loader.createMorph(&bare, baseOf(prop.node), false, channel));
+    EXPECT_FALSE(prop.loader.createMorph(&bare, sgTestGeometry(prop.node), false, channel));
     EXPECT_EQ(logLines().last(), QString("No object found, skipping node."));
 }
 
@@ -126,15 +129,14 @@ TEST_F(MorphCreation, MakeUniqueAsksUntilTheNameIsFreeAndNotBlankOrTheUserCancel
 
     // Without questions of its own the loader asks with the host's input dialog.
     prop.loader.setQuestions(nullptr);
-    QString title, label;
-    whenModal([&](QWidget *modal) {
+    QString label;
+    SgTestModalAnswer answer([&](QWidget *modal) {
         auto *dialog = qobject_cast<QInputDialog *>(modal);
-        title = modal->windowTitle();
         label = dialog ? dialog->labelText() : QString();
         modal->close();
     });
     prop.loader.createMorphForNode(target, prop.node, cancelled);
-    EXPECT_EQ(title, QString("Morph Already Exists"));
+    EXPECT_EQ(answer.titles(), QStringList("Morph Already Exists"));
     EXPECT_EQ(label, QString("A morph named \"Smile\" already exists. Please enter a new name for "
                              "the morph:"));
     target->unref();
@@ -182,62 +184,81 @@ TEST_F(MorphCreation, OverrideReplacesDeltasKeepsPlaceAndHandlesLinks) {
     EXPECT_EQ(prop.node->getObject()->getModifierIndex(smile), 0);
 }
 
-TEST_F(MorphCreation, OrphanCleanUpFollowsOnlyARunThatMadeMorphsAndNamesWhatItRemoves) {
-    // Two props with an unlinked "Smile" each, reloaded with override and clean-up on.
-    Prop prop;
-    auto *other = makeNodeWithMesh("Other", makeMesh(12));
-    scene()->addNode(other);
-    prop.create(prop.target(1, SgVec3(1, 0, 0)));
-    SgPolyMesh *first = prop.target(1, SgVec3(1, 0, 0));
-    first->ref();
-    prop.loader.createMorphForNode(first, other, prop.log);
-    first->unref();
-    ASSERT_TRUE(morphOn(prop.node, "Smile") && morphOn(other, "Smile"));
-    prop.loader.setOverride(SgMorphLoader::DeltasAndLinks);
-    const auto reload = [&](SgPolyMesh *target, QList<SgNode *> nodes) {
-        auto log = std::make_unique<SgMorphLoadLog>();
-        target->ref();
-        prop.loader.createMorphForNodes(target, nodes, *log);
-        target->unref();
-        return log->toHtml();
+TEST_F(MorphCreation, OrphanCleanUpRemovesOnlyUnlinkedMorphsOfNodesARunLeftOut) {
+    // Box moves in the target and Other does not; Other carries a "Smile" from before, which
+    // the run leaves out. It goes only with clean-up on, when the run replaces morphs, and when
+    // nothing keeps it: a link, being the loader's control property, or Other being the control
+    // node of a run that makes links or keeps the old ones.
+    using L = SgMorphLoader;
+    const struct Case {
+        const char *what;
+        bool cleanUp;
+        int override;
+        bool linked, ownControl, controlNode, createControl;
+        bool removed;
+    } cases[] = {
+        {"an orphan", true, L::DeltasAndLinks, false, false, false, false, true},
+        {"deltas only", true, L::DeltasOnly, false, false, false, false, true},
+        {"clean-up off", false, L::DeltasAndLinks, false, false, false, false, false},
+        {"make unique", true, L::MakeUnique, false, false, false, false, false},
+        {"a linked morph", true, L::DeltasAndLinks, true, false, false, false, false},
+        {"the control property", true, L::DeltasAndLinks, false, true, false, false, false},
+        {"control node, links remade", true, L::DeltasAndLinks, false, false, true, false, true},
+        {"control node, deltas only", true, L::DeltasOnly, false, false, true, false, false},
+        {"control node, control made", true, L::DeltasAndLinks, false, false, true, true, false},
     };
+    SgFloatProperty dial("Dial");
+    for (const Case &c : cases) {
+        SCOPED_TRACE(c.what);
+        scene()->clear();
+        Prop prop;
+        prop.create(prop.target(1, SgVec3(1, 0, 0)));
+        auto *other = sgTestNode("Other", sgTestRowMesh(12));
+        scene()->addNode(other);
+        auto *orphan = new SgMorph("Smile");
+        other->getObject()->addModifier(orphan);
+        if (c.linked)
+            orphan->getValueChannel()->insertController(
+                new SgERCLink(SgERCLink::DeltaAdd, &dial, 1.0f, 0.0f));
+        ScriptedQuestions questions;
+        questions.names = {QString("Grin")};
+        prop.loader.setQuestions(&questions);
+        prop.loader.setCleanUpOrphans(c.cleanUp);
+        prop.loader.setOverride(c.override);
+        prop.loader.setControlNode(c.controlNode ? other : nullptr);
+        prop.loader.setCreateControl(c.createControl);
+        if (c.ownControl)
+            prop.loader.setControlProperty(orphan->getValueChannel());
 
-    // A target that moves nothing, one of the wrong size, and a single node without deltas
-    // make no morph: nothing is removed.
-    QString html = reload(copyVertices(*baseOf(prop.node)), {prop.node, other});
-    EXPECT_TRUE(html.contains("Geometry did not match, no morphs created.")) << html.toStdString();
-    html = reload(makeMesh(10), {prop.node, other});
-    EXPECT_TRUE(html.contains("The vertex count of Box does not match the target (12:10, "
-                              "Base:Morph). No morphs created."))
-        << html.toStdString();
-    prop.create(copyVertices(*baseOf(prop.node)));
-    EXPECT_TRUE(morphOn(prop.node, "Smile") && morphOn(other, "Smile"));
-    EXPECT_FALSE(html.contains("Removed"));
+        SgPolyMesh *target = prop.target(4, SgVec3(0, 0, 1));
+        sgTestGeometry(other)->setVertex(4, target->getVertex(4)); // Other sees no motion
+        target->ref();
+        SgMorphLoadLog log;
+        prop.loader.createMorphForNodes(target, {prop.node, other}, log);
+        target->unref();
+        ASSERT_TRUE(morphOn(prop.node, prop.loader.morphName())) << log.toHtml().toStdString();
+        EXPECT_EQ(morphOn(other, "Smile") == nullptr, c.removed);
+        EXPECT_EQ(log.toHtml().contains("Removed orphaned morph Smile from Other."), c.removed);
+        prop.loader.setControlProperty(nullptr);
+    }
 
-    // With clean-up off nothing goes either.
-    prop.loader.setCleanUpOrphans(false);
-    auto *twoNodes = new SgPolyMesh; // Box moves, Other does not: one shared target
-    twoNodes->setVertexArray(12);
-    for (int i = 0; i < 12; ++i)
-        twoNodes->setVertex(i, baseOf(prop.node)->getVertex(i));
-    twoNodes->setVertex(4, twoNodes->getVertex(4) + SgVec3(0, 0, 1));
-    auto *otherBase = baseOf(other);
-    otherBase->setVertex(4, otherBase->getVertex(4) + SgVec3(0, 0, 1)); // Other sees no motion
-    twoNodes->ref();
-    reload(twoNodes, {prop.node, other});
-    EXPECT_TRUE(morphOn(other, "Smile"));
-
-    // A run that made a morph removes the orphan of the node that got none, and says so.
-    prop.loader.setCleanUpOrphans(true);
-    html = reload(twoNodes, {prop.node, other});
-    twoNodes->unref();
-    EXPECT_TRUE(html.contains("Created morph successfully.<BR>\nRemoved orphaned morph Smile "
-                              "from Other.<BR>"))
-        << html.toStdString();
-    ASSERT_TRUE(morphOn(prop.node, "Smile"));
-    EXPECT_EQ(morphOn(prop.node, "Smile")->getDeltas()->getVertex(0), 4);
-    EXPECT_FALSE(morphOn(other, "Smile"));
-    EXPECT_TRUE(logLines().contains("Removed orphaned morph Smile from Other."));
+    // A run that makes no morph removes nothing: a target that moves nothing, or one of the
+    // wrong size.
+    scene()->clear();
+    Prop prop;
+    prop.create(prop.target(1, SgVec3(1, 0, 0)));
+    auto *other = sgTestNode("Other", sgTestRowMesh(12));
+    scene()->addNode(other);
+    other->getObject()->addModifier(new SgMorph("Smile"));
+    prop.loader.setOverride(SgMorphLoader::DeltasAndLinks);
+    for (SgPolyMesh *target : {sgTestCopyVertices(*sgTestGeometry(prop.node)), sgTestRowMesh(10)}) {
+        SgMorphLoadLog log;
+        target->ref();
+        prop.loader.createMorphForNodes(target, {prop.node, other}, log);
+        target->unref();
+        EXPECT_TRUE(log.toHtml().contains("morphs created.")) << log.toHtml().toStdString();
+        EXPECT_TRUE(morphOn(prop.node, "Smile") && morphOn(other, "Smile"));
+    }
 }
 
 namespace {
@@ -246,9 +267,9 @@ namespace {
 // mesh, and a welded-style target whose face groups address the bones' vertices out of order.
 struct Figure {
     SgSkeleton *figure = new SgSkeleton("Fig");
-    SgBone *head = makeNodeWithMesh<SgBone>("head", makeMesh(6));
-    SgBone *neck = makeNodeWithMesh<SgBone>("b2", makeMesh(4, 10.0f));
-    SgBone *hip = makeNodeWithMesh<SgBone>("hip", makeMesh(4, 20.0f));
+    SgBone *head = sgTestNode<SgBone>("head", sgTestRowMesh(6));
+    SgBone *neck = sgTestNode<SgBone>("b2", sgTestRowMesh(4, 10.0f));
+    SgBone *hip = sgTestNode<SgBone>("hip", sgTestRowMesh(4, 20.0f));
     SgPolyMesh *target = new SgPolyMesh;
     // Source vertex of each bone vertex, in ascending order.
     std::vector<int> headSource{1, 3, 5, 7, 9, 11};
@@ -280,7 +301,7 @@ struct Figure {
 
     void place(SgVec3 *v, SgBone *bone, const std::vector<int> &source) {
         for (size_t k = 0; k < source.size(); ++k)
-            v[source[k]] = baseOf(bone)->getVertex(int(k));
+            v[source[k]] = sgTestGeometry(bone)->getVertex(int(k));
     }
     void face(int group, std::initializer_list<int> corners) {
         target->setActiveFaceGroup(group);
@@ -317,7 +338,7 @@ TEST_F(MorphCreation, NodeListMatchesBoneGroupsByNameOrLabelAndFiguresByBody) {
     EXPECT_EQ(neck->getDeltas()->getVertex(0), 2);
 
     // The figure itself takes the group "BODY" (3 vertices: 0, 1, 16).
-    auto *body = makeNodeWithMesh<SgSkeleton>("Body", makeMesh(3));
+    auto *body = sgTestNode<SgSkeleton>("Body", sgTestRowMesh(3));
     scene()->addNode(body);
     std::unique_ptr<SgVertexMesh> group(loader.groupGeometry(body, fig.target));
     ASSERT_TRUE(group);
@@ -326,7 +347,7 @@ TEST_F(MorphCreation, NodeListMatchesBoneGroupsByNameOrLabelAndFiguresByBody) {
     group.release()->unref();
 
     // A bone without a group of its name gets nothing, and the log says so.
-    auto *tail = makeNodeWithMesh<SgBone>("tail", makeMesh(4));
+    auto *tail = sgTestNode<SgBone>("tail", sgTestRowMesh(4));
     fig.figure->addBone(tail, fig.hip);
     scene()->addNode(tail);
     SgMorphLoadLog none;
@@ -343,8 +364,8 @@ namespace {
 struct TwoBones {
     static constexpr int count = 130; // two full 64-vertex scan blocks and a tail of 2
     SgSkeleton *figure = new SgSkeleton("Fig");
-    SgBone *a = makeNodeWithMesh<SgBone>("a", makeMesh(count));
-    SgBone *b = makeNodeWithMesh<SgBone>("b", makeMesh(count, 500.0f));
+    SgBone *a = sgTestNode<SgBone>("a", sgTestRowMesh(count));
+    SgBone *b = sgTestNode<SgBone>("b", sgTestRowMesh(count, 500.0f));
     SgPolyMesh *target = new SgPolyMesh;
 
     TwoBones() {
@@ -360,8 +381,8 @@ struct TwoBones {
         target->beginEdit(true);
         SgVec3 *v = target->setVertexArray(2 * count);
         for (int i = 0; i < count; ++i) {
-            v[i] = baseOf(swapped ? b : a)->getVertex(i);
-            v[count + i] = baseOf(swapped ? a : b)->getVertex(i);
+            v[i] = sgTestGeometry(swapped ? b : a)->getVertex(i);
+            v[count + i] = sgTestGeometry(swapped ? a : b)->getVertex(i);
         }
         // The groups keep their indices; only the halves they cover change.
         const int a = target->addFaceGroup("a");
@@ -418,14 +439,14 @@ TEST_F(MorphCreation, ATargetThatFailsOnOneBoneMakesNoMorphOnAny) {
     SgMorphLoader loader;
     loader.setMorphName("Sculpt");
     bones.target->setVertex(3, bones.target->getVertex(3) + SgVec3(0, 1, 0));
-    baseOf(bones.b)->setVertex(5, SgVec3(nan, 0, 0));
+    sgTestGeometry(bones.b)->setVertex(5, SgVec3(nan, 0, 0));
     SgMorphLoadLog log;
     loader.createMorphForNodes(bones.target, {bones.a, bones.b}, log);
     EXPECT_TRUE(log.toHtml().contains("The geometry of b has coordinates that are not finite "
                                       "numbers. No morphs created."))
         << log.toHtml().toStdString();
     EXPECT_EQ(bones.a->getObject()->getModifierCount(), 0);
-    SgPolyMesh *alone = copyVertices(*baseOf(bones.a));
+    SgPolyMesh *alone = sgTestCopyVertices(*sgTestGeometry(bones.a));
     alone->setVertex(100, SgVec3(0, 0, inf));
     alone->ref();
     SgMorphLoadLog single;
@@ -490,11 +511,11 @@ TEST_F(MorphCreation, FaceGroupsAreGatheredAgainForEveryRun) {
 }
 
 TEST_F(MorphCreation, WeldedFigureTargetsBecomeOneLinkedMorphPerMovedBone) {
-    SgSkeleton *figure = sgTestMakeFigure("Fig", 3, 2);
+    SgSkeleton *figure = sgTestFigure("Fig", 3, 2);
     scene()->addNode(figure);
     const SgBoneList bones = figure->getAllBones();
     SgFigureWelder welder(figure, false, true, true, true);
-    std::unique_ptr<SgPolyMesh> edited(copyVertices(*welder.getGeometry()));
+    std::unique_ptr<SgPolyMesh> edited(sgTestCopyVertices(*welder.getGeometry()));
     edited->ref();
 
     SgMorphLoader loader;

@@ -10,7 +10,6 @@
 
 #include <charconv>
 #include <cstring>
-#include <random>
 #include <string>
 
 namespace {
@@ -179,114 +178,9 @@ TEST(HostObjReader, ReadsFilesAndOddButValidText) {
     EXPECT_EQ(r.getMesh()->getVertexCount(), 0);
 }
 
-namespace {
-
-// A random OBJ document of plain-looking lines with the odd number and index forms that sit at
-// the edges of the reader's fast lines (long, signed, zero-led, halfway between two floats,
-// exponents), and now and then a bad one.
-std::string randomDocument(std::mt19937 &rng) {
-    auto pick = [&](int n) { return int(rng() % unsigned(n)); };
-    static const char *odd[] = {"1.",       ".5",         "-.5",        "-0",          "00.5",
-                                "16777217", "8388609.5",  "0.1234567",  "12345678",    "1e5",
-                                "+2",       "0.30000001", "99999999.9", "-1234567.75", "3.40282e38",
-                                "1.5x",     "-",          "4..2"};
-    auto number = [&] {
-        if (pick(8) == 0)
-            return std::string(odd[pick(int(std::size(odd)))]);
-        std::string digits = std::to_string(rng() % 100000000u).substr(0, size_t(1 + pick(8)));
-        const int point = pick(int(digits.size()) + 1);
-        if (point < int(digits.size()))
-            digits.insert(size_t(point), ".");
-        return (pick(2) ? "-" : "") + digits;
-    };
-    auto index = [&](int count) {
-        switch (pick(40)) {
-        case 0:
-            return std::string("0");
-        case 1:
-            return "-" + std::to_string(1 + pick(std::max(count, 1)));
-        case 2:
-            return "0" + std::to_string(1 + pick(std::max(count, 1)));
-        case 3:
-            return std::string("123456789");
-        default:
-            return std::to_string(1 + pick(std::max(count, 1)));
-        }
-    };
-    std::string text = "usemtl m\n";
-    int vertices = 0, uvs = 0;
-    for (int line = 0; line < 40; ++line) {
-        const int kind = pick(3);
-        if (kind == 0 || vertices < 3) {
-            text += "v " + number() + " " + number() + (pick(30) ? " " : "  \t") + number();
-            ++vertices;
-        } else if (kind == 1) {
-            text += "vt " + number() + " " + number();
-            ++uvs;
-        } else {
-            text += "f";
-            const int corners = pick(12) == 0 ? 5 + pick(20) : 3 + pick(2);
-            const int form = pick(4);
-            for (int c = 0; c < corners; ++c) {
-                text += " " + index(vertices);
-                if (form == 1 || form == 3)
-                    text += "/" + index(uvs);
-                if (form == 2)
-                    text += "//1";
-                if (form == 3)
-                    text += "/1";
-            }
-        }
-        text += pick(40) ? "\n" : " \r\n";
-    }
-    return text + "vn 0 0 1\n";
-}
-
-// The same text with a blank before every line, which the reader's fast lines never take.
-std::string indented(const std::string &text) {
-    std::string out = " ";
-    for (const char c : text) {
-        out += c;
-        if (c == '\n')
-            out += ' ';
-    }
-    return out;
-}
-
-void expectSameRead(const std::string &text) {
-    SgObjReader fast, general;
-    const bool ok = read(fast, text);
-    ASSERT_EQ(ok, read(general, indented(text))) << text;
-    if (!ok) {
-        EXPECT_EQ(fast.getErrorString(), general.getErrorString()) << text;
-        return;
-    }
-    const SgPolyMesh &a = *fast.getMesh(), &b = *general.getMesh();
-    ASSERT_EQ(a.getVertexCount(), b.getVertexCount());
-    if (a.getVertexCount() > 0) {
-        EXPECT_EQ(0, std::memcmp(a.getVertices(), b.getVertices(),
-                                 sizeof(SgVec3) * size_t(a.getVertexCount())))
-            << text;
-    }
-    ASSERT_EQ(a.getUVCount(), b.getUVCount());
-    for (int i = 0; i < a.getUVCount(); ++i)
-        EXPECT_EQ(a.getUVList()->values()[size_t(i)], b.getUVList()->values()[size_t(i)]);
-    EXPECT_EQ(a.triangleCorners(), b.triangleCorners()) << text;
-    EXPECT_EQ(a.quadCorners(), b.quadCorners()) << text;
-    EXPECT_EQ(a.polygonCorners(), b.polygonCorners()) << text;
-    EXPECT_EQ(a.polygonStarts(), b.polygonStarts());
-}
-
-} // namespace
-
-// The reader takes the common lines on a fast road; whatever it reads there (numbers rounded,
-// indices resolved, faces sorted by size, errors with their lines) is what the general reader
-// gives for the same line, and every number is the float std::from_chars gives.
-TEST(HostObjReader, FastLinesReadAsTheGeneralReaderDoes) {
-    std::mt19937 rng(1234);
-    for (int document = 0; document < 400; ++document)
-        expectSameRead(randomDocument(rng));
-
+// Numbers on the reader's fast lines are the floats std::from_chars gives (the fuzzer checks
+// that the fast lines read as the general reader does).
+TEST(HostObjReader, NumbersReadAsFromChars) {
     const char *numbers[] = {"0.1",        "-0.0",      "16777217",  "16777219",
                              "0.33333334", "123.45678", "9999999.5", "1.0000001"};
     std::string text;

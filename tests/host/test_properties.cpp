@@ -158,33 +158,6 @@ TEST(HostProperties, PathsFormTheGroupTree) {
     EXPECT_TRUE(morphs->getProperties().empty());
 }
 
-TEST(HostProperties, DefaultMaterialOffersItsFiveProperties) {
-    SgDefaultMaterial m(QStringLiteral("Skin"));
-    for (const char *name : {"Diffuse Color", "Specular Color"}) {
-        EXPECT_NE(dynamic_cast<SgColorProperty *>(m.findProperty(QLatin1String(name))), nullptr);
-    }
-    for (const char *name : {"Glossiness", "Opacity Strength", "Bump Strength"}) {
-        EXPECT_NE(dynamic_cast<SgFloatProperty *>(m.findProperty(QLatin1String(name))), nullptr);
-    }
-    SgTexture tex(QStringLiteral("/a/skin.png"));
-    m.setDiffuseColor(QColor(255, 128, 0));
-    m.setColorMap(&tex);
-    m.setGlossinessStrength(0.25f);
-    m.getOpacityControl()->setValue(0.5f);
-    auto *diffuse = m.getDiffuseColorProperty();
-    EXPECT_EQ(diffuse->getColorValue(), QColor(255, 128, 0));
-    EXPECT_TRUE(diffuse->isMapped());
-    EXPECT_EQ(diffuse->getMapValue(), &tex);
-    std::unique_ptr<SgMaterial> copy(m.clone());
-    auto *c = static_cast<SgDefaultMaterial *>(copy.get());
-    EXPECT_EQ(c->getName(), QStringLiteral("Skin"));
-    EXPECT_EQ(c->getColorMap(), &tex);
-    EXPECT_FLOAT_EQ(c->getGlossinessStrength(), 0.25f);
-    EXPECT_FLOAT_EQ(c->getOpacityStrength(), 0.5f);
-    m.setColorMap(nullptr);
-    EXPECT_FALSE(diffuse->isMapped());
-}
-
 TEST(HostSettings, ValuesRoundTripThroughTheIniFileWithDefaults) {
     {
         SgAppSettings plain;

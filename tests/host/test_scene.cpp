@@ -1,5 +1,4 @@
 #include "sgcore/app/sgapp.h"
-#include "sgcore/app/sgimagemgr.h"
 #include "sgcore/geometry/sgobject.h"
 #include "sgcore/geometry/sgpolymesh.h"
 #include "sgcore/geometry/sgpolyshape.h"
@@ -11,28 +10,17 @@
 #include "sgcore/properties/sgfloatproperty.h"
 #include "sgcore/properties/sgpropertygrouptree.h"
 #include "sgcore/scene/sgbone.h"
-#include "sgcore/scene/sgfigurewelder.h"
 #include "sgcore/scene/sgscene.h"
 #include "sgcore/scene/sgskeleton.h"
-#include "tests/support/sgtestfigure.h"
-#include "tests/support/sgtestmain.h"
+#include "tests/support/sgtestscene.h"
 
 #include <gtest/gtest.h>
 
-#include <QDir>
 #include <QSignalSpy>
 
 namespace {
 
 const QString kExamples = QStringLiteral(SG_EXAMPLES_DIR);
-
-std::vector<SgVec3> groupVertices(const SgPolyMesh &mesh, const QString &group) {
-    std::vector<SgVec3> out;
-    for (int32_t v : mesh.getFaceGroupVertices(mesh.findFaceGroup(group))) {
-        out.push_back(mesh.getVertex(v));
-    }
-    return out;
-}
 
 const SgPolyMesh *meshOf(SgNode *node) {
     return static_cast<SgPolyShape *>(node->getObject()->getCurrentShape())->getPolyMesh();
@@ -84,7 +72,7 @@ TEST(HostScene, NodesKeepSceneOrderAndSelection) {
 
 TEST(HostScene, FigureHierarchyAndNodeChildren) {
     SgScene scene;
-    SgSkeleton *figure = sgTestMakeFigure(QStringLiteral("Fig"), 3, 1);
+    SgSkeleton *figure = sgTestFigure(QStringLiteral("Fig"), 3, 1);
     auto *follower = new SgSkeleton(QStringLiteral("Shirt"));
     follower->setFollowTarget(figure);
     const SgBoneList bones = figure->getAllBones();
@@ -148,13 +136,6 @@ TEST(HostSceneFile, LoadsTheExampleFigureWithSeamsMaterialsAndProperties) {
     EXPECT_EQ(meshOf(bones[0])->getVertexCount(), 8);
     EXPECT_EQ(meshOf(bones[2])->getVertexCount(), 8);
     EXPECT_EQ(meshOf(bones[2])->getQuadCount(), 5);
-    SgFigureWelder welder(figure, false, true, true, true);
-    EXPECT_EQ(welder.getGeometry()->getVertexCount(), 16);
-    std::unique_ptr<SgVertexMesh> back(welder.unWeld(welder.getGeometry()));
-    for (SgBone *b : bones) {
-        EXPECT_EQ(groupVertices(*static_cast<SgPolyMesh *>(back.get()), b->getName()),
-                  meshOf(b)->vertices());
-    }
 
     SgShape *head = bones[2]->getObject()->getCurrentShape();
     ASSERT_EQ(head->getMaterialCount(), 2);
@@ -200,6 +181,14 @@ TEST(HostSceneFile, RejectsBadFilesWholeWithPlace) {
     const Case cases[] = {
         {"not json", "not a JSON object"},
         {R"({"nodes": []})", "version 1"},
+        {R"({"scenara": 2, "nodes": []})", "version 1"},
+        {R"({"scenara": 1, "nodes": [{"kind": "node", "name": "a", "properties": [
+            {"type": "color", "name": "c", "value": [0, 255.5, 0]}]}]})",
+         "0 to 255"},
+        {R"({"scenara": 1, "nodes": [{"kind": "node", "name": "a", "properties": [
+            {"type": "float", "name": "p"}, {"type": "float", "name": "q",
+             "links": [{"node": "a", "property": "p", "type": 6}]}]}]})",
+         "link type from 0 to 5"},
         {R"({"scenara": 1, "nodes": [{"kind": "prop", "name": "a"}]})", "needs \"geometry\""},
         {R"({"scenara": 1, "nodes": [{"kind": "prop", "name": "a", "geometry": "missing.obj"}]})",
          "missing.obj:0: cannot open"},
@@ -226,39 +215,4 @@ TEST(HostSceneFile, RejectsBadFilesWholeWithPlace) {
             << file.getErrorString().toStdString();
         EXPECT_EQ(scene.getNodeCount(), 0) << "nothing is added from a rejected file";
     }
-}
-
-TEST(HostApp, SinksPathsAndFileNames) {
-    sgApp->getMessageSink()->clear();
-    sgApp->log(QStringLiteral("hello"));
-    sgApp->statusLine(QStringLiteral("Loading"), true);
-    sgApp->startProgress(QStringLiteral("Morphs"), 3, true, false);
-    EXPECT_TRUE(sgApp->isProgressActive());
-    EXPECT_TRUE(sgApp->stepProgress());
-    sgApp->finishProgress();
-    EXPECT_FALSE(sgApp->isProgressActive());
-    EXPECT_FALSE(sgApp->stepProgress());
-    EXPECT_EQ(sgApp->getMessageSink()->logLines(), QStringList{QStringLiteral("hello")});
-    EXPECT_EQ(sgApp->getMessageSink()->currentStatus(), QStringLiteral("Loading"));
-    ASSERT_EQ(sgApp->getMessageSink()->progressRuns().size(), 1);
-    EXPECT_EQ(sgApp->getMessageSink()->progressRuns()[0].steps, 1);
-    EXPECT_EQ(sgApp->getTempPath(), sgTestPath(QStringLiteral("temp")));
-    EXPECT_EQ(sgApp->getInterface(), nullptr);
-
-    EXPECT_EQ(SgFileIO::getFilePath(QStringLiteral("/a/b/c.tar.png")), QStringLiteral("/a/b"));
-    EXPECT_EQ(SgFileIO::getBaseFileName(QStringLiteral("/a/b/c.tar.png")), QStringLiteral("c.tar"));
-    EXPECT_EQ(SgFileIO::getShortFileName(QStringLiteral("/a/b/c.png")), QStringLiteral("c.png"));
-    EXPECT_EQ(SgFileIO::getFilePath(QStringLiteral("c.png")), QString());
-    const QString maps = sgApp->getTempPath() + QStringLiteral("/FacetorMaps");
-    EXPECT_FALSE(SgFileIO::pathExists(maps, false));
-    EXPECT_TRUE(SgFileIO::pathExists(maps, true));
-    EXPECT_TRUE(QDir(maps).exists());
-
-    QImage image;
-    EXPECT_EQ(
-        sgApp->getImageMgr()->loadImage(kExamples + QStringLiteral("/scenes/skin.png"), image, -1),
-        0);
-    EXPECT_EQ(image.width(), 8);
-    EXPECT_NE(sgApp->getImageMgr()->loadImage(QStringLiteral("/nope.png"), image, -1), 0);
-    EXPECT_TRUE(image.isNull());
 }

@@ -15,8 +15,8 @@
 #include "sgcore/scene/sgbone.h"
 #include "sgcore/scene/sgscene.h"
 #include "sgcore/scene/sgskeleton.h"
-#include "tests/support/sgtestfigure.h"
 #include "tests/support/sgtestmain.h"
+#include "tests/support/sgtestscene.h"
 
 #include <QDir>
 #include <QFile>
@@ -42,7 +42,7 @@ SgPolyMesh *meshOf(const SgNode *node) {
 // What a session adds to a figure: a morph per bone driven by a control property on the
 // figure, a returned prop with a polygon, UVs and two materials, and copied colours and maps.
 void addUserWork(SgScene &scene) {
-    SgSkeleton *figure = sgTestMakeFigure(QStringLiteral("Blobby"), 3, 2, true);
+    SgSkeleton *figure = sgTestFigure(QStringLiteral("Blobby"), 3, 2, true);
     scene.addNode(figure);
     auto *control = new SgFloatProperty(QStringLiteral("MyMorph"));
     control->setPath(QStringLiteral("Morphs/Face"));
@@ -186,7 +186,7 @@ TEST(HostSceneSave, AFailedSaveLeavesTheFileAndABadMorphIsRefusedWhole) {
     ASSERT_TRUE(file.save(path, &scene));
     const QByteArray saved = readAll(path);
     // Deltas that do not fit the geometry, or a link to nothing, are refused with their place,
-    // and nothing is added (the deltas file's order and range checks are fuzzed).
+    // and nothing is added.
     const QJsonObject root = QJsonDocument::fromJson(saved).object();
     using Edit = std::function<void(QJsonObject &)>;
     auto deltasFile = [](const char *name, const QByteArray &text) {
@@ -195,10 +195,24 @@ TEST(HostSceneSave, AFailedSaveLeavesTheFileAndABadMorphIsRefusedWhole) {
         file.write(text);
         return file.fileName();
     };
-    const QString shortLine = deltasFile("short.deltas", "deltas 10\n1 0.5 0\n");
-    const Edit edits[] = {
+    // Each bone has 7 vertices: a delta line short of a number, a vertex repeated or out of
+    // order, one past the last vertex, and a header for another count.
+    const QString files[] = {deltasFile("short.deltas", "deltas 7\n1 0.5 0\n"),
+                             deltasFile("twice.deltas", "deltas 7\n1 0 0 1\n1 0 1 0\n"),
+                             deltasFile("order.deltas", "deltas 7\n4 0 0 1\n1 0 1 0\n"),
+                             deltasFile("past.deltas", "deltas 7\n7 0 0 1\n"),
+                             deltasFile("count.deltas", "deltas 10\n1 0 0 1\n")};
+    const auto inline3 = [](QJsonArray vertices) {
+        return [vertices](QJsonObject &m) {
+            m.insert(QStringLiteral("vertices"), vertices);
+            m.insert(QStringLiteral("deltas"), QJsonArray{1, 2, 3, 4, 5, 6});
+        };
+    };
+    std::vector<Edit> edits = {
         [](QJsonObject &m) { m.insert(QStringLiteral("vertexCount"), 11); },
-        [&](QJsonObject &m) { m.insert(QStringLiteral("deltas"), shortLine); },
+        inline3({4, 4}),
+        inline3({4, 1}),
+        inline3({1, 7}),
         [](QJsonObject &m) { m.insert(QStringLiteral("deltas"), QStringLiteral("missing")); },
         [](QJsonObject &m) {
             m.insert(QStringLiteral("vertices"), QJsonArray{1, 4});
@@ -213,6 +227,8 @@ TEST(HostSceneSave, AFailedSaveLeavesTheFileAndABadMorphIsRefusedWhole) {
             channel.insert(QStringLiteral("links"), links);
             m.insert(QStringLiteral("channel"), channel);
         }};
+    for (const QString &file : files)
+        edits.push_back([file](QJsonObject &m) { m.insert(QStringLiteral("deltas"), file); });
     for (const Edit &edit : edits) {
         QJsonArray nodes = root.value(QStringLiteral("nodes")).toArray();
         QJsonObject figure = nodes.at(0).toObject();

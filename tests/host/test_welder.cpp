@@ -6,7 +6,7 @@
 #include "sgcore/scene/sgbone.h"
 #include "sgcore/scene/sgfigurewelder.h"
 #include "sgcore/scene/sgskeleton.h"
-#include "tests/support/sgtestfigure.h"
+#include "tests/support/sgtestscene.h"
 
 #include <gtest/gtest.h>
 
@@ -56,7 +56,7 @@ private:
 } // namespace
 
 TEST(HostWelder, UnweldingTheUnchangedWeldGivesEveryBoneExactlyItsOwnVertices) {
-    std::unique_ptr<SgSkeleton> figure(sgTestMakeFigure(QStringLiteral("Fig"), 4, 3, true));
+    std::unique_ptr<SgSkeleton> figure(sgTestFigure(QStringLiteral("Fig"), 4, 3, true));
     figure->setLabel(QStringLiteral("Fig 1"));
     for (bool removeUnused : {true, false}) {
         SgFigureWelder welder(figure.get(), false, true, removeUnused, true);
@@ -71,6 +71,10 @@ TEST(HostWelder, UnweldingTheUnchangedWeldGivesEveryBoneExactlyItsOwnVertices) {
         EXPECT_EQ(welder.getSubDTextureMap(), (std::vector<int32_t>{0, 1}));
         EXPECT_EQ(welded->getQuadMaterial(3), 1); // the first quad of bone 1
         EXPECT_EQ(welded->getUVCount(), 4 * 8);
+        // Each bone's facets keep their own UVs: the first quad of bone 3 starts at (0, 0).
+        const SgFaceCorner &corner = welded->getQuadCorners(9)[0];
+        EXPECT_EQ(corner.uv, 3 * 8);
+        EXPECT_EQ(welded->getUVList()->getValue(corner.uv), SgVec2(0, 0));
         QString why;
         EXPECT_TRUE(welded->validate(&why)) << why.toStdString();
 
@@ -84,8 +88,23 @@ TEST(HostWelder, UnweldingTheUnchangedWeldGivesEveryBoneExactlyItsOwnVertices) {
     }
 }
 
+TEST(HostWelder, OnlyVerticesOfDifferentBonesWeld) {
+    // Bone 0 carries a second vertex on its seam corner (1, 0, 0), used by a facet of its own.
+    std::unique_ptr<SgSkeleton> figure(sgTestFigure(QStringLiteral("Fig"), 2, 1));
+    const SgBoneList bones = figure->getAllBones();
+    auto *first = static_cast<SgPolyMesh *>(sgTestGeometry(bones[0]));
+    first->vertices().push_back(SgVec3(1, 0, 0));
+    sgTestAddFacet(*first, 0, {{0}, {4}, {1}});
+    SgFigureWelder welder(figure.get(), false, true, true, true);
+    EXPECT_EQ(welder.getGeometry()->getVertexCount(), 5 + 4 - 2);
+    auto result = unweld(welder, *welder.getGeometry());
+    ASSERT_TRUE(result);
+    for (SgBone *bone : bones)
+        EXPECT_EQ(extract(*result, bone->getName()), boneMesh(bone)->vertices());
+}
+
 TEST(HostWelder, MovingOneSeamVertexChangesExactlyThatVertexInEachBoneSharingIt) {
-    std::unique_ptr<SgSkeleton> figure(sgTestMakeFigure(QStringLiteral("Fig"), 3, 2));
+    std::unique_ptr<SgSkeleton> figure(sgTestFigure(QStringLiteral("Fig"), 3, 2));
     SgFigureWelder welder(figure.get(), false, true, true, true);
     const SgPolyMesh *welded = welder.getGeometry();
     // The seam between bone 0 and bone 1 at (1, 1, 0).
@@ -118,14 +137,21 @@ TEST(HostWelder, MovingOneSeamVertexChangesExactlyThatVertexInEachBoneSharingIt)
         }
     }
 
+    // The first welded vertex is un-welded as edited too.
+    edited->setVertex(0, SgVec3(0, 0, 0.25f));
+    result = unweld(welder, *edited);
+    EXPECT_EQ(extract(*result, bones[0]->getName())[0], SgVec3(0, 0, 0.25f));
+
     // A mesh of another vertex count cannot be unwelded.
-    edited->setVertexCount(edited->getVertexCount() - 1);
-    EXPECT_EQ(welder.unWeld(edited.get()), nullptr);
+    for (int change : {1, -2}) {
+        edited->setVertexCount(edited->getVertexCount() + change);
+        EXPECT_EQ(welder.unWeld(edited.get()), nullptr) << change;
+    }
     EXPECT_EQ(welder.unWeld(nullptr), nullptr);
 }
 
 TEST(HostWelder, FlagsSelectBonesSeamsAndMorphedGeometry) {
-    std::unique_ptr<SgSkeleton> figure(sgTestMakeFigure(QStringLiteral("Fig"), 3, 2));
+    std::unique_ptr<SgSkeleton> figure(sgTestFigure(QStringLiteral("Fig"), 3, 2));
     const SgBoneList bones = figure->getAllBones();
 
     // Without welding the bones sit side by side.
@@ -163,8 +189,8 @@ TEST(HostWelder, FlagsSelectBonesSeamsAndMorphedGeometry) {
 }
 
 TEST(HostWelder, OrderedBonesFollowTheFigureHierarchy) {
-    std::unique_ptr<SgSkeleton> a(sgTestMakeFigure(QStringLiteral("A"), 3, 1));
-    std::unique_ptr<SgSkeleton> b(sgTestMakeFigure(QStringLiteral("B"), 2, 1));
+    std::unique_ptr<SgSkeleton> a(sgTestFigure(QStringLiteral("A"), 3, 1));
+    std::unique_ptr<SgSkeleton> b(sgTestFigure(QStringLiteral("B"), 2, 1));
     const SgBoneList ab = a->getAllBones();
     const SgBoneList bb = b->getAllBones();
     SgNode prop(QStringLiteral("prop"));

@@ -1,7 +1,7 @@
 // Rows and runs that work on the scene. The run over all sources: target nodes per mode, sources in
 // list order into one log, the pose step that may skip a source, the in-memory source's own
 // targets, and the progress.
-#include "modalhelper.h"
+#include "tests/support/sgtestmodal.h"
 
 #include "sgcore/app/sgapp.h"
 #include "sgcore/app/sgmessagesink.h"
@@ -21,6 +21,7 @@
 #include "sharedsource/loaderui/sgmorphsourceboolitem.h"
 #include "sharedsource/loaderui/sgmorphsourceitem.h"
 #include "sharedsource/loaderui/sgmorphsourcelist.h"
+#include "tests/support/sgtestscene.h"
 
 #include <QAbstractButton>
 #include <QFile>
@@ -31,9 +32,10 @@
 
 namespace {
 
-// Two bones of three vertices each, in one figure without geometry of its own.
-const char *HeadObj = "v 0 2 0\nv 1 2 0\nv 0 3 0\nf 1 2 3\n";
-const char *NeckObj = "v 0 1 0\nv 1 1 0\nv 0 2 0\nf 1 2 3\n";
+// A triangle at height `y`: (0, y), (1, y), (0, y + 1).
+SgPolyMesh *triangle(float y) {
+    return sgTestPolygon({{0, y, 0}, {1, y, 0}, {0, y + 1, 0}});
+}
 
 // A welded target: the head's group first, then the neck's; `headDy` lifts the head's first
 // vertex and `neckDy` the neck's first.
@@ -45,14 +47,6 @@ QByteArray figureTarget(double headDy, double neckDy) {
         .toLatin1();
 }
 
-SgObject *objectFrom(const QByteArray &obj, const QString &name) {
-    SgObjReader reader;
-    EXPECT_TRUE(reader.readBuffer(obj.constData(), size_t(obj.size()), name));
-    auto *object = new SgObject(name);
-    object->addShape(reader.takeShape(name));
-    return object;
-}
-
 bool hasMorph(SgNode *node, const QString &name) {
     return node->getObject() &&
            dynamic_cast<SgMorph *>(node->getObject()->findModifier(name)) != nullptr;
@@ -62,10 +56,11 @@ class FigureScene : public ::testing::Test {
 protected:
     QTemporaryDir dir;
     SgScene *scene = sgApp->getScene();
+    // Two bones of one triangle each, in a figure without geometry of its own, and a prop.
     SgSkeleton *figure = new SgSkeleton("Figure");
-    SgBone *head = new SgBone("head");
-    SgBone *neck = new SgBone("neck");
-    SgNode *prop = new SgNode("box");
+    SgBone *head = sgTestNode<SgBone>("head", triangle(2));
+    SgBone *neck = sgTestNode<SgBone>("neck", triangle(1));
+    SgNode *prop = sgTestNode("box", triangle(2));
     SgMorphSourceList list{nullptr, "MorphLoaderSourceList"};
     SgFileIOSettings options;
     SgMorphLoadLog log;
@@ -74,9 +69,6 @@ protected:
         scene->clear();
         figure->addBone(neck);
         figure->addBone(head, neck);
-        head->setObject(objectFrom(HeadObj, "head"));
-        neck->setObject(objectFrom(NeckObj, "neck"));
-        prop->setObject(objectFrom(HeadObj, "box"));
         scene->addNode(figure);
         scene->addNode(prop);
         sgApp->getMessageSink()->clear();
@@ -146,7 +138,7 @@ TEST_F(FigureScene, ModeOneRunsSourcesTopDownOnTheSelectionAndSkipsOnAFailedPose
 
     QString title;
     {
-        ModalAnswer answer([&](QWidget *w) {
+        SgTestModalAnswer answer([&](QWidget *w) {
             auto *box = qobject_cast<QMessageBox *>(w);
             ASSERT_NE(box, nullptr);
             title = box->windowTitle();
@@ -254,7 +246,8 @@ TEST_F(FigureScene, GroupPropertyAndNodeRowsChooseFromTheirMenus) {
     };
     const auto choose = [&](const QString &label, const QString &entry) {
         QStringList seen;
-        ModalAnswer answer(chooseMenuEntry(entry, &seen));
+        SgTestModalAnswer answer(
+            sgTestChooseMenu(entry.isEmpty() ? QStringList() : QStringList{entry}, &seen));
         list.showContextMenu(row(label), list.viewport()->mapToGlobal(QPoint(5, 5)), 1);
         EXPECT_TRUE(answer.answered()) << label.toStdString();
         return seen;
@@ -279,7 +272,7 @@ TEST_F(FigureScene, GroupPropertyAndNodeRowsChooseFromTheirMenus) {
 
     // With the control off, the node and property rows open nothing.
     static_cast<SgMorphSourceBoolItem *>(row("Create Control Property:"))->setValue(false);
-    ModalAnswer none(chooseMenuEntry("Figure"), 300);
+    SgTestModalAnswer none(sgTestChooseMenu({"Figure"}), 300);
     list.showContextMenu(row("Node:"), list.viewport()->mapToGlobal(QPoint(5, 5)), 1);
     EXPECT_FALSE(none.answered());
     EXPECT_EQ(loader.controlNode(), prop);

@@ -1,6 +1,5 @@
 // The morph loader dialog as a user drives it: the run and the two-step close, the stored
 // settings, file choice, the save options and the configuration files it writes and reads.
-#include "modalhelper.h"
 
 #include "sgcore/app/sgapp.h"
 #include "sgcore/app/sgappsettings.h"
@@ -14,12 +13,14 @@
 #include "sgcore/scene/sgskeleton.h"
 #include "sgcore/settings/sgpropertysettings.h"
 #include "sgcore/widgets/sgfileiopresetwidget.h"
+#include "sharedsource/engine/sgmorphloader.h"
 #include "sharedsource/loaderui/sgconfigurationsaveoptionsdlg.h"
 #include "sharedsource/loaderui/sgmorphconfiguration.h"
 #include "sharedsource/loaderui/sgmorphfileitem.h"
 #include "sharedsource/loaderui/sgmorphloaderdlg.h"
 #include "sharedsource/loaderui/sgmorphsourceitem.h"
 #include "sharedsource/loaderui/sgmorphsourcelist.h"
+#include "tests/support/sgtestmodal.h"
 
 #include <QApplication>
 #include <QCheckBox>
@@ -44,82 +45,9 @@
 
 namespace {
 
-// Answers the modal windows that open, one handler per window in order; after `timeoutMs`
-// every stray modal is closed so that a broken test fails instead of hanging.
-class ModalScript {
-public:
-    using Step = std::function<void(QWidget *)>;
-    explicit ModalScript(QList<Step> steps, int timeoutMs = 4000) : m_steps(std::move(steps)) {
-        m_remaining = timeoutMs;
-        QObject::connect(&m_timer, &QTimer::timeout, [this] { tick(); });
-        m_timer.start(5);
-    }
-    int handled() const { return m_handled; }
-    QStringList titles() const { return m_titles; }
-
-private:
-    void tick() {
-        QWidget *modal = QApplication::activeModalWidget();
-        if (modal && modal->isVisible() && modal != m_last) {
-            m_last = modal;
-            m_titles.append(modal->windowTitle());
-            if (m_handled < m_steps.size())
-                m_steps[m_handled++](modal);
-            else
-                modal->close();
-            return;
-        }
-        if ((m_remaining -= 5) <= 0) {
-            m_timer.stop();
-            if (QWidget *stray = QApplication::activeModalWidget())
-                stray->close();
-        }
-    }
-    QList<Step> m_steps;
-    QTimer m_timer;
-    QWidget *m_last = nullptr;
-    int m_handled = 0;
-    int m_remaining = 0;
-    QStringList m_titles;
-};
-
-ModalScript::Step pressOnlyButton(QString *text = nullptr) {
-    return [text](QWidget *widget) {
-        auto *box = qobject_cast<QMessageBox *>(widget);
-        if (box && text)
-            *text = box->text();
-        if (box && box->buttons().size() == 1)
-            box->buttons().first()->click();
-        else
-            widget->close();
-    };
-}
-
-ModalScript::Step chooseFile(const QString &path, QString *directory = nullptr) {
-    return [path, directory](QWidget *widget) {
-        auto *dialog = qobject_cast<QFileDialog *>(widget);
-        if (!dialog) {
-            widget->close();
-            return;
-        }
-        if (directory)
-            *directory = dialog->directory().absolutePath();
-        if (path.isEmpty()) {
-            dialog->reject();
-            return;
-        }
-        dialog->selectFile(path);
-        static_cast<QDialog *>(dialog)->accept();
-    };
-}
-
-ModalScript::Step saveOptions(bool saveObjects, bool relative) {
-    return [saveObjects, relative](QWidget *widget) {
-        auto *dialog = qobject_cast<SgConfigurationSaveOptionsDlg *>(widget);
-        if (!dialog) {
-            widget->close();
-            return;
-        }
+// Answers the save options dialog: objects saved or not, relative or absolute paths, "Ok".
+SgTestHandler saveOptions(bool saveObjects, bool relative) {
+    return sgTestAs<SgConfigurationSaveOptionsDlg>([=](SgConfigurationSaveOptionsDlg *dialog) {
         EXPECT_EQ(dialog->windowTitle(), "Project Save Options");
         dialog->findChild<QCheckBox *>("MorphLoaderSaveObjectConfigurationCheckBox")
             ->setChecked(saveObjects);
@@ -128,7 +56,7 @@ ModalScript::Step saveOptions(bool saveObjects, bool relative) {
                                                  : "MorphLoaderAbsolutePathButton")
             ->setChecked(true);
         dialog->buttonBox()->button(QDialogButtonBox::Ok)->click();
-    };
+    });
 }
 
 void writeFile(const QString &path, const QByteArray &bytes) {
@@ -253,7 +181,7 @@ TEST_F(MorphLoaderDlgTest, ProjectPathsRelativeAbsoluteAndNetwork) {
         SgMorphLoaderDlg dialog(nullptr, true, nullptr, nullptr);
         dialog.sourceList()->addFiles({path("proj-other/b.obj"), path("proj/a.obj")});
         QString warning;
-        ModalScript script({pressOnlyButton(&warning)});
+        SgTestModalAnswer script(sgTestPressButton(QMessageBox::NoButton, nullptr, &warning));
         dialog.saveProjectConfiguration(path("proj/set"));
         // The sibling folder that only starts with the project folder's name is outside it.
         EXPECT_EQ(script.titles(), QStringList{"Relative Path Warning"});
@@ -281,9 +209,13 @@ TEST_F(MorphLoaderDlgTest, ProjectPathsRelativeAbsoluteAndNetwork) {
     EXPECT_EQ(SgMorphConfiguration::resolvePath("E:/copy", "//server/share/y.obj"),
               "//server/share/y.obj");
     EXPECT_EQ(SgMorphConfiguration::resolvePath("E:/copy", "E:/x/y.obj"), "E:/x/y.obj");
-    // An absolute path of this platform is kept when only it exists.
+    // An absolute path of this platform is kept when only it exists: a path under the project
+    // folder wins.
     EXPECT_EQ(SgMorphConfiguration::resolvePath("/nowhere", path("proj/a.obj")),
               path("proj/a.obj"));
+    writeFile(path("copy") + path("proj/a.obj"), TriangleObj);
+    EXPECT_EQ(SgMorphConfiguration::resolvePath(path("copy"), path("proj/a.obj")),
+              path("copy") + path("proj/a.obj"));
 }
 
 TEST_F(MorphLoaderDlgTest, ProjectLoadsInSavedOrderAndSkipsMissingGeometry) {
@@ -300,9 +232,9 @@ TEST_F(MorphLoaderDlgTest, ProjectLoadsInSavedOrderAndSkipsMissingGeometry) {
     writeFile(path("two.obj.scx"), "<VarnTargetImporter><FileType Type=\"Object\">"
                                    "<Name Value=\"second\"/></FileType></VarnTargetImporter>");
     SgMorphLoaderDlg dialog(nullptr, true, nullptr, nullptr);
-    ModalScript script({});
+    SgTestModalAnswer script(QList<SgTestHandler>{});
     dialog.loadConfigurationFile(path("set.scx"), m_dir.path());
-    EXPECT_EQ(script.handled(), 0);
+    EXPECT_EQ(script.answered(), 0);
     EXPECT_TRUE(script.titles().isEmpty());
     EXPECT_EQ(listedPaths(dialog.sourceList()),
               (QStringList{path("one.obj"), path("two.obj"), path("three.obj")}));
@@ -311,6 +243,10 @@ TEST_F(MorphLoaderDlgTest, ProjectLoadsInSavedOrderAndSkipsMissingGeometry) {
 }
 
 TEST_F(MorphLoaderDlgTest, BrokenFilesEndInLoadErrors) {
+    const auto nested = [](int depth) {
+        return "<VarnTargetImporter>" + QByteArray("<a>").repeated(depth - 1) +
+               QByteArray("</a>").repeated(depth - 1) + "</VarnTargetImporter>";
+    };
     const struct {
         QByteArray bytes;
         QString file;
@@ -329,13 +265,15 @@ TEST_F(MorphLoaderDlgTest, BrokenFilesEndInLoadErrors) {
          "the Configuration."},
         {QByteArray(5000, '<').prepend(QByteArray(20000, 'x')), "e.scx",
          "Error: Document could not set as xml."},
-        {QByteArray("<a>").repeated(100000), "deep.scx", "Error: Document could not set as xml."},
+        // Nesting up to 64 elements is read; deeper is refused before the document is built.
+        {nested(64), "deep64.scx", "XML Parse error, Improper Configuration type."},
+        {nested(65), "deep65.scx", "Error: Document could not set as xml."},
     };
     for (const auto &entry : cases) {
         writeFile(path(entry.file), entry.bytes);
         SgMorphLoaderDlg dialog(nullptr, true, nullptr, nullptr);
         QString text;
-        ModalScript script({pressOnlyButton(&text)});
+        SgTestModalAnswer script(sgTestPressButton(QMessageBox::NoButton, nullptr, &text));
         dialog.loadConfigurationFile(path(entry.file), m_dir.path());
         EXPECT_EQ(script.titles(), QStringList{"Load Error"}) << entry.file.toStdString();
         EXPECT_EQ(text, entry.message);
@@ -343,7 +281,7 @@ TEST_F(MorphLoaderDlgTest, BrokenFilesEndInLoadErrors) {
     }
     SgMorphLoaderDlg dialog(nullptr, true, nullptr, nullptr);
     QString text;
-    ModalScript script({pressOnlyButton(&text)});
+    SgTestModalAnswer script(sgTestPressButton(QMessageBox::NoButton, nullptr, &text));
     dialog.loadConfigurationFile(path("absent.scx"), m_dir.path());
     EXPECT_EQ(text, "Error: Could not open file");
 }
@@ -361,7 +299,7 @@ TEST_F(MorphLoaderDlgTest, ObjectValuesLoadAsTheRowsRead) {
               "<UseCustom Value=\"true\"/></ERCType></CreateControlProperty>"
               "<ReverseDeformations Value=\"True\"><Pose Value=\"/pose.ds\"/></ReverseDeformations>"
               "</FileType></VarnTargetImporter>");
-    ModalScript script({});
+    SgTestModalAnswer script(QList<SgTestHandler>{});
     dialog.loadConfigurationFile(path("head.obj.scx"), m_dir.path());
     // The file's geometry was listed already: its settings go to that row, with no warning.
     EXPECT_TRUE(script.titles().isEmpty());
@@ -384,7 +322,9 @@ TEST_F(MorphLoaderDlgTest, SaveThenLoadReproducesEveryRowAndTheControlProperty) 
         SgMorphFileItem *source = topSource(dialog);
         for (const auto &[key, text] :
              QList<QPair<QString, QString>>{{"ScenaraExported", "True"},
+                                            {"ScExportIgnoredInvisibleNodes", "False"},
                                             {"ScExportWeldedGeom", "True"},
+                                            {"ScExportRemovedUnusedVerts", "True"},
                                             {"Name", "smile"},
                                             {"PropertyGroup", "Morphs/Face"},
                                             {"UseCustom", "True"},
@@ -412,6 +352,16 @@ TEST_F(MorphLoaderDlgTest, SaveThenLoadReproducesEveryRowAndTheControlProperty) 
     dialog.loadConfigurationFile(path("head.obj.scx"), m_dir.path());
     ASSERT_EQ(dialog.sourceList()->topLevelItemCount(), 1);
     EXPECT_EQ(allValues(topSource(dialog)), saved);
+    // Each row's text reached the loader.
+    const SgMorphLoader &l = topSource(dialog)->loader();
+    EXPECT_TRUE(l.scenaraExported() && l.weldedGeometry() && l.removedUnusedVertices() &&
+                l.useCustomValue() && l.useCustomLabel() && l.hideSecondary() &&
+                l.reverseModifiers() && l.applyAfterJoint() && l.createControl());
+    EXPECT_FALSE(l.ignoredInvisibleNodes() || l.cleanUpOrphans());
+    EXPECT_EQ(QStringList({l.morphName(), l.morphGroup(), l.customLabel(), l.poseFile()}),
+              QStringList({"smile", "Morphs/Face", "Grin", path("poses/p.ds")}));
+    EXPECT_FLOAT_EQ(l.customValue(), 0.25f);
+    EXPECT_EQ(l.override(), SgMorphLoader::DeltasAndLinks);
     SgNumericProperty *loaded = topSource(dialog)->loader().controlProperty();
     ASSERT_NE(loaded, nullptr);
     SgPropertySettings loadedAttributes;
@@ -443,7 +393,7 @@ TEST_F(MorphLoaderDlgTest, SaveOptionsCancelAbsoluteAndWithoutObjects) {
     auto *save = dialog.findChild<QPushButton *>("MorphLoaderSaveConfigurationBtn");
     dialog.configuration().setRelativePaths(false);
     {
-        ModalScript script({[](QWidget *w) { w->close(); }});
+        SgTestModalAnswer script([](QWidget *w) { w->close(); });
         save->click();
         EXPECT_EQ(script.titles(), QStringList{"Project Save Options"});
         EXPECT_FALSE(dialog.relativePaths());
@@ -451,7 +401,8 @@ TEST_F(MorphLoaderDlgTest, SaveOptionsCancelAbsoluteAndWithoutObjects) {
     }
     QDir().mkpath(path("projects"));
     {
-        ModalScript script({saveOptions(true, false), chooseFile(path("projects/abs.scx"))});
+        SgTestModalAnswer script(
+            {saveOptions(true, false), sgTestChooseFile(path("projects/abs.scx"))});
         save->click();
         EXPECT_EQ(script.titles(),
                   (QStringList{"Project Save Options", "Choose a Configuration file"}));
@@ -464,8 +415,8 @@ TEST_F(MorphLoaderDlgTest, SaveOptionsCancelAbsoluteAndWithoutObjects) {
     QFile::remove(path("geo/a.obj.scx"));
     {
         QString directory;
-        ModalScript script(
-            {saveOptions(false, true), chooseFile(path("geo/only.scx"), &directory)});
+        SgTestModalAnswer script(
+            {saveOptions(false, true), sgTestChooseFile(path("geo/only.scx"), &directory)});
         save->click();
         EXPECT_EQ(directory, path("projects"));
         EXPECT_TRUE(readFile(path("geo/only.scx")).contains("Path=\"/a.obj\""));
@@ -572,7 +523,7 @@ TEST_F(MorphLoaderDlgTest, ChooseFilesStartsInDocumentsAndRemembersFolder) {
     writeFile(path("geo/a.obj"), TriangleObj);
     SgMorphLoaderDlg dialog(nullptr, true, nullptr, nullptr);
     QString directory;
-    ModalScript script({chooseFile(path("geo/a.obj"), &directory)});
+    SgTestModalAnswer script(sgTestChooseFile(path("geo/a.obj"), &directory));
     dialog.findChild<QPushButton *>("MorphLoaderBrowseBtn")->click();
     EXPECT_EQ(directory, documents);
     EXPECT_EQ(listedPaths(dialog.sourceList()), QStringList{path("geo/a.obj")});
@@ -581,13 +532,7 @@ TEST_F(MorphLoaderDlgTest, ChooseFilesStartsInDocumentsAndRemembersFolder) {
     // A remembered folder that is gone opens its nearest existing parent, with no name typed.
     SgAppSettings("TargetImporter").setString("LastDirectory", path("geo/gone/Scenara"));
     QString typed = "unset";
-    ModalScript again({[&](QWidget *widget) {
-        auto *chooser = qobject_cast<QFileDialog *>(widget);
-        directory = chooser ? chooser->directory().absolutePath() : QString();
-        auto *name = chooser ? chooser->findChild<QLineEdit *>("fileNameEdit") : nullptr;
-        typed = name ? name->text() : QString();
-        widget->close();
-    }});
+    SgTestModalAnswer again(sgTestChooseFile(QString(), &directory, &typed));
     dialog.findChild<QPushButton *>("MorphLoaderBrowseBtn")->click();
     EXPECT_EQ(directory, path("geo"));
     EXPECT_EQ(typed, "");

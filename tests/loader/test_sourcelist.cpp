@@ -1,6 +1,6 @@
 // The source list: adding, refusing duplicates, removing, reordering, dropping files and the
 // context menus, driven through the real list.
-#include "modalhelper.h"
+#include "tests/support/sgtestmodal.h"
 
 #include "sgcore/script/sgscript.h"
 #include "sharedsource/engine/sgmorphloader.h"
@@ -69,18 +69,13 @@ protected:
 };
 
 TEST_F(SourceList, AddsOnTopAndRefusesExactDuplicatesOnce) {
-    EXPECT_EQ(list.columnCount(), 2);
-    EXPECT_EQ(list.headerItem()->text(0), "Item");
-    EXPECT_EQ(list.headerItem()->text(1), "Value");
-    EXPECT_EQ(list.selectionMode(), QAbstractItemView::ExtendedSelection);
-
     list.addFile("/m/a.obj");
     list.addFile("/m/b.obj");
     EXPECT_EQ(rowPaths(list), QStringList({"/m/b.obj", "/m/a.obj"}));
 
     QString title, text;
     {
-        ModalAnswer answer(closeMessageBox(&title, &text));
+        SgTestModalAnswer answer(sgTestPressButton(QMessageBox::NoButton, &title, &text));
         list.addFile("/m/a.obj");
         EXPECT_TRUE(answer.answered());
     }
@@ -95,9 +90,9 @@ TEST_F(SourceList, AddsOnTopAndRefusesExactDuplicatesOnce) {
     // One warning for the one duplicate of a batch; the last path of the batch ends on top.
     int warnings = 0;
     {
-        ModalAnswer answer([&](QWidget *w) {
+        SgTestModalAnswer answer([&](QWidget *w) {
             ++warnings;
-            closeMessageBox(nullptr, nullptr)(w);
+            sgTestPressButton()(w);
         });
         list.addFiles({"/m/c.obj", "/m/b.obj", "/m/d.obj"});
     }
@@ -153,20 +148,20 @@ TEST_F(SourceList, ContextMenusForwardToRowsAndOfferSavingOnFileRows) {
 
     QStringList seen;
     {
-        ModalAnswer answer(chooseMenuEntry("Cancel", &seen));
+        SgTestModalAnswer answer(sgTestChooseMenu({"Cancel"}, &seen));
         list.showContextMenu(file, at, 0);
     }
     EXPECT_EQ(seen, QStringList({"Save Object Configuration..", "-", "Cancel"}));
     EXPECT_EQ(saved.count(), 0);
     {
-        ModalAnswer answer(chooseMenuEntry("Save Object Configuration.."));
+        SgTestModalAnswer answer(sgTestChooseMenu({"Save Object Configuration.."}));
         list.showContextMenu(file, at, 0);
     }
     EXPECT_EQ(saved.count(), 1);
 
     // The in-memory row has no menu.
     {
-        ModalAnswer answer(chooseMenuEntry(""), 300);
+        SgTestModalAnswer answer(sgTestChooseMenu({}), 300);
         list.showContextMenu(list.topLevelItem(0), at, 0);
         EXPECT_FALSE(answer.answered());
     }
@@ -178,7 +173,7 @@ TEST_F(SourceList, ContextMenusForwardToRowsAndOfferSavingOnFileRows) {
     const QRect rect = list.visualItemRect(reverse);
     const QPoint click(list.columnViewportPosition(1) + 5, rect.center().y());
     {
-        ModalAnswer answer(chooseMenuEntry("yes"));
+        SgTestModalAnswer answer(sgTestChooseMenu({"yes"}));
         QContextMenuEvent event(QContextMenuEvent::Mouse, click,
                                 list.viewport()->mapToGlobal(click));
         QCoreApplication::sendEvent(list.viewport(), &event);
@@ -189,7 +184,7 @@ TEST_F(SourceList, ContextMenusForwardToRowsAndOfferSavingOnFileRows) {
     // The context-menu key opens the editor of the current row.
     list.setCurrentItem(findLabel(file, "Apply After Joint Binding:"));
     {
-        ModalAnswer answer(chooseMenuEntry("yes"));
+        SgTestModalAnswer answer(sgTestChooseMenu({"yes"}));
         QContextMenuEvent event(QContextMenuEvent::Keyboard, QPoint(1, 1),
                                 list.viewport()->mapToGlobal(QPoint(1, 1)));
         QCoreApplication::sendEvent(list.viewport(), &event);
@@ -202,7 +197,7 @@ TEST_F(SourceList, DropsAddGeometryFilesAndSetPoses) {
     QString title, text;
     const QPoint empty(10, list.viewport()->height() - 5);
     {
-        ModalAnswer answer(closeMessageBox(&title, &text));
+        SgTestModalAnswer answer(sgTestPressButton(QMessageBox::NoButton, &title, &text));
         drop(list, {"/m/a.obj", "/m/notes.txt", "/m/b.obj", "/m/c.png"}, empty);
         EXPECT_TRUE(answer.answered());
     }
@@ -218,7 +213,7 @@ TEST_F(SourceList, DropsAddGeometryFilesAndSetPoses) {
     const QString script = "/poses/sit." + poseExtension();
     list.expandAll();
     {
-        ModalAnswer answer(closeMessageBox(&title, &text), 300);
+        SgTestModalAnswer answer(sgTestPressButton(QMessageBox::NoButton, &title, &text), 300);
         drop(list, {script}, list.visualItemRect(pose).center());
         EXPECT_TRUE(answer.answered()); // not drop-enabled yet: the list reports it
     }
@@ -231,7 +226,7 @@ TEST_F(SourceList, DropsAddGeometryFilesAndSetPoses) {
 
     // Anything else onto the pose row is refused with the pose kept.
     {
-        ModalAnswer answer(closeMessageBox(&title, &text));
+        SgTestModalAnswer answer(sgTestPressButton(QMessageBox::NoButton, &title, &text));
         drop(list, {"/m/d.obj"}, list.visualItemRect(pose).center());
         EXPECT_TRUE(answer.answered());
     }

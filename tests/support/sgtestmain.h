@@ -26,6 +26,8 @@
 
 #include <QString>
 
+#include <ostream>
+
 // The fresh temporary folder of this test program (no trailing slash).
 QString sgTestFolder();
 
@@ -34,3 +36,8 @@ QString sgTestPath(const QString &name);
 
 // Changes the fail-safe's time-out for stray modal dialogs and popups (milliseconds).
 void sgTestSetModalTimeout(int milliseconds);
+
+// Readable QString values in test failure messages.
+inline void PrintTo(const QString &text, std::ostream *out) {
+    *out << '"' << text.toStdString() << '"';
+}

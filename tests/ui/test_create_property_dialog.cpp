@@ -1,4 +1,3 @@
-#include "uitesthelpers.h"
 
 #include "sgcore/app/sgapp.h"
 #include "sgcore/app/sgimagemgr.h"
@@ -26,6 +25,7 @@
 #include "sgcore/widgets/sgnodemenu.h"
 #include "sharedsource/propertyui/sgcreatepropertydlg.h"
 #include "tests/support/sgtestmain.h"
+#include "tests/support/sgtestmodal.h"
 
 #include <QCheckBox>
 #include <QComboBox>
@@ -33,7 +33,6 @@
 #include <QGroupBox>
 #include <QLabel>
 #include <QLineEdit>
-#include <QMetaMethod>
 #include <QMouseEvent>
 #include <QPushButton>
 #include <QSlider>
@@ -85,12 +84,9 @@ protected:
     // Clicks "Create" and returns the warning text (empty when no warning came).
     static QString clickCreate(Dlg &dialog, bool expectWarning) {
         QString warning;
-        if (expectWarning)
-            uitest::answerMessageBox(&warning);
+        SgTestModalAnswer answer(sgTestPressButton(QMessageBox::NoButton, nullptr, &warning));
         QTest::mouseClick(child<QPushButton>(dialog, "SgCreatePropButton"), Qt::LeftButton);
-        if (expectWarning) {
-            EXPECT_FALSE(warning.isEmpty());
-        }
+        EXPECT_EQ(answer.answered(), expectWarning ? 1 : 0);
         return warning;
     }
 
@@ -103,25 +99,8 @@ protected:
 
 const QString Header = "Could not create properties for the following reasons:\n";
 
-TEST_F(CreatePropertyDialog, MetaObjectLayoutAndPages) {
+TEST_F(CreatePropertyDialog, PagesFollowTheType) {
     auto dialog = makeDialog();
-    const QMetaObject *meta = dialog->metaObject();
-    EXPECT_STREQ(meta->className(), "SgCreatePropertyDlg");
-    QStringList methods;
-    for (int i = meta->methodOffset(); i < meta->methodCount(); ++i)
-        methods.append(QString::fromLatin1(meta->method(i).name()));
-    EXPECT_EQ(methods,
-              QStringList({"setCreateOnAccept",  "setResetValuesOnShow", "setDefaultName",
-                           "setDefaultLabel",    "setPathDefaults",      "setPathDefaults",
-                           "setDefaultPath",     "setPathReadOnly",      "setCreationNodes",
-                           "insertCreationNode", "setCreationNode",      "setNodeMenu",
-                           "setNodeMenu",        "setSkeletonMenu",      "setSkeletonMenu",
-                           "createProperties",   "createProperty",       "createProperty",
-                           "validate",           "autoFillPropLabel",    "acceptButtonClicked",
-                           "updateDisplay",      "saveCurrentValues",    "resetValues",
-                           "beginRenameEnum",    "renameEnum",           "moveEnumUp",
-                           "moveEnumDown",       "removeEnum",           "addDefaultEnumItem"}));
-
     // Pages shown per type, the type row and the node page's relabelling.
     dialog->show();
     const QStringList pages = {
@@ -153,12 +132,7 @@ TEST_F(CreatePropertyDialog, MetaObjectLayoutAndPages) {
     EXPECT_EQ(dialog->windowTitle(), "Create Property");
 
     // Only the int page's Max slider refuses typed text.
-    for (const char *name : {"SgFloatVal", "SgDefaultFloatVal", "SgFloatMinAttrib",
-                             "SgFloatMaxAttrib", "SgFloatSensitivityAttrib"})
-        EXPECT_TRUE(child<SgFloatSlider>(*dialog, name)->isTextEditable()) << name;
-    for (const char *name :
-         {"SgIntVal", "SgDefaultIntVal", "SgIntMinAttrib", "SgIntSensitivityAttrib"})
-        EXPECT_TRUE(child<SgIntSlider>(*dialog, name)->isTextEditable()) << name;
+    EXPECT_TRUE(child<SgIntSlider>(*dialog, "SgIntMinAttrib")->isTextEditable());
     EXPECT_FALSE(child<SgIntSlider>(*dialog, "SgIntMaxAttrib")->isTextEditable());
 
     // "Create morph after joint" follows "Create as empty morph" without being unchecked.
@@ -183,66 +157,84 @@ TEST_F(CreatePropertyDialog, MetaObjectLayoutAndPages) {
 }
 
 TEST_F(CreatePropertyDialog, ValidationListsEveryFailedCheckInOrder) {
-    auto dialog = makeDialog();
-    dialog->show();
-    setText(*dialog, "SgPropertyInternalNameAttrib", "   ");
-    setText(*dialog, "SgPropertyLabelAttrib", " ");
-    EXPECT_EQ(clickCreate(*dialog, true), Header + "   - No nodes have been specified\n"
-                                                   "   - Name cannot be empty\n"
-                                                   "   - Label cannot be empty\n");
-    EXPECT_TRUE(dialog->isVisible());
-
     SgNode *node = addNode("body");
-    dialog->setCreationNode(node);
-    setText(*dialog, "SgPropertyInternalNameAttrib", "smile");
-    setText(*dialog, "SgPropertyLabelAttrib", "Smile");
-    setFloat(*dialog, "SgFloatMinAttrib", 2.0f);
-    setFloat(*dialog, "SgFloatMaxAttrib", 1.0f);
-    EXPECT_EQ(clickCreate(*dialog, true), Header + "   - Min is greater than Max\n"
-                                                   "   - Value is not within limits\n"
-                                                   "   - Default Value is not within limits\n");
-    // Without limits only the range itself is checked.
-    setOn(*dialog, "SgObeyLimitsAttrib", false);
-    EXPECT_EQ(clickCreate(*dialog, true), Header + "   - Min is greater than Max\n");
-    setFloat(*dialog, "SgFloatMinAttrib", -1.0f);
-    setFloat(*dialog, "SgFloatVal", 5.0f);
-    clickCreate(*dialog, false);
-    EXPECT_EQ(dialog->result(), QDialog::Accepted);
-    EXPECT_FALSE(dialog->isVisible());
-    ASSERT_EQ(node->getPropertyCount(), 1);
+    const QString range = "Min is greater than Max", value = "Value is not within limits",
+                  fallback = "Default Value is not within limits";
+    const struct {
+        int type;
+        bool onNode;
+        const char *name, *label;
+        float min, max, value, fallback;
+        bool obeyLimits;
+        QStringList failures; // empty: accepted; {""}: the header line alone
+    } cases[] = {
+        {Dlg::FloatType,
+         false,
+         "   ",
+         " ",
+         0,
+         1,
+         0,
+         0,
+         true,
+         {"No nodes have been specified", "Name cannot be empty", "Label cannot be empty"}},
+        {Dlg::FloatType, true, "smile", "Smile", 2, 1, 0, 0, true, {range, value, fallback}},
+        // Without limits only the range itself is checked.
+        {Dlg::FloatType, true, "smile", "Smile", 2, 1, 0, 0, false, {range}},
+        {Dlg::FloatType, true, "smile", "Smile", -1, 1, 5, 0, false, {}},
+        {Dlg::IntType, true, "count", "Count", 0, 1, 4, 0, true, {value}},
+        {Dlg::IntType, true, "count", "Count", 5, 2, 2, 2, true, {range, value, fallback}},
+        // Values equal to the limits pass.
+        {Dlg::IntType, true, "count", "Count", 2, 4, 4, 2, true, {}},
+        // A numeric node property takes a min above its max.
+        {Dlg::NumericNodeType, true, "follow", "Follow", 3, 1, 9, 0, true, {}},
+        {Dlg::EnumType, true, "mood", "Mood", 0, 1, 0, 0, true, {""}},
+    };
+    for (const auto &c : cases) {
+        SCOPED_TRACE(c.name);
+        auto dialog = makeDialog(c.type);
+        dialog->show();
+        dialog->setCreationNode(c.onNode ? node : nullptr);
+        setText(*dialog, "SgPropertyInternalNameAttrib", c.name);
+        setText(*dialog, "SgPropertyLabelAttrib", c.label);
+        if (c.type == Dlg::IntType) {
+            setInt(*dialog, "SgIntMinAttrib", int(c.min));
+            setInt(*dialog, "SgIntMaxAttrib", int(c.max));
+            setInt(*dialog, "SgIntVal", int(c.value));
+            setInt(*dialog, "SgDefaultIntVal", int(c.fallback));
+        } else if (c.type != Dlg::EnumType) {
+            setFloat(*dialog, "SgFloatMinAttrib", c.min);
+            setFloat(*dialog, "SgFloatMaxAttrib", c.max);
+            setFloat(*dialog, "SgFloatVal", c.value);
+            setFloat(*dialog, "SgDefaultFloatVal", c.fallback);
+            setOn(*dialog, "SgObeyLimitsAttrib", c.obeyLimits);
+        }
+        QString expected;
+        for (const QString &failure : c.failures)
+            expected += failure.isEmpty() ? QString() : "   - " + failure + "\n";
+        EXPECT_EQ(clickCreate(*dialog, !c.failures.isEmpty()),
+                  c.failures.isEmpty() ? QString() : Header + expected);
+        EXPECT_EQ(dialog->isVisible(), !c.failures.isEmpty());
+    }
+    ASSERT_EQ(node->getPropertyCount(), 3);
     EXPECT_EQ(static_cast<SgFloatProperty *>(node->getProperty(0))->getRawValue(), 5.0f);
-}
-
-TEST_F(CreatePropertyDialog, IntAndNumericNodeRangesAndEqualValues) {
-    SgNode *node = addNode("body");
-    auto dialog = makeDialog(Dlg::IntType);
-    dialog->show();
-    dialog->setCreationNode(node);
-    setText(*dialog, "SgPropertyInternalNameAttrib", "count");
-    setText(*dialog, "SgPropertyLabelAttrib", "Count");
-    setInt(*dialog, "SgIntVal", 4);
-    EXPECT_EQ(clickCreate(*dialog, true), Header + "   - Value is not within limits\n");
-    setInt(*dialog, "SgIntMinAttrib", 5);
-    setInt(*dialog, "SgIntMaxAttrib", 2);
-    setInt(*dialog, "SgIntVal", 2);
-    setInt(*dialog, "SgDefaultIntVal", 2);
-    EXPECT_EQ(clickCreate(*dialog, true), Header + "   - Min is greater than Max\n"
-                                                   "   - Value is not within limits\n"
-                                                   "   - Default Value is not within limits\n");
-    // Values equal to the limits pass; the int property is made without clamping.
-    setInt(*dialog, "SgIntMinAttrib", 2);
-    setInt(*dialog, "SgIntMaxAttrib", 4);
-    setInt(*dialog, "SgIntVal", 4);
-    clickCreate(*dialog, false);
-    ASSERT_EQ(node->getPropertyCount(), 1);
-    auto *created = dynamic_cast<SgIntProperty *>(node->getProperty(0));
+    // The int property is made without clamping.
+    auto *created = dynamic_cast<SgIntProperty *>(node->getProperty(1));
     ASSERT_NE(created, nullptr);
     EXPECT_EQ(created->getIntValue(), 4);
     EXPECT_EQ(created->getDefaultValue(), 2.0f);
     EXPECT_EQ(created->getMin(), 2.0f);
     EXPECT_EQ(created->getMax(), 4.0f);
     EXPECT_FALSE(created->isClamped());
+}
 
+TEST_F(CreatePropertyDialog, IntMaxSliderReachesTheHostLimitWithoutTypedText) {
+    SgNode *node = addNode("body");
+    auto dialog = makeDialog(Dlg::IntType);
+    dialog->show();
+    dialog->setCreationNode(node);
+    setText(*dialog, "SgPropertyLabelAttrib", "Count");
+    setInt(*dialog, "SgIntMinAttrib", 2);
     // The Max slider takes no typed text, yet reaches the host's default limit of 100; the
     // value sliders then span the new limits.
     auto *maxSlider = child<QSlider>(*dialog, "SgIntMaxAttribSlider");
@@ -260,29 +252,8 @@ TEST_F(CreatePropertyDialog, IntAndNumericNodeRangesAndEqualValues) {
     EXPECT_EQ(child<SgIntSlider>(*dialog, "SgIntMaxAttrib")->getValue(), 100);
     setInt(*dialog, "SgIntVal", 50);
     clickCreate(*dialog, false);
-    ASSERT_EQ(node->getPropertyCount(), 2);
-    EXPECT_EQ(dynamic_cast<SgIntProperty *>(node->getProperty(1))->getMax(), 100.0f);
-    node->removeProperty("many");
-
-    // Numeric node: min above max is accepted.
-    auto numericNode = makeDialog(Dlg::NumericNodeType);
-    numericNode->show();
-    numericNode->setCreationNode(node);
-    setText(*numericNode, "SgPropertyInternalNameAttrib", "follow");
-    setText(*numericNode, "SgPropertyLabelAttrib", "Follow");
-    setFloat(*numericNode, "SgFloatMinAttrib", 3.0f);
-    setFloat(*numericNode, "SgFloatVal", 9.0f);
-    clickCreate(*numericNode, false);
-    EXPECT_EQ(numericNode->result(), QDialog::Accepted);
-    EXPECT_EQ(node->getPropertyCount(), 2);
-
-    // An enum without items fails with the header line alone.
-    auto enumDialog = makeDialog(Dlg::EnumType);
-    enumDialog->show();
-    enumDialog->setCreationNode(node);
-    setText(*enumDialog, "SgPropertyInternalNameAttrib", "mood");
-    setText(*enumDialog, "SgPropertyLabelAttrib", "Mood");
-    EXPECT_EQ(clickCreate(*enumDialog, true), Header);
+    ASSERT_EQ(node->getPropertyCount(), 1);
+    EXPECT_EQ(dynamic_cast<SgIntProperty *>(node->getProperty(0))->getMax(), 100.0f);
 }
 
 TEST_F(CreatePropertyDialog, EachTypeCreatesItsPropertyFromTheDialogsValues) {

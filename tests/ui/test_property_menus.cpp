@@ -1,4 +1,3 @@
-#include "uitesthelpers.h"
 
 #include "sgcore/app/sgapp.h"
 #include "sgcore/properties/sgboolproperty.h"
@@ -15,6 +14,7 @@
 #include "sharedsource/propertyui/sgpropertygroupmenu.h"
 #include "sharedsource/propertyui/sgpropertytreemenu.h"
 #include "sharedsource/propertyui/sgscenenodemenu.h"
+#include "tests/support/sgtestmodal.h"
 
 #include <QComboBox>
 #include <QDialogButtonBox>
@@ -24,6 +24,12 @@
 #include <memory>
 
 namespace {
+
+// Runs `open` (a chooser that shows a popup) while the popup is answered by choosing `path` (an
+// empty path dismisses it); returns what `open` returns.
+template <typename Open> auto pick(const QStringList &path, Open open) {
+    return sgTestAnswering({sgTestChooseMenu(path)}, open);
+}
 
 class PropertyMenus : public ::testing::Test {
 protected:
@@ -39,20 +45,10 @@ protected:
     }
 };
 
-// Answers the next popup by choosing `path`.
-void choose(const QStringList &path) {
-    uitest::onNextPopup([path](QMenu *menu) { uitest::chooseInMenu(menu, path); });
-}
-
-// Dismisses the next popup.
-void dismiss() {
-    uitest::onNextPopup([](QMenu *menu) { menu->close(); });
-}
-
 TEST_F(PropertyMenus, GroupMenuCollectsTheFiguresPathsOnce) {
     {
         SgPropertyGroupMenu empty(nullptr, "empty");
-        EXPECT_EQ(uitest::menuEntries(&empty), QStringList({"Create...=268435455", "-"}));
+        EXPECT_EQ(sgTestMenuEntries(&empty, true), QStringList({"Create...=268435455", "-"}));
         SgCreatePropertyGroupDlg dialog(nullptr, QString());
         EXPECT_EQ(dialog.findChild<QComboBox *>("TICreatePropGroupList")->count(), 0);
     }
@@ -69,12 +65,12 @@ TEST_F(PropertyMenus, GroupMenuCollectsTheFiguresPathsOnce) {
     scene()->setPrimarySelection(thigh);
 
     SgPropertyGroupMenu menu(nullptr, "groups");
-    EXPECT_EQ(uitest::menuEntries(&menu), QStringList({"Create...=268435455", "-", "Morphs=0",
-                                                       "Morphs/Face=1", "Pose=2", "Pose/Bend=3"}));
-    choose({"Pose/Bend"});
-    EXPECT_EQ(menu.chooseGroup("current", QPoint(10, 10)), "Pose/Bend");
-    dismiss();
-    EXPECT_EQ(menu.chooseGroup("current", QPoint(10, 10)), "current");
+    EXPECT_EQ(sgTestMenuEntries(&menu, true),
+              QStringList({"Create...=268435455", "-", "Morphs=0", "Morphs/Face=1", "Pose=2",
+                           "Pose/Bend=3"}));
+    EXPECT_EQ(pick({"Pose/Bend"}, [&] { return menu.chooseGroup("current", QPoint(10, 10)); }),
+              "Pose/Bend");
+    EXPECT_EQ(pick({}, [&] { return menu.chooseGroup("current", QPoint(10, 10)); }), "current");
 }
 
 TEST_F(PropertyMenus, CreateGroupDialogFromTheMenu) {
@@ -84,58 +80,51 @@ TEST_F(PropertyMenus, CreateGroupDialogFromTheMenu) {
     scene()->setPrimarySelection(node);
     SgPropertyGroupMenu menu(nullptr, "groups");
 
-    auto answerDialog = [](std::function<void(SgCreatePropertyGroupDlg *)> act) {
-        uitest::onNextPopup([act](QMenu *popup) {
-            uitest::onNextModal([act](QWidget *modal) {
-                auto *dialog = qobject_cast<SgCreatePropertyGroupDlg *>(modal);
-                if (!dialog) {
-                    ADD_FAILURE() << "no create-group dialog";
-                    modal->close();
-                    return;
-                }
-                act(dialog);
-            });
-            uitest::chooseInMenu(popup, {"Create..."});
-        });
+    // Chooses "Create..." and hands the dialog that opens to `act`; returns the chosen group.
+    auto createGroup = [&](std::function<void(SgCreatePropertyGroupDlg *)> act) {
+        SgTestModalAnswer answer(
+            {sgTestChooseMenu({"Create..."}), sgTestAs<SgCreatePropertyGroupDlg>(act)});
+        return menu.chooseGroup("current", QPoint());
     };
     auto button = [](SgCreatePropertyGroupDlg *dialog, QDialogButtonBox::StandardButton which) {
         return dialog->findChild<QDialogButtonBox *>()->button(which);
     };
 
     // Accepting with the edit still empty gives an empty path.
-    answerDialog([&](SgCreatePropertyGroupDlg *dialog) {
-        EXPECT_EQ(dialog->windowTitle(), "Create Property Group");
-        EXPECT_EQ(dialog->findChild<QLineEdit *>("TICreatePropGroupEdit")->text(), "");
-        button(dialog, QDialogButtonBox::Ok)->click();
-    });
-    EXPECT_EQ(menu.chooseGroup("current", QPoint()), "");
+    EXPECT_EQ(createGroup([&](SgCreatePropertyGroupDlg *dialog) {
+                  EXPECT_EQ(dialog->windowTitle(), "Create Property Group");
+                  EXPECT_EQ(dialog->findChild<QLineEdit *>("TICreatePropGroupEdit")->text(), "");
+                  button(dialog, QDialogButtonBox::Ok)->click();
+              }),
+              "");
 
     // Cancelling returns the current path.
-    answerDialog([&](SgCreatePropertyGroupDlg *dialog) {
-        dialog->findChild<QLineEdit *>("TICreatePropGroupEdit")->setText("typed");
-        button(dialog, QDialogButtonBox::Cancel)->click();
-    });
-    EXPECT_EQ(menu.chooseGroup("current", QPoint()), "current");
+    EXPECT_EQ(createGroup([&](SgCreatePropertyGroupDlg *dialog) {
+                  dialog->findChild<QLineEdit *>("TICreatePropGroupEdit")->setText("typed");
+                  button(dialog, QDialogButtonBox::Cancel)->click();
+              }),
+              "current");
 
     // Picking a path in the box fills the edit; typing afterwards wins.
-    answerDialog([&](SgCreatePropertyGroupDlg *dialog) {
-        auto *box = dialog->findChild<QComboBox *>("TICreatePropGroupList");
-        EXPECT_EQ(box->count(), 2);
-        box->setCurrentIndex(1);
-        emit box->textActivated(box->itemText(1));
-        EXPECT_EQ(dialog->findChild<QLineEdit *>("TICreatePropGroupEdit")->text(), "Morphs/Face");
-        button(dialog, QDialogButtonBox::Ok)->click();
-    });
-    EXPECT_EQ(menu.chooseGroup("current", QPoint()), "Morphs/Face");
-    answerDialog([&](SgCreatePropertyGroupDlg *dialog) {
-        auto *box = dialog->findChild<QComboBox *>("TICreatePropGroupList");
-        emit box->textActivated(box->itemText(0));
-        auto *edit = dialog->findChild<QLineEdit *>("TICreatePropGroupEdit");
-        edit->clear();
-        QTest::keyClicks(edit, "Mine/New");
-        button(dialog, QDialogButtonBox::Ok)->click();
-    });
-    EXPECT_EQ(menu.chooseGroup("current", QPoint()), "Mine/New");
+    EXPECT_EQ(createGroup([&](SgCreatePropertyGroupDlg *dialog) {
+                  auto *box = dialog->findChild<QComboBox *>("TICreatePropGroupList");
+                  EXPECT_EQ(box->count(), 2);
+                  box->setCurrentIndex(1);
+                  emit box->textActivated(box->itemText(1));
+                  EXPECT_EQ(dialog->findChild<QLineEdit *>("TICreatePropGroupEdit")->text(),
+                            "Morphs/Face");
+                  button(dialog, QDialogButtonBox::Ok)->click();
+              }),
+              "Morphs/Face");
+    EXPECT_EQ(createGroup([&](SgCreatePropertyGroupDlg *dialog) {
+                  auto *box = dialog->findChild<QComboBox *>("TICreatePropGroupList");
+                  emit box->textActivated(box->itemText(0));
+                  auto *edit = dialog->findChild<QLineEdit *>("TICreatePropGroupEdit");
+                  edit->clear();
+                  QTest::keyClicks(edit, "Mine/New");
+                  button(dialog, QDialogButtonBox::Ok)->click();
+              }),
+              "Mine/New");
 }
 
 TEST_F(PropertyMenus, TreeMenuListsNumericPropertiesAndChoosesThem) {
@@ -151,37 +140,38 @@ TEST_F(PropertyMenus, TreeMenuListsNumericPropertiesAndChoosesThem) {
 
     auto current = std::make_unique<SgFloatProperty>("current");
     SgPropertyTreeMenu menu("Morph Name", node, nullptr, "tree");
-    EXPECT_EQ(uitest::menuEntries(&menu),
+    EXPECT_EQ(sgTestMenuEntries(&menu, true),
               QStringList({"Create...=8192", "-", "Morph Name=16384", "-", "Pose=4096"}));
     QMenu *pose = menu.actions().last()->menu();
     ASSERT_NE(pose, nullptr);
-    EXPECT_EQ(uitest::menuEntries(pose),
+    EXPECT_EQ(sgTestMenuEntries(pose, true),
               QStringList({"Create...=8192", "-", "Face=4096", "bend=0", "count=1", "twist=2"}));
 
-    choose({"Pose", "twist"});
-    EXPECT_EQ(menu.chooseProperty(current.get(), QPoint()), twist);
-    choose({"Pose", "Face", "Smile"});
-    EXPECT_EQ(menu.chooseProperty(current.get(), QPoint()), smile);
-    choose({"Pose", "count"});
-    EXPECT_EQ(menu.chooseProperty(nullptr, QPoint()), count);
-    choose({"Morph Name"});
-    EXPECT_EQ(menu.chooseProperty(current.get(), QPoint()), nullptr);
-    dismiss();
-    EXPECT_EQ(menu.chooseProperty(current.get(), QPoint()), current.get());
+    EXPECT_EQ(pick({"Pose", "twist"}, [&] { return menu.chooseProperty(current.get(), QPoint()); }),
+              twist);
+    EXPECT_EQ(pick({"Pose", "Face", "Smile"},
+                   [&] { return menu.chooseProperty(current.get(), QPoint()); }),
+              smile);
+    EXPECT_EQ(pick({"Pose", "count"}, [&] { return menu.chooseProperty(nullptr, QPoint()); }),
+              count);
+    EXPECT_EQ(pick({"Morph Name"}, [&] { return menu.chooseProperty(current.get(), QPoint()); }),
+              nullptr);
+    EXPECT_EQ(pick({}, [&] { return menu.chooseProperty(current.get(), QPoint()); }),
+              current.get());
     (void)bend;
 
     // No element: "- none -", which keeps the current property.
     SgPropertyTreeMenu none("Morph Name", nullptr, nullptr, "none");
-    EXPECT_EQ(uitest::menuEntries(&none),
+    EXPECT_EQ(sgTestMenuEntries(&none, true),
               QStringList({"Create...=8192", "-", "Morph Name=16384", "-", "- none -=12288"}));
-    choose({"- none -"});
-    EXPECT_EQ(none.chooseProperty(current.get(), QPoint()), current.get());
+    EXPECT_EQ(pick({"- none -"}, [&] { return none.chooseProperty(current.get(), QPoint()); }),
+              current.get());
 
     // An element without groups: only "Create..." and the text entry.
     auto *bare = new SgNode("bare");
     scene()->addNode(bare);
     SgPropertyTreeMenu empty("Morph Name", bare, nullptr, "empty");
-    EXPECT_EQ(uitest::menuEntries(&empty),
+    EXPECT_EQ(sgTestMenuEntries(&empty, true),
               QStringList({"Create...=8192", "-", "Morph Name=16384", "-"}));
 }
 
@@ -192,45 +182,36 @@ TEST_F(PropertyMenus, TreeMenuCreatesAPropertyForTheCaller) {
     auto current = std::make_unique<SgFloatProperty>("current");
     SgPropertyTreeMenu menu("Grin", node, nullptr, "tree");
 
-    auto answerCreate = [](const QStringList &path,
-                           std::function<void(SgCreatePropertyDlg *)> act) {
-        uitest::onNextPopup([path, act](QMenu *popup) {
-            uitest::onNextModal([act](QWidget *modal) {
-                auto *dialog = qobject_cast<SgCreatePropertyDlg *>(modal);
-                if (!dialog) {
-                    ADD_FAILURE() << "no create-property dialog";
-                    modal->close();
-                    return;
-                }
-                act(dialog);
-            });
-            uitest::chooseInMenu(popup, path);
-        });
+    // Chooses `path` and hands the dialog that opens to `act`; returns the chosen property.
+    auto create = [&](const QStringList &path, std::function<void(SgCreatePropertyDlg *)> act) {
+        SgTestModalAnswer answer({sgTestChooseMenu(path), sgTestAs<SgCreatePropertyDlg>(act)});
+        return menu.chooseProperty(current.get(), QPoint());
     };
     auto text = [](SgCreatePropertyDlg *dialog, const char *name) {
         return dialog->findChild<QLineEdit *>(name)->text();
     };
 
     // Cancelled: the current property stays, nothing is added.
-    answerCreate({"Create..."}, [&](SgCreatePropertyDlg *dialog) {
-        EXPECT_EQ(dialog->objectName(), "PropertyTreeMenuCreateDlg");
-        EXPECT_EQ(text(dialog, "SgPathAttrib"), "Morphs/Morph Loader");
-        EXPECT_EQ(text(dialog, "SgPropertyInternalNameAttrib"), "Grin");
-        EXPECT_EQ(text(dialog, "SgPropertyLabelAttrib"), "Grin");
-        EXPECT_EQ(dialog->getCreationNodes(), QList<SgNode *>({node}));
-        auto *paths = dialog->findChild<QComboBox *>("SgPathDefaults");
-        EXPECT_EQ(paths->count(), 3); // "Pose", "Pose/Face" and the preset
-        dialog->findChild<QPushButton *>("SgCancelCreatePropButton")->click();
-    });
-    EXPECT_EQ(menu.chooseProperty(current.get(), QPoint()), current.get());
+    EXPECT_EQ(create({"Create..."},
+                     [&](SgCreatePropertyDlg *dialog) {
+                         EXPECT_EQ(dialog->objectName(), "PropertyTreeMenuCreateDlg");
+                         EXPECT_EQ(text(dialog, "SgPathAttrib"), "Morphs/Morph Loader");
+                         EXPECT_EQ(text(dialog, "SgPropertyInternalNameAttrib"), "Grin");
+                         EXPECT_EQ(text(dialog, "SgPropertyLabelAttrib"), "Grin");
+                         EXPECT_EQ(dialog->getCreationNodes(), QList<SgNode *>({node}));
+                         auto *paths = dialog->findChild<QComboBox *>("SgPathDefaults");
+                         EXPECT_EQ(paths->count(), 3); // "Pose", "Pose/Face" and the preset
+                         dialog->findChild<QPushButton *>("SgCancelCreatePropButton")->click();
+                     }),
+              current.get());
     EXPECT_EQ(node->getPropertyCount(), 1);
 
     // Created inside a group: preset to the group's path, handed over unattached.
-    answerCreate({"Pose", "Face", "Create..."}, [&](SgCreatePropertyDlg *dialog) {
-        EXPECT_EQ(text(dialog, "SgPathAttrib"), "Pose/Face");
-        dialog->findChild<QPushButton *>("SgCreatePropButton")->click();
-    });
-    std::unique_ptr<SgNumericProperty> created(menu.chooseProperty(current.get(), QPoint()));
+    std::unique_ptr<SgNumericProperty> created(
+        create({"Pose", "Face", "Create..."}, [&](SgCreatePropertyDlg *dialog) {
+            EXPECT_EQ(text(dialog, "SgPathAttrib"), "Pose/Face");
+            dialog->findChild<QPushButton *>("SgCreatePropButton")->click();
+        }));
     ASSERT_NE(created, nullptr);
     EXPECT_NE(created.get(), current.get());
     EXPECT_EQ(created->getName(), "Grin");
@@ -244,8 +225,7 @@ TEST_F(PropertyMenus, SceneNodeMenuListsVisibleNodesByScenePosition) {
         SgSceneNodeMenu empty(nullptr, "empty");
         EXPECT_TRUE(empty.actions().isEmpty());
         SgNode current("current");
-        dismiss();
-        EXPECT_EQ(empty.chooseNode(&current, QPoint()), &current);
+        EXPECT_EQ(pick({}, [&] { return empty.chooseNode(&current, QPoint()); }), &current);
     }
     auto *first = new SgNode("first");
     auto *hidden = new SgNode("hidden");
@@ -256,16 +236,17 @@ TEST_F(PropertyMenus, SceneNodeMenuListsVisibleNodesByScenePosition) {
     for (SgNode *node : {first, hidden, third, fourth})
         scene()->addNode(node);
     SgSceneNodeMenu menu(nullptr, "nodes");
-    EXPECT_EQ(uitest::menuEntries(&menu), QStringList({"first=0", "twin=2", "twin=3"}));
-    uitest::onNextPopup([](QMenu *popup) {
-        popup->setActiveAction(popup->actions().at(2));
-        QTest::keyClick(popup, Qt::Key_Return);
-    });
-    EXPECT_EQ(menu.chooseNode(first, QPoint()), fourth);
-    choose({"twin"});
-    EXPECT_EQ(menu.chooseNode(first, QPoint()), third);
-    dismiss();
-    EXPECT_EQ(menu.chooseNode(first, QPoint()), first);
+    EXPECT_EQ(sgTestMenuEntries(&menu, true), QStringList({"first=0", "twin=2", "twin=3"}));
+    // The two "twin" entries are told apart by their place.
+    EXPECT_EQ(sgTestAnswering({[](QWidget *popup) {
+                                  auto *menu = static_cast<QMenu *>(popup);
+                                  menu->setActiveAction(menu->actions().at(2));
+                                  QTest::keyClick(menu, Qt::Key_Return);
+                              }},
+                              [&] { return menu.chooseNode(first, QPoint()); }),
+              fourth);
+    EXPECT_EQ(pick({"twin"}, [&] { return menu.chooseNode(first, QPoint()); }), third);
+    EXPECT_EQ(pick({}, [&] { return menu.chooseNode(first, QPoint()); }), first);
 }
 
 } // namespace
