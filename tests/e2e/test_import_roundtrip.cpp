@@ -1,11 +1,15 @@
 // Returned geometry imported through the real reference modeler: the bridge in this process,
-// the modeler as a second process that edits what it receives and sends it straight back.
+// the modeler as a second process that edits what it receives and sends it straight back. The
+// returns go through the bridge's own questions, or through the "Target Importer" dialog when
+// the application setting "FacetorBridgeTools" is not 0.
 
 #include "app/sgobjexport.h"
 #include "bridge/sgfacbridge.h"
-#include "bridgetestsupport.h"
-#include "facetorroundtrip.h"
+#include "tests/support/sgtestmodal.h"
+#include "tests/support/sgtestprocess.h"
+#include "tests/support/sgtestscene.h"
 
+#include "sgcore/app/sgappsettings.h"
 #include "sgcore/app/sgmessagesink.h"
 #include "sgcore/geometry/sgobject.h"
 #include "sgcore/geometry/sgpolymesh.h"
@@ -17,19 +21,50 @@
 #include "sgcore/morph/sgmorphdeltas.h"
 #include "sgcore/properties/sgfloatproperty.h"
 #include "sgcore/scene/sgbone.h"
+#include "sgcore/scene/sgscene.h"
 #include "sgcore/scene/sgskeleton.h"
+#include "sgcore/widgets/sgbasicdialog.h"
 
-#include <QAbstractButton>
 #include <QComboBox>
+#include <QDialogButtonBox>
 #include <QElapsedTimer>
-#include <QFile>
 #include <QMainWindow>
 #include <QMessageBox>
-#include <QTemporaryDir>
+#include <QPushButton>
+#include <QTextBrowser>
 
 #include <gtest/gtest.h>
 
 namespace {
+
+class TestBridge : public SgFacBridge {
+public:
+    using SgFacBridge::executeAction;
+    using SgFacBridge::importReturnedShape;
+};
+
+// One round trip: the selected nodes go to the modeler, which applies `edit` and quits once
+// its returns have been read; `answers` answer the windows the import opens meanwhile.
+class RoundTrip : public SgTestModeler {
+public:
+    explicit RoundTrip(const QByteArray &edit)
+        : SgTestModeler(
+              FACETOR_BIN_DIR,
+              {{"FACETOR_EXPECT", "1"}, {"FACETOR_QUIT_WHEN_DONE", "1"}, {"FACETOR_EDIT", edit}}) {}
+    // Sends the selection and runs the event loop until the modeler has quit and every return
+    // has been imported; true when it did, and every answer was used.
+    bool run(QList<SgTestHandler> answers = {}) {
+        SgTestModalAnswer answer(answers, 30000);
+        TestBridge bridge;
+        bridge.executeAction();
+        const bool done =
+            bridge.isActive() &&
+            sgTestWaitUntil([&] { return !bridge.isActive() && bridge.pendingImports() == 0; },
+                            30000);
+        EXPECT_EQ(answer.answered(), answers.size()) << "a window was never opened";
+        return done;
+    }
+};
 
 SgMorph *morphOn(SgNode *node, const QString &name = QStringLiteral("MyMorph")) {
     return node && node->getObject()
@@ -41,43 +76,79 @@ int modifierCount(const SgNode *node) {
     return node->getObject() ? node->getObject()->getModifierCount() : 0;
 }
 
-// Answers the next "Changed Geometry" question with `button`, recording that it was asked.
-void answerChangedGeometry(QMessageBox::StandardButton button, int *asked) {
-    bridgetest::answerModal([button, asked](QWidget *modal) {
-        auto *box = qobject_cast<QMessageBox *>(modal);
-        ASSERT_NE(box, nullptr);
+// A figure of two bones, hip and then thigh, showing separate triangles.
+SgSkeleton *twoBoneFigure() {
+    auto *figure = new SgSkeleton(QStringLiteral("Body"));
+    auto *hip = sgTestNode<SgBone>(QStringLiteral("hip"),
+                                   sgTestPolygon({{0, 100, 3.25f}, {7, 100, 0}, {0, 112.5f, 0}}));
+    auto *thigh = sgTestNode<SgBone>(
+        QStringLiteral("thigh"), sgTestPolygon({{20, 100, 3.25f}, {27, 100, 0}, {20, 112.5f, 0}}));
+    figure->addBone(hip);
+    figure->addBone(thigh, hip);
+    return figure;
+}
+
+// Answers the "Changed Geometry" question with `button`.
+SgTestHandler changedGeometry(QMessageBox::StandardButton button) {
+    return sgTestAs<QMessageBox>([button](QMessageBox *box) {
         EXPECT_EQ(box->windowTitle(), QStringLiteral("Changed Geometry"));
-        ++*asked;
         box->button(button)->click();
     });
 }
 
+// Picks `action` in the dialog's "Action:" box.
+void pickAction(QWidget *dialog, const QString &action) {
+    auto *combo = dialog->findChild<QComboBox *>(QStringLiteral("FcBridgehAction"));
+    ASSERT_NE(combo, nullptr) << dialog->windowTitle().toStdString();
+    combo->setCurrentIndex(combo->findText(action));
+    emit combo->textActivated(action);
+}
+
 // Picks `action` in the bridge morph dialog and accepts it.
-void answerMorphDialog(const QString &action) {
-    bridgetest::answerModal([action](QWidget *modal) {
-        auto *combo = modal->findChild<QComboBox *>(QStringLiteral("FcBridgehAction"));
-        ASSERT_NE(combo, nullptr) << modal->windowTitle().toStdString();
-        combo->setCurrentIndex(combo->findText(action));
-        emit combo->textActivated(action);
+SgTestHandler morphDialog(const QString &action) {
+    return [action](QWidget *modal) {
+        pickAction(modal, action);
         qobject_cast<QDialog *>(modal)->accept();
-    });
+    };
+}
+
+QPushButton *okButton(QWidget *dialog) {
+    return static_cast<SgBasicDialog *>(dialog)->buttonBox()->button(QDialogButtonBox::Ok);
 }
 
 class ImportRoundTrip : public ::testing::Test {
 protected:
     void SetUp() override { sgApp->getScene()->clear(); }
     void TearDown() override {
-        EXPECT_EQ(bridgetest::cancelPendingAnswers(), 0) << "a question was never asked";
+        SgAppSettings().remove(QStringLiteral("FacetorBridgeTools"));
         sgApp->setInterface(nullptr);
         sgApp->getScene()->clear();
     }
     SgScene *scene() const { return sgApp->getScene(); }
+    // A selected prop "Cup" whose material "Skin" has the diffuse colour (10, 20, 30).
+    SgDefaultMaterial *selectedCup() {
+        scene()->addNode(sgTestProp(QStringLiteral("Cup"), {1, 2, 3}));
+        m_cup = scene()->findNodeByLabel(QStringLiteral("Cup"));
+        scene()->selectNode(m_cup);
+        auto *skin = static_cast<SgDefaultMaterial *>(
+            m_cup->getObject()->getCurrentShape()->findMaterial(QStringLiteral("Skin")));
+        skin->setDiffuseColor(QColor(10, 20, 30));
+        return skin;
+    }
+    // The "Target Importer" in its bridge mode takes the returns, in a window.
+    void useTargetImporter() {
+        sgApp->setInterface(&m_window);
+        SgAppSettings().setInt(QStringLiteral("FacetorBridgeTools"), 1);
+    }
+
+    QMainWindow m_window;
+    SgNode *m_cup = nullptr;
 };
 
 } // namespace
 
 TEST_F(ImportRoundTrip, EditedFigureGivesOneMorphPerMovedBoneDrivenByItsControl) {
-    SgSkeleton *figure = bridgetest::makeFigure(QStringLiteral("Body"));
+    SgSkeleton *figure = twoBoneFigure();
     scene()->addNode(figure);
     scene()->selectNode(figure);
     // Vertex 0 of the welded figure is the hip's first vertex; 0.5 modeler units are 5 host units.
@@ -93,13 +164,11 @@ TEST_F(ImportRoundTrip, EditedFigureGivesOneMorphPerMovedBoneDrivenByItsControl)
     EXPECT_EQ(morph->getValueChannel()->getLabel(), QStringLiteral("p_MyMorph"));
     EXPECT_TRUE(morph->getValueChannel()->isHidden());
     EXPECT_EQ(morph->getValueChannel()->getControllerCount(), 1);
-
     auto *control =
         dynamic_cast<SgFloatProperty *>(figure->findProperty(QStringLiteral("MyMorph")));
     ASSERT_NE(control, nullptr);
     EXPECT_FLOAT_EQ(control->getValue(), 1.0f);
     EXPECT_FLOAT_EQ(control->getMin(), -1.0f);
-    EXPECT_FLOAT_EQ(control->getMax(), 1.0f);
     EXPECT_TRUE(control->isClamped());
     EXPECT_EQ(control->getPath(), QStringLiteral("Morphs"));
     EXPECT_EQ(scene()->getNodeCount(), 3); // no prop
@@ -111,157 +180,133 @@ TEST_F(ImportRoundTrip, EditedFigureGivesOneMorphPerMovedBoneDrivenByItsControl)
     ASSERT_TRUE(reader.readFile(file)) << reader.getErrorString().toStdString();
     const SgPolyMesh *out = reader.getMesh();
     ASSERT_EQ(out->getVertexCount(), 6);
-    const SgVec3 moved = out->getVertex(0);
-    EXPECT_NEAR(moved.x, 0.0f, 1e-4);
-    EXPECT_NEAR(moved.y, 100.0f, 1e-4);
-    EXPECT_NEAR(moved.z, 8.25f, 1e-4);
+    EXPECT_NEAR(out->getVertex(0).z, 8.25f, 1e-4);
     for (int i = 1; i < 6; ++i) {
         const SgNode *bone = i < 3 ? hip : thigh;
         const SgVec3 rest = bone->getObject()->getCurrentShape()->getGeometry()->getVertex(i % 3);
-        EXPECT_NEAR(out->getVertex(i).x, rest.x, 1e-4) << i;
-        EXPECT_NEAR(out->getVertex(i).y, rest.y, 1e-4) << i;
-        EXPECT_NEAR(out->getVertex(i).z, rest.z, 1e-4) << i;
+        for (int k = 0; k < 3; ++k)
+            EXPECT_NEAR(out->getVertex(i)[k], rest[k], 1e-4) << i;
     }
     control->setValue(0.0f);
     EXPECT_NEAR(hip->getObject()->getCachedGeom()->getVertex(0).z, 3.25f, 1e-4);
 }
 
-TEST_F(ImportRoundTrip, UnchangedFigureGivesNoMorphAndAnswersDecideAboutAProp) {
-    SgSkeleton *figure = bridgetest::makeFigure(QStringLiteral("Body"));
+TEST_F(ImportRoundTrip, AReturnThatCannotBeAMorphAsksWhetherToMakeAProp) {
+    SgSkeleton *figure = twoBoneFigure();
     scene()->addNode(figure);
     scene()->selectNode(figure);
-    int asked = 0;
-    {
-        RoundTrip trip("move=0,0,0");
-        answerChangedGeometry(QMessageBox::No, &asked);
-        ASSERT_TRUE(trip.run()) << trip.log().toStdString();
-    }
-    EXPECT_EQ(asked, 1);
+    // Unchanged: no morph; "No" keeps the scene as it was, the control property included.
+    ASSERT_TRUE(RoundTrip("move=0,0,0").run({changedGeometry(QMessageBox::No)}));
     EXPECT_EQ(scene()->getNodeCount(), 3);
     for (SgBone *bone : figure->getAllBones())
         EXPECT_EQ(modifierCount(bone), 0);
-    // The figure is as it was: the import took its control property back.
     EXPECT_EQ(figure->findProperty(QStringLiteral("MyMorph")), nullptr);
-
-    {
-        RoundTrip trip("move=0,0,0");
-        answerChangedGeometry(QMessageBox::Yes, &asked);
-        ASSERT_TRUE(trip.run()) << trip.log().toStdString();
-    }
-    EXPECT_EQ(asked, 2);
+    ASSERT_TRUE(RoundTrip("move=0,0,0").run({changedGeometry(QMessageBox::Yes)}));
     EXPECT_NE(scene()->findNodeByLabel(QStringLiteral("Body (1)")), nullptr);
     EXPECT_EQ(figure->findProperty(QStringLiteral("MyMorph")), nullptr);
-}
+    scene()->clear();
 
-TEST_F(ImportRoundTrip, EditedPropGetsAMorph) {
-    scene()->addNode(bridgetest::makeProp(QStringLiteral("Cup"), {1, 2, 3}));
-    SgNode *cup = scene()->findNodeByLabel(QStringLiteral("Cup"));
-    scene()->selectNode(cup);
-    {
-        RoundTrip trip("move=0,0.25,0");
-        ASSERT_TRUE(trip.run()) << trip.log().toStdString();
-    }
-    SgMorph *morph = morphOn(cup);
-    ASSERT_NE(morph, nullptr);
-    EXPECT_EQ(morph->getDeltas()->getNumEntries(), 3);
-    morph->getValueChannel()->setValue(1.0f);
-    EXPECT_NEAR(cup->getObject()->getCachedGeom()->getVertex(0).y, 4.5f, 1e-4);
+    // A fourth vertex: "No" changes nothing, "Yes" makes a prop of the returned shape.
+    selectedCup();
+    ASSERT_TRUE(RoundTrip("extra=0,0,5").run({changedGeometry(QMessageBox::No)}));
     EXPECT_EQ(scene()->getNodeCount(), 1);
-}
-
-TEST_F(ImportRoundTrip, ChangedVertexCountAsksAndYesMakesAProp) {
-    scene()->addNode(bridgetest::makeProp(QStringLiteral("Cup"), {1, 2, 3}));
-    SgNode *cup = scene()->findNodeByLabel(QStringLiteral("Cup"));
-    scene()->selectNode(cup);
-    int asked = 0;
-    // The modeler adds a fourth vertex (with a triangle over it): no morph can be made.
-    {
-        RoundTrip trip("extra=0,0,5");
-        answerChangedGeometry(QMessageBox::No, &asked);
-        ASSERT_TRUE(trip.run()) << trip.log().toStdString();
-    }
-    EXPECT_EQ(asked, 1);
-    EXPECT_EQ(scene()->getNodeCount(), 1);
-    EXPECT_EQ(modifierCount(cup), 0);
-    EXPECT_EQ(cup->getObject()->getCurrentShape()->getGeometry()->getVertexCount(), 3);
-
-    {
-        RoundTrip trip("extra=0,0,5");
-        answerChangedGeometry(QMessageBox::Yes, &asked);
-        ASSERT_TRUE(trip.run()) << trip.log().toStdString();
-    }
-    EXPECT_EQ(asked, 2);
-    EXPECT_EQ(modifierCount(cup), 0);
+    EXPECT_EQ(modifierCount(m_cup), 0);
+    EXPECT_EQ(m_cup->getObject()->getCurrentShape()->getGeometry()->getVertexCount(), 3);
+    ASSERT_TRUE(RoundTrip("extra=0,0,5").run({changedGeometry(QMessageBox::Yes)}));
+    EXPECT_EQ(modifierCount(m_cup), 0);
     SgNode *prop = scene()->findNodeByLabel(QStringLiteral("Cup (1)"));
     ASSERT_NE(prop, nullptr);
     const SgVertexMesh *mesh = prop->getObject()->getCurrentShape()->getGeometry();
     ASSERT_EQ(mesh->getVertexCount(), 4);
     EXPECT_NEAR(mesh->getVertex(3).z, 50.0f, 1e-4);
-    EXPECT_EQ(scene()->getNodeCount(), 2);
-}
+    scene()->clear();
 
-TEST_F(ImportRoundTrip, SameLabelsAreTriedInSceneOrder) {
-    // The first Cup in scene order has four vertices; the one sent has three.
-    auto *first = new SgNode(QStringLiteral("Cup"));
-    auto *object = new SgObject(QStringLiteral("Cup"));
-    object->addShape(bridgetest::makeShape(
-        QStringLiteral("Cup"), bridgetest::makeMesh({{0, 0, 0}, {1, 0, 0}, {1, 1, 0}, {0, 1, 0}})));
-    first->setObject(object);
+    // Namesakes are tried in scene order: the first Cup has four vertices, the one sent three.
+    auto *first = sgTestNode(QStringLiteral("Cup"),
+                             sgTestPolygon({{0, 0, 0}, {1, 0, 0}, {1, 1, 0}, {0, 1, 0}}));
     scene()->addNode(first);
-    scene()->addNode(bridgetest::makeProp(QStringLiteral("Cup")));
+    scene()->addNode(sgTestProp(QStringLiteral("Cup")));
     SgNode *second = scene()->getNode(1);
     scene()->selectNode(second);
-    int asked = 0;
-    RoundTrip trip("move=0.5,0,0");
-    answerChangedGeometry(QMessageBox::Yes, &asked);
-    ASSERT_TRUE(trip.run()) << trip.log().toStdString();
-    EXPECT_EQ(asked, 1);
+    ASSERT_TRUE(RoundTrip("move=0.5,0,0").run({changedGeometry(QMessageBox::Yes)}));
     EXPECT_EQ(modifierCount(first), 0);
-    ASSERT_NE(morphOn(second), nullptr);
+    EXPECT_NE(morphOn(second), nullptr);
     EXPECT_EQ(scene()->getNodeCount(), 2);
 }
 
-TEST_F(ImportRoundTrip, DialogChoosesMaterialsOrMorphAndMaterials) {
-    QMainWindow window;
-    sgApp->setInterface(&window);
-    scene()->addNode(bridgetest::makeProp(QStringLiteral("Cup")));
-    SgNode *cup = scene()->getNode(0);
-    auto *skin = static_cast<SgDefaultMaterial *>(
-        cup->getObject()->getCurrentShape()->findMaterial(QStringLiteral("Skin")));
-    ASSERT_NE(skin, nullptr);
-    skin->setDiffuseColor(QColor(10, 20, 30));
+TEST_F(ImportRoundTrip, TheImportDialogsChooseMaterialsMorphOrProp) {
+    sgApp->setInterface(&m_window);
+    SgDefaultMaterial *skin = selectedCup();
     const QColor specular = skin->getSpecularColor();
-    scene()->selectNode(cup);
-    {
-        RoundTrip trip("diffuse=1,0,0;move=0,1,0");
-        answerMorphDialog(QStringLiteral("Copy Materials"));
-        ASSERT_TRUE(trip.run()) << trip.log().toStdString();
-    }
+    ASSERT_TRUE(RoundTrip("diffuse=1,0,0;move=0,1,0").run({morphDialog("Copy Materials")}));
     EXPECT_EQ(skin->getDiffuseColor(), QColor(255, 0, 0));
     EXPECT_EQ(skin->getSpecularColor(), specular);
-    EXPECT_EQ(modifierCount(cup), 0);
-    EXPECT_EQ(scene()->getNodeCount(), 1);
-
-    skin->setDiffuseColor(QColor(10, 20, 30));
-    {
-        RoundTrip trip("diffuse=0,1,0;move=0,1,0");
-        answerMorphDialog(QStringLiteral("Create Morph And Copy Materials"));
-        ASSERT_TRUE(trip.run()) << trip.log().toStdString();
-    }
+    EXPECT_EQ(modifierCount(m_cup), 0);
+    ASSERT_TRUE(RoundTrip("diffuse=0,1,0;move=0,1,0")
+                    .run({morphDialog("Create Morph And Copy Materials")}));
     EXPECT_EQ(skin->getDiffuseColor(), QColor(0, 255, 0));
-    ASSERT_NE(morphOn(cup, QStringLiteral("My Morph")), nullptr);
-    EXPECT_EQ(morphOn(cup, QStringLiteral("My Morph"))->getValueChannel()->getPath(),
+    ASSERT_NE(morphOn(m_cup, QStringLiteral("My Morph")), nullptr);
+    EXPECT_EQ(morphOn(m_cup, QStringLiteral("My Morph"))->getValueChannel()->getPath(),
               QStringLiteral("Morphs/FacetorBridge"));
-
     // A cancelled dialog leaves everything as it was.
-    {
-        RoundTrip trip("diffuse=0,0,1;move=0,1,0");
-        bridgetest::answerModal([](QWidget *modal) { qobject_cast<QDialog *>(modal)->reject(); });
-        ASSERT_TRUE(trip.run()) << trip.log().toStdString();
-    }
+    ASSERT_TRUE(RoundTrip("diffuse=0,0,1;move=0,1,0").run({[](QWidget *modal) {
+        qobject_cast<QDialog *>(modal)->reject();
+    }}));
     EXPECT_EQ(skin->getDiffuseColor(), QColor(0, 255, 0));
-    EXPECT_EQ(modifierCount(cup), 1);
+    EXPECT_EQ(modifierCount(m_cup), 1);
     EXPECT_EQ(scene()->getNodeCount(), 1);
+    scene()->clear();
+
+    // The "Target Importer" in bridge mode: one in-memory source, no file buttons; cancelled,
+    // nothing changes.
+    useTargetImporter();
+    skin = selectedCup();
+    ASSERT_TRUE(RoundTrip("diffuse=0,0,1;move=0,1,0").run({[](QWidget *modal) {
+        EXPECT_EQ(modal->windowTitle(), QStringLiteral("Target Importer"));
+        EXPECT_EQ(modal->findChild<QPushButton *>(QStringLiteral("MorphLoaderBrowseBtn")), nullptr);
+        qobject_cast<QDialog *>(modal)->reject();
+    }}));
+    EXPECT_EQ(modifierCount(m_cup), 0);
+    EXPECT_EQ(skin->getDiffuseColor(), QColor(10, 20, 30));
+    // Morph and materials: the run makes the morph and shows its log; the materials are copied
+    // when the dialog closes.
+    ASSERT_TRUE(RoundTrip("diffuse=0,1,0;move=0,1,0").run({[&](QWidget *modal) {
+        pickAction(modal, QStringLiteral("Create Morph And Copy Materials"));
+        okButton(modal)->click();
+        auto *log = modal->findChild<QTextBrowser *>(QStringLiteral("MorphLoaderLog"));
+        ASSERT_NE(log, nullptr);
+        EXPECT_TRUE(log->isVisible());
+        EXPECT_EQ(modifierCount(m_cup), 1) << log->toPlainText().toStdString();
+        EXPECT_EQ(skin->getDiffuseColor(), QColor(10, 20, 30));
+        okButton(modal)->click();
+    }}));
+    EXPECT_EQ(skin->getDiffuseColor(), QColor(0, 255, 0));
+    ASSERT_EQ(modifierCount(m_cup), 1);
+    EXPECT_EQ(
+        static_cast<SgMorph *>(m_cup->getObject()->getModifier(0))->getDeltas()->getNumEntries(),
+        3);
+    // "Create Prop" closes at once and makes a prop.
+    ASSERT_TRUE(RoundTrip("move=0,1,0").run({[](QWidget *modal) {
+        pickAction(modal, QStringLiteral("Create Prop"));
+        EXPECT_FALSE(
+            modal->findChild<QWidget *>(QStringLiteral("MorphLoaderSourceList"))->isEnabled());
+        okButton(modal)->click();
+    }}));
+    EXPECT_EQ(modifierCount(m_cup), 1);
+    EXPECT_NE(scene()->findNodeByLabel(QStringLiteral("Cup (1)")), nullptr);
+    // A shape without geometry opens the dialog in file mode, which deals with it.
+    bool fileMode = false;
+    SgTestModalAnswer answer([&fileMode](QWidget *modal) {
+        fileMode =
+            modal->findChild<QPushButton *>(QStringLiteral("MorphLoaderBrowseBtn")) != nullptr &&
+            modal->findChild<QComboBox *>(QStringLiteral("FcBridgehAction")) == nullptr;
+        okButton(modal)->click(); // runs the empty list
+        okButton(modal)->click();
+    });
+    SgPolyShape shape(QStringLiteral("Cup"));
+    EXPECT_TRUE(TestBridge().importReturnedShape(&shape, m_cup));
+    EXPECT_TRUE(fileMode);
+    EXPECT_EQ(modifierCount(m_cup), 1);
 }
 
 TEST_F(ImportRoundTrip, ExampleFigureAndPropComeBackAsMorphsInTime) {
@@ -275,7 +320,7 @@ TEST_F(ImportRoundTrip, ExampleFigureAndPropComeBackAsMorphsInTime) {
     scene()->selectNode(figure);
     scene()->selectNode(box, true);
     RoundTrip trip("move=0,0.5,0");
-    qputenv("FACETOR_EXPECT", "2");
+    trip.set("FACETOR_EXPECT", "2");
     // From the send (the modeler's launch included) to each node's morph.
     QElapsedTimer clock;
     clock.start();
@@ -284,7 +329,7 @@ TEST_F(ImportRoundTrip, ExampleFigureAndPropComeBackAsMorphsInTime) {
     qint64 figureMs = -1;
     qint64 boxMs = -1;
     SgNode *hip = scene()->findNodeByLabel(QStringLiteral("hip"));
-    ASSERT_TRUE(bridgetest::waitUntil(
+    ASSERT_TRUE(sgTestWaitUntil(
         [&] {
             if (figureMs < 0 && morphOn(hip))
                 figureMs = clock.elapsed();
@@ -298,6 +343,10 @@ TEST_F(ImportRoundTrip, ExampleFigureAndPropComeBackAsMorphsInTime) {
     ASSERT_GE(boxMs, 0) << trip.log().toStdString();
     for (SgBone *bone : static_cast<SgSkeleton *>(figure)->getAllBones())
         EXPECT_NE(morphOn(bone), nullptr) << bone->getLabel().toStdString();
+    // The prop's morph moves it by the edit: 0.5 modeler units are 5 host units.
+    const float restY = box->getObject()->getCurrentShape()->getGeometry()->getVertex(0).y;
+    morphOn(box)->getValueChannel()->setValue(1.0f);
+    EXPECT_NEAR(box->getObject()->getCachedGeom()->getVertex(0).y, restY + 5.0f, 1e-4);
     std::printf("round trip from send to morph: figure %lld ms, prop %lld ms (modeler launch "
                 "included)\n",
                 figureMs, boxMs);

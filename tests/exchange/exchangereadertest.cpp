@@ -66,10 +66,10 @@ std::vector<Facet> facetsByKind(const SgPolyMesh &mesh, bool withUVs) {
 } // namespace
 
 TEST_F(ExchangeReaderTest, ReturnedRecordBecomesAShape) {
-    SgPolyMesh *mesh =
-        makeMesh({{1, 2, 3}, {0, 0, 0}, {1, 0, 0}, {0, 1, 0}, {1, 1, 0}}, {{0.5f, 0.25f}, {1, 1}});
-    addFacet(*mesh, 1, {{0, 1}, {1, 0}, {2, -1}});
-    addFacet(*mesh, 0, {{1, 0}, {2, 0}, {4, 1}, {3, 1}});
+    SgPolyMesh *mesh = sgTestMesh({{1, 2, 3}, {0, 0, 0}, {1, 0, 0}, {0, 1, 0}, {1, 1, 0}},
+                                  {{0.5f, 0.25f}, {1, 1}});
+    sgTestAddFacet(*mesh, 1, {{0, 1}, {1, 0}, {2, -1}});
+    sgTestAddFacet(*mesh, 0, {{1, 0}, {2, 0}, {4, 1}, {3, 1}});
     std::unique_ptr<SgPolyMesh> owner(mesh);
     SgReturnMaterial skin;
     skin.name = "skin";
@@ -180,10 +180,10 @@ TEST_F(ExchangeReaderTest, FigureRoundTripKeepsVerticesUVsAndFacetOrder) {
         std::vector<SgVec3> moved = points;
         for (SgVec3 &p : moved)
             p += SgVec3(100.0f * float(b + 1), 0, 0);
-        SgPolyMesh *mesh = makeMesh(moved, uvs);
-        addFacet(*mesh, 1, {{0, 0}, {1, 1}, {2, 2}});
-        addFacet(*mesh, 0, {{0, 0}, {1, 1}, {3, 3}, {2, 2}});
-        addFacet(*mesh, 0, {{1, 1}, {3, 3}, {2, 2}});
+        SgPolyMesh *mesh = sgTestMesh(moved, uvs);
+        sgTestAddFacet(*mesh, 1, {{0, 0}, {1, 1}, {2, 2}});
+        sgTestAddFacet(*mesh, 0, {{0, 0}, {1, 1}, {3, 3}, {2, 2}});
+        sgTestAddFacet(*mesh, 0, {{1, 1}, {3, 3}, {2, 2}});
         auto *shape = new SgPolyShape(bone->getName());
         shape->setPolyMesh(mesh);
         shape->addMaterial(new SgDefaultMaterial(b == 0 ? "skin" : "nails"));
