@@ -6,6 +6,7 @@
 #include "tests/support/sgtestmodal.h"
 #include "tests/support/sgtestprocess.h"
 #include "tests/support/sgtestscene.h"
+#include "tests/support/sgtestsegment.h"
 
 #include "exchange/shm/sgcontrolrecord.h"
 #include "exchange/shm/sgsharedmemory.h"
@@ -233,7 +234,7 @@ TEST_F(BridgeAction, AMissingModelerIsLoggedAndRemovedNodesLeaveTheSendList) {
     EXPECT_EQ(bridge.sendList().count(), 0);
 
     // While another host holds the link the user is told, and no modeler starts.
-    SgSharedMemory otherHost(kSgHostLinkKey);
+    SgTestSegment otherHost(kSgHostLinkKey);
     ASSERT_TRUE(otherHost.create(8));
     scene()->addNode(sgTestProp(QStringLiteral("Cup")));
     scene()->selectNode(scene()->findNodeByLabel(QStringLiteral("Cup")));
@@ -351,7 +352,7 @@ TEST_F(BridgeAction, AHeldLockCostsOneWaitAndALostRecordEndsTheExchange) {
 
     // While the modeler holds the control lock a step waits for it once and posts nothing.
     {
-        SgSharedMemory modeler(kSgControlSegmentKey);
+        SgTestSegment modeler(kSgControlSegmentKey);
         ASSERT_TRUE(modeler.attach(SgSharedMemory::kReadWrite));
         ASSERT_TRUE(modeler.tryLock(0));
         QElapsedTimer clock;
@@ -376,7 +377,7 @@ TEST_F(BridgeAction, AHeldLockCostsOneWaitAndALostRecordEndsTheExchange) {
     peer.post(SgModelerMessage::SendSelection);
     bridge->checkSharedMap();
     EXPECT_TRUE(bridge->isExchangeBusy());
-    SgSharedMemory restarted(kSgControlSegmentKey);
+    SgTestSegment restarted(kSgControlSegmentKey);
     ASSERT_TRUE(restarted.attach(SgSharedMemory::kReadWrite));
     peer.post(SgModelerMessage::SendSelection);
     bridge->checkSharedMap();
@@ -403,7 +404,7 @@ TEST_F(BridgeAction, AHeldLockCostsOneWaitAndALostRecordEndsTheExchange) {
 
 TEST_F(BridgeAction, TheHostSwitchLinksWithoutRewritingTheRecord) {
     // The modeler that started the host has set the record up and asks for the selection.
-    SgSharedMemory modeler(kSgControlSegmentKey);
+    SgTestSegment modeler(kSgControlSegmentKey);
     ASSERT_TRUE(modeler.create(16));
     ASSERT_TRUE(modeler.attach(SgSharedMemory::kReadWrite));
     SgControlRecord asking = SgControlRecord::fresh();
@@ -449,7 +450,7 @@ TEST_F(BridgeAction, ReturnsAreAcknowledgedFirstThenImportedOrRefused) {
             returned.corners = {{0, -1, -1}, {1, -1, -1}, {2, -1, -1}};
         }
         const QByteArray record = SgFacetorReturn::encode(returned);
-        SgSharedMemory data(kSgDataSegmentKey);
+        SgTestSegment data(kSgDataSegmentKey);
         ASSERT_TRUE(data.create(int32_t(record.size())));
         ASSERT_TRUE(data.attach(SgSharedMemory::kReadWrite));
         std::memcpy(data.data(), record.constData(), size_t(record.size()));
@@ -498,7 +499,7 @@ TEST_F(BridgeAction, AReturnWhoseLockTheModelerKeepsCostsShortStepsAndIsGivenUp)
     returned.vertices = {0, 0, 0, 2, 0, 0, 0, 4, 0};
     returned.materials.append(SgExchangeNode::Material{});
     const QByteArray record = SgFacetorReturn::encode(returned);
-    SgSharedMemory data(kSgDataSegmentKey);
+    SgTestSegment data(kSgDataSegmentKey);
     ASSERT_TRUE(data.create(int32_t(record.size())));
     ASSERT_TRUE(data.attach(SgSharedMemory::kReadWrite));
     std::memcpy(data.data(), record.constData(), size_t(record.size()));

@@ -6,6 +6,7 @@
 #include "bridge/sgfacbridge.h"
 #include "tests/support/sgtestprocess.h"
 #include "tests/support/sgtestscene.h"
+#include "tests/support/sgtestsegment.h"
 
 #include "exchange/sgexchangereader.h"
 #include "exchange/shm/sgcontrolrecord.h"
@@ -243,7 +244,7 @@ TEST(ModelerRelease, AReturnReleasedInFlightComesAgain) {
     shape.write("o Shape\nv 0 0 0\nv 1 0 0\nv 0 1 0\nf 1 2 3\n");
     shape.close();
 
-    SgSharedMemory control(kSgControlSegmentKey);
+    SgTestSegment control(kSgControlSegmentKey);
     ASSERT_TRUE(control.create(sizeof(SgControlRecord)));
     ASSERT_TRUE(control.attach(SgSharedMemory::kReadWrite));
     const SgControlRecord fresh = SgControlRecord::fresh();
@@ -295,9 +296,9 @@ TEST(ModelerRelease, AReturnReleasedInFlightComesAgain) {
                     QThread::msleep(5);
                 continue;
             }
-            SgSharedMemory data(kSgDataSegmentKey);
+            SgTestSegment data(kSgDataSegmentKey);
             ASSERT_TRUE(data.attach(SgSharedMemory::kReadWrite));
-            data.lock();
+            ASSERT_TRUE(data.lock()) << kSgTestStuckLock;
             QString trailer;
             std::unique_ptr<SgPolyShape> read(
                 SgExchangeReader(data.data(), size_t(data.size())).readShape(trailer));

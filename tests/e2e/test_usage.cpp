@@ -14,6 +14,7 @@
 #include "bridge/sgfacbridge.h"
 #include "tests/support/sgtestprocess.h"
 #include "tests/support/sgtestscene.h"
+#include "tests/support/sgtestsegment.h"
 
 #include "exchange/shm/sgcontrolrecord.h"
 #include "exchange/shm/sgsharedmemory.h"
@@ -505,7 +506,7 @@ TEST(UsageTest, ASittingKeepsTheLinkWholeAndTheSceneSound) {
     sgApp->getMessageSink()->clear();
     // Names that a crashed earlier run left without a holder go when they are opened afresh.
     for (const char *key : {kSgControlSegmentKey, kSgDataSegmentKey, kSgHostLinkKey}) {
-        SgSharedMemory stale(key);
+        SgTestSegment stale(key);
         if (stale.create(8) && stale.lock())
             stale.unlock();
         stale.remove(SgSharedMemory::kRemoveUnlocked);
