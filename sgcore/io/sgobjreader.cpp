@@ -19,6 +19,7 @@
 #include <limits>
 #include <optional>
 #include <string_view>
+#include <type_traits>
 
 namespace {
 
@@ -120,11 +121,11 @@ private:
         const char *p = m_p;
         const char *end = nullptr;
         if (p[0] == 'v' && p[1] == ' ') {
-            end = readVertexRun();
+            end = readNumberRun("v ", m_vertices);
         } else if (p[0] == 'f' && p[1] == ' ') {
             end = readFaceRun();
         } else if (p[0] == 'v' && p[1] == 't' && p[2] == ' ') {
-            end = readUVRun();
+            end = readNumberRun("vt ", m_uvs);
         }
         if (!end || end == m_p) {
             return false;
@@ -150,27 +151,21 @@ private:
         return p;
     }
 
-    const char *readVertexRun() {
-        SgBatchAppender<SgVec3> out(m_vertices);
-        return readRun("v ", [&](const char *p) {
-            float xyz[3];
-            const char *next = SgObjPlainLine::vertex(p, xyz);
+    // A run of "v" lines (three numbers each) or "vt" lines (two) into `items`.
+    template <typename T>
+    const char *readNumberRun(std::string_view keyword, std::vector<T> &items) {
+        constexpr bool vertices = std::is_same_v<T, SgVec3>;
+        SgBatchAppender<T> out(items);
+        return readRun(keyword, [&](const char *p) {
+            float v[3];
+            const char *next = vertices ? SgObjPlainLine::vertex(p, v) : SgObjPlainLine::uv(p, v);
             if (next) {
-                reserveFor(m_vertices, p - 1, next);
-                out.push(SgVec3(xyz[0], xyz[1], xyz[2]));
-            }
-            return next;
-        });
-    }
-
-    const char *readUVRun() {
-        SgBatchAppender<SgVec2> out(m_uvs);
-        return readRun("vt ", [&](const char *p) {
-            float uv[2];
-            const char *next = SgObjPlainLine::uv(p, uv);
-            if (next) {
-                reserveFor(m_uvs, p - 2, next);
-                out.push(SgVec2(uv[0], uv[1]));
+                reserveFor(items, p + 1 - keyword.size(), next);
+                if constexpr (vertices) {
+                    out.push(SgVec3(v[0], v[1], v[2]));
+                } else {
+                    out.push(SgVec2(v[0], v[1]));
+                }
             }
             return next;
         });
@@ -195,6 +190,7 @@ private:
             return m_p;
         }
         const auto material = static_cast<uint8_t>(m_material);
+        // The batches end (and append what they hold) before the run returns.
         std::optional<FacetBatch<3>> triangles;
         std::optional<FacetBatch<4>> quads;
         return readRun("f ", [&](const char *p) {
@@ -213,15 +209,15 @@ private:
             if (n == 3) {
                 if (!triangles) {
                     triangles.emplace(m_mesh->triangleCorners(), m_mesh->triangleMaterials(),
-                                      m_mesh->triangleGroups());
+                                      m_mesh->triangleGroups(), material, m_group);
                 }
-                triangles->push(m_corners.data(), material, m_group);
+                triangles->push(m_corners.data());
             } else if (n == 4) {
                 if (!quads) {
                     quads.emplace(m_mesh->quadCorners(), m_mesh->quadMaterials(),
-                                  m_mesh->quadGroups());
+                                  m_mesh->quadGroups(), material, m_group);
                 }
-                quads->push(m_corners.data(), material, m_group);
+                quads->push(m_corners.data());
             } else {
                 addFace(size_t(n));
             }
@@ -229,24 +225,35 @@ private:
         });
     }
 
-    // The corners, materials and groups of facets of `corners` corners, appended in batches.
+    // Facets of `corners` corners in one material and group: their corners appended in
+    // batches, their materials and groups all at once at the end.
     template <size_t corners> class FacetBatch {
     public:
         FacetBatch(std::vector<SgFaceCorner> &toCorners, std::vector<uint8_t> &toMaterials,
-                   std::vector<int32_t> &toGroups)
-            : m_corners(toCorners), m_materials(toMaterials), m_groups(toGroups) {}
-        void push(const SgFaceCorner *c, uint8_t material, int32_t group) {
+                   std::vector<int32_t> &toGroups, uint8_t material, int32_t group)
+            : m_corners(toCorners), m_materials(toMaterials), m_groups(toGroups),
+              m_material(material), m_group(group) {}
+        ~FacetBatch() {
+            m_materials.insert(m_materials.end(), m_count, m_material);
+            m_groups.insert(m_groups.end(), m_count, m_group);
+        }
+        FacetBatch(const FacetBatch &) = delete;
+        FacetBatch &operator=(const FacetBatch &) = delete;
+
+        void push(const SgFaceCorner *c) {
             for (size_t k = 0; k < corners; ++k) {
                 m_corners.push(c[k]);
             }
-            m_materials.push(material);
-            m_groups.push(group);
+            ++m_count;
         }
 
     private:
         SgBatchAppender<SgFaceCorner, 256 * corners> m_corners;
-        SgBatchAppender<uint8_t, 256> m_materials;
-        SgBatchAppender<int32_t, 256> m_groups;
+        std::vector<uint8_t> &m_materials;
+        std::vector<int32_t> &m_groups;
+        uint8_t m_material;
+        int32_t m_group;
+        size_t m_count = 0;
     };
 
     void noteReference(std::uint32_t index, int64_t &maxRef, int &maxRefLine) const {

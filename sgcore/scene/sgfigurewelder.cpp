@@ -409,32 +409,37 @@ void SgFigureWelder::build(SgSkeleton *figure, bool ignoreInvisible, bool weldGe
         s.weldIndex.reserve(size_t(n));
         const int32_t *seam = seams[b].data();
         const int32_t *seamEnd = seam + seams[b].size();
-        for (int32_t i = 0; i < n; ++i) {
-            const bool onSeam = seam != seamEnd && *seam == i;
-            seam += onSeam;
-            if (!used[size_t(i)]) {
-                s.unused.push_back(i);
-                if (removeUnused) {
-                    s.weldIndex.push_back(-1);
-                    continue;
+        auto nextWelded = static_cast<int32_t>(wv.size()); // the index of the next new one
+        {
+            SgBatchAppender<SgVec3> positions(wv);
+            SgBatchAppender<int32_t> weldIndex(s.weldIndex);
+            for (int32_t i = 0; i < n; ++i) {
+                const bool onSeam = seam != seamEnd && *seam == i;
+                seam += onSeam;
+                if (!used[size_t(i)]) {
+                    s.unused.push_back(i);
+                    if (removeUnused) {
+                        weldIndex.push(-1);
+                        continue;
+                    }
                 }
-            }
-            const SgVec3 &p = s.source[size_t(i)];
-            const auto added = static_cast<int32_t>(wv.size());
-            int32_t w = added;
-            if (onSeam) {
-                PositionTable::Slot &slot = table.slotFor(p);
-                if (slot.index < 0) {
-                    slot = {p, added, int32_t(b)};
-                } else if (slot.lastBone != int32_t(b)) {
-                    w = slot.index;
-                    slot.lastBone = int32_t(b);
+                const SgVec3 &p = s.source[size_t(i)];
+                int32_t w = nextWelded;
+                if (onSeam) {
+                    PositionTable::Slot &slot = table.slotFor(p);
+                    if (slot.index < 0) {
+                        slot = {p, nextWelded, int32_t(b)};
+                    } else if (slot.lastBone != int32_t(b)) {
+                        w = slot.index;
+                        slot.lastBone = int32_t(b);
+                    }
                 }
+                if (w == nextWelded) {
+                    positions.push(p);
+                    ++nextWelded;
+                }
+                weldIndex.push(w);
             }
-            if (w == added) {
-                wv.push_back(p);
-            }
-            s.weldIndex.push_back(w);
         }
         s.outStart = outStart;
         outStart += n;

@@ -13,8 +13,11 @@
 #include <dirent.h>
 #include <fcntl.h>
 #include <memory>
+#include <sched.h>
 #include <sys/mman.h>
+#include <sys/mount.h>
 #include <sys/stat.h>
+#include <sys/wait.h>
 #include <thread>
 #include <unistd.h>
 #include <vector>
@@ -194,4 +197,53 @@ TEST(SgSharedMemoryPosix, ManyProcessesChurningOneKeyLoseNoUpdate) {
     EXPECT_TRUE(memory.remove(SgSharedMemory::kRemoveLocked));
     EXPECT_TRUE(objectsOf(anchored).empty());
     EXPECT_TRUE(objectsOf(loose).empty());
+}
+
+TEST(SgSharedMemoryPosix, BigSegmentsFillWholeAndTooLittleRoomFailsTheCreate) {
+    // A big segment (mapped and unmapped with a helper thread) holds every byte written, reads
+    // the same through a second attachment, and its key is free again at once after removal.
+    const std::string key = uniqueKey("big");
+    const std::int32_t size = 24 << 20;
+    for (int round = 0; round < 2; ++round) {
+        {
+            SgSharedMemory writer(key);
+            ASSERT_TRUE(writer.create(size)) << round;
+            ASSERT_TRUE(writer.attach(SgSharedMemory::kReadWrite));
+            for (std::int32_t i = 0; i < size; i += 4096)
+                writer.data()[i] = static_cast<std::uint8_t>(i / 4096 + round);
+            SgSharedMemory reader(key);
+            ASSERT_TRUE(reader.attach(SgSharedMemory::kReadOnly));
+            for (std::int32_t i = 0; i < size; i += 4096)
+                ASSERT_EQ(reader.data()[i], static_cast<std::uint8_t>(i / 4096 + round)) << i;
+            EXPECT_TRUE(reader.detach());
+            EXPECT_TRUE(writer.detach());
+            EXPECT_TRUE(writer.remove(SgSharedMemory::kRemoveUnlocked));
+        }
+        EXPECT_TRUE(objectsOf(key).empty());
+    }
+
+    // Where /dev/shm has too little room the create fails and leaves nothing, instead of a
+    // writer that dies of SIGBUS halfway through the record (a private mount of a small
+    // /dev/shm, in a child that may make one).
+    const pid_t child = fork();
+    ASSERT_GE(child, 0);
+    if (child == 0) {
+        if (unshare(CLONE_NEWNS) != 0 ||
+            mount(nullptr, "/", nullptr, MS_REC | MS_PRIVATE, nullptr) ||
+            mount("sgtest", "/dev/shm", "tmpfs", 0, "size=1m") != 0)
+            _exit(77);
+        SgSharedMemory tooBig(key);
+        const bool refused = !tooBig.create(4 << 20) &&
+                             tooBig.status() == SgSharedMemory::StatusFailed &&
+                             objectsOf(key).empty();
+        SgSharedMemory fits(key);
+        const bool created = fits.create(256 << 10) && fits.remove(SgSharedMemory::kRemoveUnlocked);
+        _exit(refused && created ? 0 : 1);
+    }
+    int status = 0;
+    ASSERT_EQ(waitpid(child, &status, 0), child);
+    ASSERT_TRUE(WIFEXITED(status));
+    if (WEXITSTATUS(status) == 77)
+        GTEST_SKIP() << "no private mount of /dev/shm can be made here";
+    EXPECT_EQ(WEXITSTATUS(status), 0);
 }
