@@ -3,15 +3,20 @@
 // through a second view of the control segment, or by a stand-in program that only sleeps.
 
 #include "bridge/sgfacbridge.h"
-#include "bridgetestsupport.h"
+#include "tests/support/sgtestmodal.h"
+#include "tests/support/sgtestprocess.h"
+#include "tests/support/sgtestscene.h"
+#include "tests/support/sgtestsegment.h"
 
 #include "exchange/shm/sgcontrolrecord.h"
 #include "exchange/shm/sgsharedmemory.h"
 #include "facetor/sgfacetorreturn.h"
 #include "sgcore/app/sgmessagesink.h"
+#include "sgcore/materials/sgdefaultmaterial.h"
 #include "sgcore/materials/sgtexture.h"
 #include "sgcore/properties/sgcolorproperty.h"
 #include "sgcore/scene/sgbone.h"
+#include "sgcore/scene/sgscene.h"
 #include "sgcore/scene/sgskeleton.h"
 
 #include <QElapsedTimer>
@@ -42,7 +47,7 @@ public:
 class Peer {
 public:
     Peer() {
-        for (const QString &file : bridgetest::segmentFiles(kSgControlSegmentKey)) {
+        for (const QString &file : sgTestSegmentFiles(kSgControlSegmentKey)) {
             if (file.contains(QLatin1String("-ref")) || file.contains(QLatin1String("-lock")))
                 continue;
             m_file.setFileName(QStringLiteral("/dev/shm/") + file);
@@ -58,8 +63,10 @@ public:
         return copy;
     }
     SgControlRecord *live() { return m_record ? m_record : &m_scratch; }
-    void post(SgModelerMessage code) {
-        live()->toHostCode = sgCodeByte(code);
+    void post(SgModelerMessage code) { post(sgCodeByte(code)); }
+    // A code as the byte it travels as.
+    void post(std::uint8_t code) {
+        live()->toHostCode = code;
         live()->toHostParameter = 0;
         live()->toHostFlag = 0;
     }
@@ -99,14 +106,10 @@ public:
 class BridgeAction : public ::testing::Test {
 protected:
     void SetUp() override {
-        bridgetest::app();
         scene()->clear();
         sgApp->getMessageSink()->clear();
     }
-    void TearDown() override {
-        EXPECT_EQ(bridgetest::cancelPendingAnswers(), 0) << "a question was never asked";
-        scene()->clear();
-    }
+    void TearDown() override { scene()->clear(); }
     static SgScene *scene() { return sgApp->getScene(); }
 
     static QStringList labels(const SgTArray<SgNode *> &list) {
@@ -134,16 +137,16 @@ TEST_F(BridgeAction, CollectingSendsEachFigureOnceWithFollowersAndDescendants) {
     auto *chest = new SgBone(QStringLiteral("chest"));
     body->addBone(hip);
     body->addBone(chest, hip);
-    bridgetest::makeProp(QStringLiteral("Hat"))->setParent(chest);
+    sgTestProp(QStringLiteral("Hat"))->setParent(chest);
     auto *shirt = new SgSkeleton(QStringLiteral("Shirt"));
     auto *sleeve = new SgBone(QStringLiteral("sleeve"));
     shirt->addBone(sleeve);
     shirt->setFollowTarget(body);
-    bridgetest::makeProp(QStringLiteral("Ring"))->setParent(sleeve);
+    sgTestProp(QStringLiteral("Ring"))->setParent(sleeve);
     auto *empty = new SgNode(QStringLiteral("Empty"));
-    bridgetest::makeProp(QStringLiteral("Spoon"))->setParent(empty);
+    sgTestProp(QStringLiteral("Spoon"))->setParent(empty);
     for (SgNode *node : {static_cast<SgNode *>(body), static_cast<SgNode *>(shirt),
-                         bridgetest::makeProp(QStringLiteral("Cup")), empty})
+                         sgTestProp(QStringLiteral("Cup")), empty})
         scene()->addNode(node);
 
     TestBridge bridge;
@@ -167,7 +170,7 @@ TEST_F(BridgeAction, NothingSelectedAsksBeforeLaunching) {
     {
         TestBridge bridge;
         QString asked;
-        bridgetest::answerModal([&](QWidget *box) {
+        SgTestModalAnswer answer([&](QWidget *box) {
             asked = box->windowTitle() + "|" + static_cast<QMessageBox *>(box)->text();
             QTest::keyClick(box, Qt::Key_Escape);
         });
@@ -178,8 +181,9 @@ TEST_F(BridgeAction, NothingSelectedAsksBeforeLaunching) {
         EXPECT_EQ(bridge.modelerProcessId(), 0);
     }
     TestBridge bridge;
-    bridgetest::answerModal([](QWidget *box) { QTest::keyClick(box, Qt::Key_Return); });
+    SgTestModalAnswer answer([](QWidget *box) { QTest::keyClick(box, Qt::Key_Return); });
     bridge.executeAction();
+    EXPECT_EQ(answer.answered(), 1);
     EXPECT_TRUE(bridge.isActive());
     EXPECT_TRUE(bridge.pollTimer()->isActive());
     EXPECT_EQ(bridge.pollTimer()->interval(), 50);
@@ -194,8 +198,8 @@ TEST_F(BridgeAction, NothingSelectedAsksBeforeLaunching) {
 }
 
 TEST_F(BridgeAction, TriggeringWhileActiveAppendsWithoutALaunch) {
-    scene()->addNode(bridgetest::makeProp(QStringLiteral("Cup")));
-    scene()->addNode(bridgetest::makeProp(QStringLiteral("Plate")));
+    scene()->addNode(sgTestProp(QStringLiteral("Cup")));
+    scene()->addNode(sgTestProp(QStringLiteral("Plate")));
     auto bridge = linkedBridge();
     ASSERT_TRUE(bridge->isActive());
     const qint64 pid = bridge->modelerProcessId();
@@ -207,9 +211,9 @@ TEST_F(BridgeAction, TriggeringWhileActiveAppendsWithoutALaunch) {
 }
 
 TEST_F(BridgeAction, AMissingModelerIsLoggedAndRemovedNodesLeaveTheSendList) {
-    scene()->addNode(bridgetest::makeProp(QStringLiteral("Cup")));
-    scene()->addNode(bridgetest::makeProp(QStringLiteral("Plate")));
-    scene()->addNode(bridgetest::makeProp(QStringLiteral("Fork")));
+    scene()->addNode(sgTestProp(QStringLiteral("Cup")));
+    scene()->addNode(sgTestProp(QStringLiteral("Plate")));
+    scene()->addNode(sgTestProp(QStringLiteral("Fork")));
     qputenv("FACETOR_INSTALL_PATH", "/nonexistent/facetor");
     TestBridge bridge;
     for (const char *label : {"Cup", "Plate", "Fork"})
@@ -228,10 +232,24 @@ TEST_F(BridgeAction, AMissingModelerIsLoggedAndRemovedNodesLeaveTheSendList) {
     EXPECT_EQ(labels(bridge.sendList()), (QStringList{"Cup", "Fork"}));
     scene()->clear();
     EXPECT_EQ(bridge.sendList().count(), 0);
+
+    // While another host holds the link the user is told, and no modeler starts.
+    SgTestSegment otherHost(kSgHostLinkKey);
+    ASSERT_TRUE(otherHost.create(8));
+    scene()->addNode(sgTestProp(QStringLiteral("Cup")));
+    scene()->selectNode(scene()->findNodeByLabel(QStringLiteral("Cup")));
+    StandInModeler modeler;
+    TestBridge second;
+    second.executeAction();
+    EXPECT_FALSE(second.isActive());
+    EXPECT_EQ(second.modelerProcessId(), 0);
+    EXPECT_EQ(sgApp->getMessageSink()->logLines().last(),
+              QStringLiteral("Facetor is linked to another Scenara."));
+    otherHost.remove(SgSharedMemory::kRemoveUnlocked);
 }
 
 TEST_F(BridgeAction, MessagesWaitForTheirSlot) {
-    scene()->addNode(bridgetest::makeProp(QStringLiteral("Cup")));
+    scene()->addNode(sgTestProp(QStringLiteral("Cup")));
     TestBridge idle;
     int value = 42;
     EXPECT_FALSE(idle.postMessage(SgHostMessage::NodeWritten, 0)); // not attached
@@ -244,7 +262,7 @@ TEST_F(BridgeAction, MessagesWaitForTheirSlot) {
     EXPECT_TRUE(bridge->postMessage(SgHostMessage::SegmentBusy, 7));
     const SgControlRecord before = peer.record();
     EXPECT_EQ(before.toModelerFlag, 0);
-    EXPECT_EQ(before.toModelerCode, sgCodeByte(SgHostMessage::SegmentBusy));
+    EXPECT_EQ(before.toModelerCode, 4); // the byte SegmentBusy travels as
     EXPECT_EQ(before.toModelerParameter, 7);
     EXPECT_FALSE(bridge->postMessage(SgHostMessage::NodeWritten, 9));
     EXPECT_EQ(std::memcmp(&before, peer.live(), sizeof before), 0);
@@ -264,7 +282,7 @@ TEST_F(BridgeAction, MessagesWaitForTheirSlot) {
 }
 
 TEST_F(BridgeAction, ThePollCountsIdlePollsAndRetriesBeforeNotices) {
-    scene()->addNode(bridgetest::makeProp(QStringLiteral("Cup")));
+    scene()->addNode(sgTestProp(QStringLiteral("Cup")));
     auto bridge = linkedBridge();
     bridge->pollTimer()->stop(); // the test steps the poll itself
     Peer peer;
@@ -301,11 +319,16 @@ TEST_F(BridgeAction, ThePollCountsIdlePollsAndRetriesBeforeNotices) {
     EXPECT_TRUE(bridge->isExchangeBusy());
     EXPECT_EQ(bridge->sendList().count(), 0);
     EXPECT_EQ(peer.take(), SgHostMessage::NodeWritten);
-    EXPECT_TRUE(bridgetest::segmentExists(kSgDataSegmentKey));
+    EXPECT_TRUE(sgTestSegmentExists(kSgDataSegmentKey));
+    // Code 4 asks the host to let go of the data segment; the exchange goes on.
+    peer.post(std::uint8_t(4));
+    bridge->checkSharedMap();
+    EXPECT_FALSE(sgTestSegmentExists(kSgDataSegmentKey));
+    EXPECT_TRUE(bridge->isExchangeBusy());
     peer.post(SgModelerMessage::NodeRead);
     bridge->checkSharedMap();
     EXPECT_FALSE(bridge->isExchangeBusy());
-    EXPECT_FALSE(bridgetest::segmentExists(kSgDataSegmentKey));
+    EXPECT_FALSE(sgTestSegmentExists(kSgDataSegmentKey));
 
     // The modeler quits: the poll stops and the link is dropped.
     peer.post(SgModelerMessage::Quit);
@@ -316,7 +339,7 @@ TEST_F(BridgeAction, ThePollCountsIdlePollsAndRetriesBeforeNotices) {
 }
 
 TEST_F(BridgeAction, AHeldLockCostsOneWaitAndALostRecordEndsTheExchange) {
-    scene()->addNode(bridgetest::makeProp(QStringLiteral("Cup")));
+    scene()->addNode(sgTestProp(QStringLiteral("Cup")));
     auto bridge = linkedBridge();
     bridge->pollTimer()->stop(); // the test steps the poll itself
     Peer peer;
@@ -329,7 +352,7 @@ TEST_F(BridgeAction, AHeldLockCostsOneWaitAndALostRecordEndsTheExchange) {
 
     // While the modeler holds the control lock a step waits for it once and posts nothing.
     {
-        SgSharedMemory modeler(kSgControlSegmentKey);
+        SgTestSegment modeler(kSgControlSegmentKey);
         ASSERT_TRUE(modeler.attach(SgSharedMemory::kReadWrite));
         ASSERT_TRUE(modeler.tryLock(0));
         QElapsedTimer clock;
@@ -354,34 +377,34 @@ TEST_F(BridgeAction, AHeldLockCostsOneWaitAndALostRecordEndsTheExchange) {
     peer.post(SgModelerMessage::SendSelection);
     bridge->checkSharedMap();
     EXPECT_TRUE(bridge->isExchangeBusy());
-    SgSharedMemory restarted(kSgControlSegmentKey);
+    SgTestSegment restarted(kSgControlSegmentKey);
     ASSERT_TRUE(restarted.attach(SgSharedMemory::kReadWrite));
     peer.post(SgModelerMessage::SendSelection);
     bridge->checkSharedMap();
     EXPECT_FALSE(bridge->isExchangeBusy());
-    EXPECT_FALSE(bridgetest::segmentExists(kSgDataSegmentKey));
+    EXPECT_FALSE(sgTestSegmentExists(kSgDataSegmentKey));
 
     // A modeler that quits ends a busy exchange and drops the queued messages.
-    scene()->addNode(bridgetest::makeProp(QStringLiteral("Plate")));
+    scene()->addNode(sgTestProp(QStringLiteral("Plate")));
     scene()->selectNode(scene()->findNodeByLabel(QStringLiteral("Plate")));
     bridge->executeAction();
     peer.post(SgModelerMessage::SendSelection);
     bridge->checkSharedMap();
     ASSERT_TRUE(bridge->isExchangeBusy());
-    EXPECT_TRUE(bridgetest::segmentExists(kSgDataSegmentKey));
+    EXPECT_TRUE(sgTestSegmentExists(kSgDataSegmentKey));
     peer.post(SgModelerMessage::Quit);
     bridge->checkSharedMap();
     EXPECT_FALSE(bridge->isActive());
     EXPECT_FALSE(bridge->isExchangeBusy());
     EXPECT_TRUE(bridge->retryQueue().isEmpty());
-    EXPECT_FALSE(bridgetest::segmentExists(kSgDataSegmentKey));
+    EXPECT_FALSE(sgTestSegmentExists(kSgDataSegmentKey));
     restarted.detach();
     restarted.remove(SgSharedMemory::kRemoveUnlocked);
 }
 
 TEST_F(BridgeAction, TheHostSwitchLinksWithoutRewritingTheRecord) {
     // The modeler that started the host has set the record up and asks for the selection.
-    SgSharedMemory modeler(kSgControlSegmentKey);
+    SgTestSegment modeler(kSgControlSegmentKey);
     ASSERT_TRUE(modeler.create(16));
     ASSERT_TRUE(modeler.attach(SgSharedMemory::kReadWrite));
     SgControlRecord asking = SgControlRecord::fresh();
@@ -406,8 +429,8 @@ TEST_F(BridgeAction, TheHostSwitchLinksWithoutRewritingTheRecord) {
 }
 
 TEST_F(BridgeAction, ReturnsAreAcknowledgedFirstThenImportedOrRefused) {
-    scene()->addNode(bridgetest::makeProp(QStringLiteral("Cup")));
-    scene()->addNode(bridgetest::makeProp(QString::fromUtf8("Kiste\u2013A")));
+    scene()->addNode(sgTestProp(QStringLiteral("Cup")));
+    scene()->addNode(sgTestProp(QString::fromUtf8("Kiste\u2013A")));
     auto bridge = linkedBridge();
     bridge->pollTimer()->stop();
     Peer peer;
@@ -427,7 +450,7 @@ TEST_F(BridgeAction, ReturnsAreAcknowledgedFirstThenImportedOrRefused) {
             returned.corners = {{0, -1, -1}, {1, -1, -1}, {2, -1, -1}};
         }
         const QByteArray record = SgFacetorReturn::encode(returned);
-        SgSharedMemory data(kSgDataSegmentKey);
+        SgTestSegment data(kSgDataSegmentKey);
         ASSERT_TRUE(data.create(int32_t(record.size())));
         ASSERT_TRUE(data.attach(SgSharedMemory::kReadWrite));
         std::memcpy(data.data(), record.constData(), size_t(record.size()));
@@ -439,8 +462,8 @@ TEST_F(BridgeAction, ReturnsAreAcknowledgedFirstThenImportedOrRefused) {
         EXPECT_EQ(bridge->pendingImports(), 1);
         data.detach();
         data.remove(SgSharedMemory::kRemoveUnlocked);
-        EXPECT_FALSE(bridgetest::segmentExists(kSgDataSegmentKey));
-        EXPECT_TRUE(bridgetest::waitUntil([&] { return bridge->pendingImports() == 0; }, 2000));
+        EXPECT_FALSE(sgTestSegmentExists(kSgDataSegmentKey));
+        EXPECT_TRUE(sgTestWaitUntil([&] { return bridge->pendingImports() == 0; }, 2000));
     };
 
     returnShape("Gizmo", {0, 0, 0, 2, 0, 0, 0, 4, 0});
@@ -467,7 +490,7 @@ TEST_F(BridgeAction, ReturnsAreAcknowledgedFirstThenImportedOrRefused) {
 }
 
 TEST_F(BridgeAction, AReturnWhoseLockTheModelerKeepsCostsShortStepsAndIsGivenUp) {
-    scene()->addNode(bridgetest::makeProp(QStringLiteral("Cup")));
+    scene()->addNode(sgTestProp(QStringLiteral("Cup")));
     auto bridge = linkedBridge();
     bridge->pollTimer()->stop();
     Peer peer;
@@ -476,7 +499,7 @@ TEST_F(BridgeAction, AReturnWhoseLockTheModelerKeepsCostsShortStepsAndIsGivenUp)
     returned.vertices = {0, 0, 0, 2, 0, 0, 0, 4, 0};
     returned.materials.append(SgExchangeNode::Material{});
     const QByteArray record = SgFacetorReturn::encode(returned);
-    SgSharedMemory data(kSgDataSegmentKey);
+    SgTestSegment data(kSgDataSegmentKey);
     ASSERT_TRUE(data.create(int32_t(record.size())));
     ASSERT_TRUE(data.attach(SgSharedMemory::kReadWrite));
     std::memcpy(data.data(), record.constData(), size_t(record.size()));
@@ -512,7 +535,7 @@ TEST_F(BridgeAction, ANodeThatCannotBeWrittenIsReportedAndTheNextGoesOut) {
     object->addShape(new SgPolyShape(QStringLiteral("Hollow"))); // a shape without geometry
     hollow->setObject(object);
     scene()->addNode(hollow);
-    scene()->addNode(bridgetest::makeProp(QStringLiteral("Cup")));
+    scene()->addNode(sgTestProp(QStringLiteral("Cup")));
     StandInModeler modeler;
     TestBridge bridge;
     scene()->selectNode(hollow);
@@ -532,15 +555,15 @@ TEST_F(BridgeAction, ANodeThatCannotBeWrittenIsReportedAndTheNextGoesOut) {
 }
 
 TEST_F(BridgeAction, PropLabelsAreMadeUnique) {
-    scene()->addNode(bridgetest::makeProp(QStringLiteral("Body")));
-    scene()->addNode(bridgetest::makeProp(QStringLiteral("Body (1)")));
+    scene()->addNode(sgTestProp(QStringLiteral("Body")));
+    scene()->addNode(sgTestProp(QStringLiteral("Body (1)")));
     TestBridge bridge;
-    bridge.createPropFromShape(bridgetest::makeShape(
-        QStringLiteral("Body"), bridgetest::makeMesh({{-4, 0, 0}, {4, 2, 0}, {0, 6, 8}})));
-    bridge.createPropFromShape(bridgetest::makeShape(
-        QStringLiteral("Body"), bridgetest::makeMesh({{0, 0, 0}, {1, 0, 0}, {0, 1, 0}})));
-    bridge.createPropFromShape(bridgetest::makeShape(
-        QStringLiteral("Lamp"), bridgetest::makeMesh({{0, 0, 0}, {1, 0, 0}, {0, 1, 0}})));
+    bridge.createPropFromShape(
+        sgTestShape(QStringLiteral("Body"), sgTestPolygon({{-4, 0, 0}, {4, 2, 0}, {0, 6, 8}})));
+    bridge.createPropFromShape(
+        sgTestShape(QStringLiteral("Body"), sgTestPolygon({{0, 0, 0}, {1, 0, 0}, {0, 1, 0}})));
+    bridge.createPropFromShape(
+        sgTestShape(QStringLiteral("Lamp"), sgTestPolygon({{0, 0, 0}, {1, 0, 0}, {0, 1, 0}})));
     ASSERT_EQ(scene()->getNodeCount(), 5);
     SgNode *second = scene()->getNode(2);
     EXPECT_EQ(second->getLabel(), QStringLiteral("Body (2)"));
@@ -561,15 +584,14 @@ TEST_F(BridgeAction, CopyingMaterialsTouchesOnlyNamesakesDiffuse) {
     figure->addBone(leg);
     for (SgBone *bone : {arm, leg}) {
         auto *object = new SgObject;
-        auto *shape = bridgetest::makeShape(bone->getName(), bridgetest::makeMesh({{0, 0, 0}}));
+        auto *shape = sgTestShape(bone->getName(), sgTestPolygon({{0, 0, 0}}));
         shape->addMaterial(new SgDefaultMaterial(QStringLiteral("Eyes")));
         object->addShape(shape);
         bone->setObject(object);
     }
     scene()->addNode(figure);
 
-    auto *returned =
-        bridgetest::makeShape(QStringLiteral("Body"), bridgetest::makeMesh({{0, 0, 0}}));
+    auto *returned = sgTestShape(QStringLiteral("Body"), sgTestPolygon({{0, 0, 0}}));
     auto *skin = static_cast<SgDefaultMaterial *>(returned->getMaterial(0));
     skin->setDiffuseColor(QColor(255, 128, 0));
     skin->setSpecularColor(QColor(1, 2, 3));

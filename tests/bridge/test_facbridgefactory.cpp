@@ -2,7 +2,6 @@
 // the conversion of script values back to bridges.
 
 #include "bridge/sgfacbridgefactory.h"
-#include "bridgetestsupport.h"
 
 #include "sgcore/plugin/sgplugin.h"
 
@@ -11,7 +10,6 @@
 #include <gtest/gtest.h>
 
 TEST(FacBridgeFactory, RegistersTheTypeOnceAndConvertsOnlyBridges) {
-    bridgetest::app();
     SgPlugin plugin(QStringLiteral("Test"), QString(), QString(), 0);
     SgFacBridgeFactory factory(SgGUID::fromString("6b1f3c2e-8d4a-4e57-9a0c-5f2e7d914b36"), &plugin);
     EXPECT_EQ(SgFacBridgeFactory::instance(), &factory);

@@ -1,7 +1,6 @@
 // The plug-in library loaded as the host loads it, and its class published to script engines.
 
-#include "bridgetestsupport.h"
-
+#include "sgcore/app/sgapp.h"
 #include "sgcore/app/sghelpmgr.h"
 #include "sgcore/plugin/sgaction.h"
 #include "sgcore/plugin/sgclassfactory.h"
@@ -21,7 +20,6 @@ const QString kPluginPath = QStringLiteral(FACBRIDGE_PLUGIN_PATH);
 // One loader for the whole process: the library stays loaded, as in the host.
 SgPluginLoader &loadedPlugin() {
     static SgPluginLoader *loader = [] {
-        bridgetest::app();
         auto *l = new SgPluginLoader;
         EXPECT_TRUE(l->load(kPluginPath)) << l->errorString().toStdString();
         return l;

@@ -4,7 +4,9 @@
 // host asks the modeler to release (code 4) comes again instead of being lost.
 
 #include "bridge/sgfacbridge.h"
-#include "bridgetestsupport.h"
+#include "tests/support/sgtestprocess.h"
+#include "tests/support/sgtestscene.h"
+#include "tests/support/sgtestsegment.h"
 
 #include "exchange/sgexchangereader.h"
 #include "exchange/shm/sgcontrolrecord.h"
@@ -13,6 +15,8 @@
 #include "sgcore/geometry/sgpolyshape.h"
 #include "sgcore/morph/sgmorph.h"
 #include "sgcore/morph/sgmorphdeltas.h"
+#include "sgcore/scene/sgnode.h"
+#include "sgcore/scene/sgscene.h"
 
 #include <QDir>
 #include <QFile>
@@ -54,7 +58,7 @@ SgNode *makeGridProp(const QString &name, int side) {
         }
     mesh->finishEdit();
     auto *object = new SgObject(name);
-    object->addShape(bridgetest::makeShape(name, mesh));
+    object->addShape(sgTestShape(name, mesh));
     auto *node = new SgNode(name);
     node->setObject(object);
     return node;
@@ -110,7 +114,6 @@ private:
 class ModelerSaves : public ::testing::Test {
 protected:
     void SetUp() override {
-        bridgetest::app();
         sgApp->getScene()->clear();
         sgApp->getMessageSink()->clear();
     }
@@ -127,9 +130,9 @@ TEST_F(ModelerSaves, EverySaveStyleGivesExactlyOneCompleteReturn) {
     TestBridge bridge;
     bridge.executeAction();
     const QString obj = QDir(run.workspace()).filePath(QStringLiteral("Grid.obj"));
-    ASSERT_TRUE(bridgetest::waitUntil([&] { return QFile::exists(obj); }, 20000))
+    ASSERT_TRUE(sgTestWaitUntil([&] { return QFile::exists(obj); }, 20000))
         << run.log().toStdString();
-    ASSERT_TRUE(bridgetest::waitUntil(
+    ASSERT_TRUE(sgTestWaitUntil(
         [&] { return run.log().contains(QStringLiteral("selection arrived")); }, 10000));
     const QByteArray original = readAll(obj);
     ASSERT_GT(original.size(), 6000);
@@ -139,10 +142,10 @@ TEST_F(ModelerSaves, EverySaveStyleGivesExactlyOneCompleteReturn) {
     auto expectOneReturn = [&](const char *style, float step, auto save) {
         const int before = morphsMade();
         save(withFirstVertexMoved(original, step));
-        EXPECT_TRUE(bridgetest::waitUntil([&] { return morphsMade() > before; }, 10000))
+        EXPECT_TRUE(sgTestWaitUntil([&] { return morphsMade() > before; }, 10000))
             << style << "\n"
             << run.log().toStdString();
-        bridgetest::waitUntil([] { return false; }, 3 * kSettleMs); // a second would come now
+        sgTestIdle(3 * kSettleMs); // a second would come now
         EXPECT_EQ(morphsMade(), before + 1) << style << "\n" << run.log().toStdString();
         SgObject *object = scene->findNodeByLabel(QStringLiteral("Grid"))->getObject();
         auto *morph = dynamic_cast<SgMorph *>(object->findModifier(QStringLiteral("MyMorph")));
@@ -167,7 +170,7 @@ TEST_F(ModelerSaves, EverySaveStyleGivesExactlyOneCompleteReturn) {
         for (size_t c = 0; c + 1 < std::size(cuts); ++c) {
             file.write(text.mid(cuts[c], cuts[c + 1] - cuts[c]));
             file.flush();
-            bridgetest::waitUntil([] { return false; }, kSettleMs / 3);
+            sgTestIdle(kSettleMs / 3);
         }
     });
     expectOneReturn("temporary file renamed over", 3.0f, [&](const QByteArray &text) {
@@ -187,8 +190,8 @@ TEST_F(ModelerSaves, EverySaveStyleGivesExactlyOneCompleteReturn) {
         ASSERT_TRUE(file.open(QIODevice::WriteOnly | QIODevice::Truncate));
         file.write(text.left(text.indexOf("\nf ") + 4)); // "f 1" ends the write
     }
-    EXPECT_TRUE(bridgetest::waitUntil(
-        [&] { return run.log().contains(QStringLiteral("not returned")); }, 5000))
+    EXPECT_TRUE(
+        sgTestWaitUntil([&] { return run.log().contains(QStringLiteral("not returned")); }, 5000))
         << run.log().toStdString();
     EXPECT_EQ(morphsMade(), before);
     expectOneReturn("finished after a stall", 4.0f, [&](const QByteArray &finished) {
@@ -197,16 +200,16 @@ TEST_F(ModelerSaves, EverySaveStyleGivesExactlyOneCompleteReturn) {
         file.write(finished);
     });
     bridge.closing();
-    ASSERT_TRUE(bridgetest::waitUntil(
-        [&] { return !bridge.isActive() && bridge.pendingImports() == 0; }, 10000));
-    EXPECT_TRUE(bridgetest::waitUntil(
+    ASSERT_TRUE(
+        sgTestWaitUntil([&] { return !bridge.isActive() && bridge.pendingImports() == 0; }, 10000));
+    EXPECT_TRUE(sgTestWaitUntil(
         [&] { return run.log().contains(QStringLiteral("quit: the host closed the link")); }, 5000))
         << run.log().toStdString();
 }
 
 TEST_F(ModelerSaves, TheSettingsFileSetsUpALaunchedModelerAndTheEnvironmentOverridesIt) {
     SgScene *scene = sgApp->getScene();
-    scene->addNode(bridgetest::makeProp(QStringLiteral("Cup"), {10, 20, 30}));
+    scene->addNode(sgTestProp(QStringLiteral("Cup"), {10, 20, 30}));
     scene->selectNode(scene->findNodeByLabel(QStringLiteral("Cup")));
     SettingsRun run(QStringLiteral("edit=move=1,0,0\nwatch=false\n"));
     QTemporaryDir other;
@@ -216,7 +219,7 @@ TEST_F(ModelerSaves, TheSettingsFileSetsUpALaunchedModelerAndTheEnvironmentOverr
     {
         TestBridge bridge;
         bridge.executeAction();
-        EXPECT_TRUE(bridgetest::waitUntil(
+        EXPECT_TRUE(sgTestWaitUntil(
             [&] { return !bridge.isActive() && bridge.pendingImports() == 0; }, 20000))
             << run.log().toStdString();
     }
@@ -241,7 +244,7 @@ TEST(ModelerRelease, AReturnReleasedInFlightComesAgain) {
     shape.write("o Shape\nv 0 0 0\nv 1 0 0\nv 0 1 0\nf 1 2 3\n");
     shape.close();
 
-    SgSharedMemory control(kSgControlSegmentKey);
+    SgTestSegment control(kSgControlSegmentKey);
     ASSERT_TRUE(control.create(sizeof(SgControlRecord)));
     ASSERT_TRUE(control.attach(SgSharedMemory::kReadWrite));
     const SgControlRecord fresh = SgControlRecord::fresh();
@@ -293,9 +296,9 @@ TEST(ModelerRelease, AReturnReleasedInFlightComesAgain) {
                     QThread::msleep(5);
                 continue;
             }
-            SgSharedMemory data(kSgDataSegmentKey);
+            SgTestSegment data(kSgDataSegmentKey);
             ASSERT_TRUE(data.attach(SgSharedMemory::kReadWrite));
-            data.lock();
+            ASSERT_TRUE(data.lock()) << kSgTestStuckLock;
             QString trailer;
             std::unique_ptr<SgPolyShape> read(
                 SgExchangeReader(data.data(), size_t(data.size())).readShape(trailer));

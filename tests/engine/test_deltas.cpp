@@ -92,7 +92,8 @@ TEST_F(Deltas, CountMismatchAndInvalidTargetsGiveNoTable) {
         for (int at : {0, 100, 199}) {
             std::unique_ptr<SgPolyMesh> morph(sgTestCopyVertices(*base));
             morph->setVertex(5, base->getVertex(5) + SgVec3(1.0f, 0.0f, 0.0f));
-            morph->setVertex(at, SgVec3(0.0f, bad, 0.0f));
+            const SgVec3 b = base->getVertex(at); // only one coordinate of the vertex is bad
+            morph->setVertex(at, SgVec3(b.x, bad, b.z));
             EXPECT_EQ(SgMorphLoader::computeDeltas(*base, *morph), nullptr);
             EXPECT_EQ(statusLines().last(),
                       QString("Morph target has invalid coordinates - delta calculation failed."));

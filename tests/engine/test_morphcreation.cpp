@@ -139,6 +139,17 @@ TEST_F(MorphCreation, MakeUniqueAsksUntilTheNameIsFreeAndNotBlankOrTheUserCancel
     EXPECT_EQ(answer.titles(), QStringList("Morph Already Exists"));
     EXPECT_EQ(label, QString("A morph named \"Smile\" already exists. Please enter a new name for "
                              "the morph:"));
+
+    // The name must be free on every node of a run, not only on the first.
+    auto *other = sgTestNode("Other", sgTestRowMesh(12));
+    scene()->addNode(other);
+    questions.names = {QString("Wink")};
+    questions.askedAbout.clear();
+    prop.loader.setQuestions(&questions);
+    prop.loader.setMorphName("Grin");
+    prop.loader.createMorphForNodes(target, {other, prop.node}, cancelled);
+    EXPECT_EQ(questions.askedAbout, QStringList{"Grin"});
+    EXPECT_TRUE(morphOn(other, "Wink") && morphOn(prop.node, "Wink"));
     target->unref();
 }
 

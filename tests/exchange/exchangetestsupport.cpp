@@ -5,11 +5,6 @@
 #include "exchange/sgrecordoutput.h"
 #include "sgcore/app/sgapp.h"
 #include "sgcore/app/sgmessagesink.h"
-#include "sgcore/geometry/sgmap.h"
-#include "sgcore/geometry/sgobject.h"
-#include "sgcore/geometry/sgpolymesh.h"
-#include "sgcore/geometry/sgshape.h"
-#include "sgcore/scene/sgnode.h"
 
 namespace exchangetest {
 
@@ -21,39 +16,6 @@ void clearLog() {
 }
 QString tempPath() {
     return sgApp->getTempPath();
-}
-
-SgPolyMesh *makeMesh(const std::vector<SgVec3> &vertices, const std::vector<SgVec2> &uvs) {
-    auto *mesh = new SgPolyMesh;
-    mesh->beginEdit(true);
-    SgVec3 *to = mesh->setVertexArray(int(vertices.size()));
-    std::copy(vertices.begin(), vertices.end(), to);
-    if (!uvs.empty()) {
-        auto *map = new SgMap(SgMap::UVMap);
-        for (const SgVec2 &uv : uvs)
-            map->appendPnt2Value(uv.u, uv.v);
-        mesh->setUVList(map);
-    }
-    mesh->finishEdit();
-    return mesh;
-}
-
-void addFacet(SgPolyMesh &mesh, int material, const std::vector<std::vector<int>> &corners) {
-    mesh.beginEdit(false);
-    mesh.activateMaterial(material);
-    mesh.startFace();
-    for (const auto &c : corners)
-        mesh.addFaceEdge(c[0], c.size() > 1 ? c[1] : -1, c.size() > 2 ? c[2] : -1);
-    mesh.finishFace();
-    mesh.finishEdit();
-}
-
-SgNode *makeNode(const QString &label, SgShape *shape) {
-    auto *node = new SgNode(label);
-    auto *object = new SgObject(label);
-    object->addShape(shape);
-    node->setObject(object);
-    return node;
 }
 
 QByteArray writeNode(SgNode *node, const QString &trailer, std::int32_t *measured) {

@@ -1,6 +1,7 @@
 #pragma once
 
 #include "sgcore/materials/sgmaterial.h"
+#include "tests/support/sgtestscene.h"
 
 #include <QByteArray>
 #include <QString>
@@ -31,13 +32,6 @@ public:
     explicit BareMaterial(const QString &name) : SgMaterial(name) {}
     SgMaterial *clone() const override { return new BareMaterial(getName()); }
 };
-
-// A polygon mesh with the given vertices and, when `uvs` is not empty, a UV list.
-SgPolyMesh *makeMesh(const std::vector<SgVec3> &vertices, const std::vector<SgVec2> &uvs = {});
-// Adds a facet of the given corners (vertex, uv, third) in material `material`.
-void addFacet(SgPolyMesh &mesh, int material, const std::vector<std::vector<int>> &corners);
-// A node labelled `label` whose object holds `shape` as its current shape (owned by the node).
-SgNode *makeNode(const QString &label, SgShape *shape);
 
 // Measures and writes the record of `node`; `measured` receives the measured size.
 QByteArray writeNode(SgNode *node, const QString &trailer = QString(),

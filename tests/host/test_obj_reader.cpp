@@ -105,11 +105,12 @@ TEST(HostObjReader, RejectsMalformedInputWithFileAndLine) {
     const Case cases[] = {
         {"v 1 2 3\nv 1 2\n", 2, "three coordinates"},
         {"v 1 2 x\n", 1, "bad number"},
+        {"v 1 2-3\n", 1, "bad number"},
         {"v 1 2 3e99999\n", 1, "out of range"},
         {"v 0 0 0\nv 1 0 0\nf 1 2\n", 3, "three corners"},
         {"v 0 0 0\nf 1 2 0\n", 2, "index 0"},
         {"v 0 0 0\nv 0 0 0\nv 0 0 0\nf 1 2 -4\n", 4, "before the first"},
-        {"v 0 0 0\nv 0 0 0\nv 0 0 0\nf 1 2 3\nf 1 2 9\n", 5, "out of range"},
+        {"v 0 0 0\nv 0 0 0\nv 0 0 0\nf 1 2 3\nf 1 2 4\n", 5, "out of range"}, // one past
         {"v 0 0 0\nv 0 0 0\nv 0 0 0\nf 1/4 2 3\n", 4, "texture index"},
         {"v 0 0 0\nv 0 0 0\nv 0 0 0\nf 1//2 2 3\n", 4, "normal index"},
         {"v 0 0 0\nv 0 0 0\nv 0 0 0\nf 1/a 2 3\n", 4, "bad texture"},

@@ -157,30 +157,3 @@ TEST(HostProperties, PathsFormTheGroupTree) {
     EXPECT_EQ(tree->findGroup(QStringLiteral("Morphs/Nope")), nullptr);
     EXPECT_TRUE(morphs->getProperties().empty());
 }
-
-TEST(HostSettings, ValuesRoundTripThroughTheIniFileWithDefaults) {
-    {
-        SgAppSettings plain;
-        EXPECT_EQ(plain.getInt(QStringLiteral("FacetorBridgeTools"), 0), 0);
-        plain.setInt(QStringLiteral("FacetorBridgeTools"), 2);
-        plain.setString(QStringLiteral("LastDirectory"), QStringLiteral("/home/x"));
-        SgAppSettings group(QStringLiteral("TargetImporter"));
-        group.setString(QStringLiteral("LastDirectory"), QStringLiteral("/morphs"));
-        group.setBool(QStringLiteral("Flag"), true);
-        group.setDouble(QStringLiteral("Scale"), 0.5);
-        group.setString(QStringLiteral("NotANumber"), QStringLiteral("abc"));
-    }
-    SgAppSettings plain;
-    EXPECT_EQ(plain.getInt(QStringLiteral("FacetorBridgeTools"), 0), 2);
-    EXPECT_EQ(plain.getString(QStringLiteral("LastDirectory")), QStringLiteral("/home/x"));
-    SgAppSettings group(QStringLiteral("TargetImporter"));
-    EXPECT_EQ(group.getString(QStringLiteral("LastDirectory")), QStringLiteral("/morphs"));
-    EXPECT_TRUE(group.getBool(QStringLiteral("Flag")));
-    EXPECT_DOUBLE_EQ(group.getDouble(QStringLiteral("Scale")), 0.5);
-    EXPECT_EQ(group.getInt(QStringLiteral("NotANumber"), 7), 7);
-    EXPECT_FALSE(group.contains(QStringLiteral("Missing")));
-    EXPECT_EQ(group.getString(QStringLiteral("Missing"), QStringLiteral("d")), QStringLiteral("d"));
-    EXPECT_EQ(SgAppSettings::fileName(), sgTestPath(QStringLiteral("settings.ini")));
-    group.remove(QStringLiteral("Flag"));
-    EXPECT_FALSE(group.getBool(QStringLiteral("Flag"), false));
-}

@@ -18,6 +18,10 @@ using Clock = std::chrono::steady_clock;
 
 std::unique_ptr<SgSharedMemory> segment;
 
+// Every wait of the peer is bounded: a lock that nobody releases makes a command answer
+// "failed" within seconds instead of leaving the test waiting for an answer.
+constexpr int kWaitLimitMs = 3000;
+
 std::int64_t elapsedMs(Clock::time_point since) {
     return std::chrono::duration_cast<std::chrono::milliseconds>(Clock::now() - since).count();
 }
@@ -53,6 +57,7 @@ std::string churn(const std::string &anchored, const std::string &loose, int mil
     while (elapsedMs(start) < milliseconds) {
         {
             SgSharedMemory memory(anchored);
+            memory.setWaitLimit(kWaitLimitMs);
             if (memory.create(64) || memory.status() != SgSharedMemory::StatusAlreadyExists)
                 ++failures;
             if (memory.attach(SgSharedMemory::kReadWrite) && incrementLocked(memory, 0))
@@ -64,6 +69,7 @@ std::string churn(const std::string &anchored, const std::string &loose, int mil
         }
         {
             SgSharedMemory memory(loose);
+            memory.setWaitLimit(kWaitLimitMs);
             if (!memory.exists())
                 memory.create(64);
             if (memory.attach(SgSharedMemory::kReadWrite)) {
@@ -98,6 +104,7 @@ std::string run(const std::string &line) {
         std::string key;
         in >> key;
         segment = std::make_unique<SgSharedMemory>(key);
+        segment->setWaitLimit(kWaitLimitMs);
         return answer(true);
     }
     if (command == "churn") {

@@ -1,5 +1,7 @@
 #include "shmpeerprocess.h"
 
+#include <gtest/gtest.h>
+
 #include <sstream>
 
 #ifdef _WIN32
@@ -201,7 +203,7 @@ void ShmPeerProcess::quit() {
         return;
     writeLine("quit");
     std::string rest;
-    readLine(&rest, 20000); // returns at end of file, when the peer has exited
+    readLine(&rest, 5000); // returns at end of file, when the peer has exited
     kill();
 }
 
@@ -214,8 +216,13 @@ ShmPeerProcess::~ShmPeerProcess() {
 std::vector<long long> ShmPeerProcess::call(const std::string &command, int timeoutMs) {
     std::vector<long long> fields;
     std::string line;
-    if (!m_running || !writeLine(command) || !readLine(&line, timeoutMs))
+    if (!m_running || !writeLine(command))
         return fields;
+    if (!readLine(&line, timeoutMs)) {
+        ADD_FAILURE() << "the peer process gave no answer to \"" << command << "\" within "
+                      << timeoutMs << " ms: it is stuck";
+        return fields;
+    }
     std::istringstream in(line);
     long long value = 0;
     while (in >> value)

@@ -16,8 +16,9 @@ public:
     bool isRunning() const { return m_running; }
 
     // Sends `command` and returns the answer's fields as numbers ("<result> <status> ...");
-    // empty when the peer did not answer within `timeoutMs`.
-    std::vector<long long> call(const std::string &command, int timeoutMs = 20000);
+    // empty, and a test failure naming the command, when the peer did not answer within
+    // `timeoutMs` (its own waits give up after 3 s, so only a stuck peer takes longer).
+    std::vector<long long> call(const std::string &command, int timeoutMs = 8000);
 
     // Shorthand: the first field of the answer is 1.
     bool ok(const std::string &command) {

@@ -1,5 +1,7 @@
 #pragma once
 
+#include "tests/support/sgtestsegment.h"
+
 #include <chrono>
 #include <string>
 

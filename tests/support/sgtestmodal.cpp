@@ -38,8 +38,15 @@ void SgTestModalAnswer::look() {
     if ((m_idleMs += 5) < m_timeoutMs)
         return;
     m_timer.stop();
+    // A window still up this long after its answer is stuck: the test fails, naming it.
+    const auto closeStuck = [this](QWidget *window) {
+        ADD_FAILURE() << "a window stayed open " << m_timeoutMs << " ms after its answer and was "
+                      << "closed: \"" << window->windowTitle().toStdString() << "\" ("
+                      << window->metaObject()->className() << ")";
+        window->close();
+    };
     while (QWidget *popup = QApplication::activePopupWidget())
-        popup->close();
+        closeStuck(popup);
     if (QWidget *modal = QApplication::activeModalWidget(); modal && modal != m_before)
-        modal->close();
+        closeStuck(modal);
 }

@@ -7,7 +7,8 @@
 // next one to the second, and so on (a window open before the answer was made is not one of
 // them). A window that opens after the handlers are used up is closed. It looks every 5 ms;
 // `timeoutMs` after the last answer (or after its start) it stops looking and closes the popups
-// and modal windows still open, so that a broken test goes on (and fails) instead of hanging.
+// and modal windows still open, failing the test with their titles, so that a broken test
+// fails within seconds instead of hanging.
 // The handlers are usually the drivers of sgtestdrivers.h.
 
 #include "tests/support/sgtestdrivers.h"

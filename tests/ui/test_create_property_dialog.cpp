@@ -125,15 +125,7 @@ TEST_F(CreatePropertyDialog, PagesFollowTheType) {
     EXPECT_EQ(shownPages(), QStringList({"SgNodePropertyAttribs"}));
     EXPECT_EQ(child<QGroupBox>(*dialog, "SgNodePropertyAttribs")->title(), "Skeleton Attributes");
     EXPECT_EQ(child<QLabel>(*dialog, "SgDefaultNodeLabel")->text(), "Default Skeleton:");
-    chooseType(*dialog, Dlg::NodeType);
-    EXPECT_EQ(child<QLabel>(*dialog, "SgNodeLabel")->text(), "Node:");
     EXPECT_TRUE(child<QWidget>(*dialog, "SgPropTypeBox")->isVisible());
-    EXPECT_TRUE(child<QWidget>(*dialog, "SgUniversalPropSettingsBox")->isVisible());
-    EXPECT_EQ(dialog->windowTitle(), "Create Property");
-
-    // Only the int page's Max slider refuses typed text.
-    EXPECT_TRUE(child<SgIntSlider>(*dialog, "SgIntMinAttrib")->isTextEditable());
-    EXPECT_FALSE(child<SgIntSlider>(*dialog, "SgIntMaxAttrib")->isTextEditable());
 
     // "Create morph after joint" follows "Create as empty morph" without being unchecked.
     auto *morph = child<QCheckBox>(*dialog, "SgCreateAsMorphOption");
@@ -287,12 +279,9 @@ TEST_F(CreatePropertyDialog, EachTypeCreatesItsPropertyFromTheDialogsValues) {
     EXPECT_FALSE(floatProperty->getDisplayAsPercent());
     EXPECT_FALSE(floatProperty->isClamped());
     EXPECT_EQ(floatProperty->getName(), " smile "); // as typed
-    EXPECT_EQ(floatProperty->getLabel(), "Smile");
     EXPECT_EQ(floatProperty->getPath(), "Morphs/Face");
-    EXPECT_TRUE(floatProperty->isHidden());
-    EXPECT_TRUE(floatProperty->isLocked());
+    EXPECT_TRUE(floatProperty->isHidden() && floatProperty->isLocked());
     EXPECT_FALSE(floatProperty->canAnimate());
-    EXPECT_TRUE(floatProperty->isUserProperty());
     EXPECT_EQ(floatProperty->getOwner(), nullptr);
 
     chooseType(*dialog, Dlg::BoolType);
@@ -706,28 +695,6 @@ TEST_F(CreatePropertyDialog, DefaultsSavedValuesAndCancel) {
     QTest::mouseClick(child<QPushButton>(*resetting, "SgCancelCreatePropButton"), Qt::LeftButton);
     EXPECT_EQ(resetting->result(), QDialog::Rejected);
     EXPECT_EQ(child<QLineEdit>(*resetting, "SgPropertyInternalNameAttrib")->text(), "typed");
-}
-
-TEST_F(CreatePropertyDialog, ScreenshotsOfTheFloatAndEnumPages) {
-    const QString folder = qEnvironmentVariable("SG_TEST_ARTIFACTS");
-    if (folder.isEmpty())
-        GTEST_SKIP() << "SG_TEST_ARTIFACTS is not set";
-    QDir().mkpath(folder);
-    auto dialog = makeDialog();
-    dialog->setPathDefaults(QStringList({"Morphs/Face", "Morphs/Body"}));
-    dialog->setDefaultName("smile");
-    dialog->setDefaultLabel("Smile");
-    dialog->show();
-    QApplication::processEvents();
-    EXPECT_TRUE(dialog->grab().save(folder + "/create_property_float.png"));
-    chooseType(*dialog, Dlg::EnumType);
-    EnumEditor editor(*dialog);
-    ASSERT_TRUE(editor.type(0, "Calm"));
-    ASSERT_TRUE(editor.type(1, "Happy"));
-    ASSERT_TRUE(editor.type(2, "Angry"));
-    dialog->adjustSize();
-    QApplication::processEvents();
-    EXPECT_TRUE(dialog->grab().save(folder + "/create_property_enum.png"));
 }
 
 } // namespace

@@ -12,7 +12,9 @@
 
 #include "app/sgappwindow.h"
 #include "bridge/sgfacbridge.h"
-#include "bridgetestsupport.h"
+#include "tests/support/sgtestprocess.h"
+#include "tests/support/sgtestscene.h"
+#include "tests/support/sgtestsegment.h"
 
 #include "exchange/shm/sgcontrolrecord.h"
 #include "exchange/shm/sgsharedmemory.h"
@@ -20,8 +22,11 @@
 #include "sgcore/geometry/sgobject.h"
 #include "sgcore/morph/sgmorph.h"
 #include "sgcore/scene/sgbone.h"
+#include "sgcore/scene/sgnode.h"
+#include "sgcore/scene/sgscene.h"
 #include "sgcore/scene/sgskeleton.h"
 
+#include <QApplication>
 #include <QComboBox>
 #include <QDialog>
 #include <QElapsedTimer>
@@ -115,11 +120,6 @@ private:
 constexpr int kDeliveryMs = 2000;
 const QString kOutside8Bit = QString::fromUtf8("Kiste\u2013A");
 
-QStringList leftovers() {
-    return bridgetest::segmentFiles(kSgControlSegmentKey) +
-           bridgetest::segmentFiles(kSgDataSegmentKey) + bridgetest::segmentFiles(kSgHostLinkKey);
-}
-
 // The sitting: the window, the bridge, the modeler's log, the answers to dialogs, and what was
 // seen so far.
 class Sitting : public QObject {
@@ -174,7 +174,7 @@ public:
             {"kill the modeler", 3, [this] { signalModeler(SIGKILL); }},
             {"quit the modeler", 2, [this] { signalModeler(SIGTERM); }},
             {"second host", 4, [this] { secondHost(); }},
-            {"wait", 12, [this] { bridgetest::waitUntil([] { return false; }, pick(100, 600)); }},
+            {"wait", 12, [this] { sgTestIdle(pick(100, 600)); }},
         };
         int total = 0;
         for (const Action &action : actions)
@@ -191,7 +191,7 @@ public:
         }
         // The driver's own work is not the event loop standing still.
         m_beatClock.restart();
-        bridgetest::waitUntil([] { return false; }, pick(20, 150));
+        sgTestIdle(pick(20, 150));
         check();
     }
 
@@ -206,7 +206,7 @@ public:
             reload();
         sgApp->getScene()->selectNode(sgApp->getScene()->getNode(0));
         sendSelection();
-        const bool settled = bridgetest::waitUntil(
+        const bool settled = sgTestWaitUntil(
             [this] {
                 updatePending();
                 return m_bridge.isActive() && m_pending.isEmpty() &&
@@ -219,9 +219,9 @@ public:
                       .arg(QStringList(m_pending.keys()).join(", ")));
         const qint64 pid = m_bridge.modelerProcessId();
         m_bridge.closing();
-        if (!bridgetest::waitUntil([this] { return !m_bridge.isActive(); }, 5000))
+        if (!sgTestWaitUntil([this] { return !m_bridge.isActive(); }, 5000))
             fault(QStringLiteral("the modeler did not quit with the host"));
-        bridgetest::waitUntil([pid] { return bridgetest::processGone(pid); }, 5000);
+        sgTestWaitUntil([pid] { return sgTestProcessGone(pid); }, 5000);
         check();
     }
 
@@ -288,7 +288,7 @@ private:
     void reload() {
         m_window.openScene(QStringLiteral(SG_EXAMPLES_DIR "/demo/scene.json"), true);
         // A label outside 8 bits travels changed and must still find its node.
-        sgApp->getScene()->addNode(bridgetest::makeProp(kOutside8Bit, {3, 0, 0}));
+        sgApp->getScene()->addNode(sgTestProp(kOutside8Bit, {3, 0, 0}));
     }
 
     void selectSome() {
@@ -328,7 +328,7 @@ private:
 
     void signalModeler(int signal) {
         const qint64 pid = m_bridge.modelerProcessId();
-        if (pid > 0 && !bridgetest::processGone(pid))
+        if (pid > 0 && !sgTestProcessGone(pid))
             ::kill(pid_t(pid), signal);
     }
 
@@ -418,7 +418,7 @@ private:
             if (pid == 0 || pid != it->modeler) {
                 it->modeler = pid;
                 it->since.start();
-            } else if (it->since.elapsed() > kDeliveryMs && !bridgetest::processGone(pid)) {
+            } else if (it->since.elapsed() > kDeliveryMs && !sgTestProcessGone(pid)) {
                 fault(
                     QStringLiteral("%1, sent while linked, never reached the modeler").arg(label));
                 it->since.start();
@@ -506,12 +506,12 @@ TEST(UsageTest, ASittingKeepsTheLinkWholeAndTheSceneSound) {
     sgApp->getMessageSink()->clear();
     // Names that a crashed earlier run left without a holder go when they are opened afresh.
     for (const char *key : {kSgControlSegmentKey, kSgDataSegmentKey, kSgHostLinkKey}) {
-        SgSharedMemory stale(key);
+        SgTestSegment stale(key);
         if (stale.create(8) && stale.lock())
             stale.unlock();
         stale.remove(SgSharedMemory::kRemoveUnlocked);
     }
-    ASSERT_TRUE(leftovers().isEmpty()) << leftovers().join(' ').toStdString();
+    ASSERT_TRUE(sgTestLeftovers().isEmpty()) << sgTestLeftovers().join(' ').toStdString();
     QElapsedTimer clock;
     clock.start();
     QString figures;
@@ -525,8 +525,8 @@ TEST(UsageTest, ASittingKeepsTheLinkWholeAndTheSceneSound) {
                                                 << sitting.modelerLog().right(4000).toStdString();
     }
     sgApp->getScene()->clear();
-    EXPECT_TRUE(bridgetest::waitUntil([] { return leftovers().isEmpty(); }, 3000))
-        << leftovers().join(' ').toStdString();
+    EXPECT_TRUE(sgTestWaitUntil([] { return sgTestLeftovers().isEmpty(); }, 3000))
+        << sgTestLeftovers().join(' ').toStdString();
     std::printf("usage test: seed %u, %d steps in %lld ms; %s\n", seed, steps, clock.elapsed(),
                 qPrintable(figures));
 }

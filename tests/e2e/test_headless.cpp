@@ -7,11 +7,13 @@
 #include "sgcore/io/sgobjreader.h"
 #include "sgcore/io/sgscenefile.h"
 #include "sgcore/scene/sgbone.h"
+#include "sgcore/scene/sgnode.h"
 #include "sgcore/scene/sgscene.h"
 #include "sgcore/scene/sgskeleton.h"
 
-#include "bridgetestsupport.h"
 #include "exchange/shm/sgcontrolrecord.h"
+#include "tests/support/sgtestprocess.h"
+#include "tests/support/sgtestscene.h"
 
 #include <QDir>
 #include <QFile>
@@ -122,8 +124,8 @@ TEST(HeadlessDemo, RoundTripMakesMorphsAndExportsTheFigureAtValueOne) {
     }
     EXPECT_EQ(offset, result->getVertexCount());
     // Nothing of the bridge's segments is left behind.
-    EXPECT_TRUE(bridgetest::segmentFiles(kSgControlSegmentKey).isEmpty());
-    EXPECT_TRUE(bridgetest::segmentFiles(kSgDataSegmentKey).isEmpty());
+    EXPECT_TRUE(sgTestSegmentFiles(kSgControlSegmentKey).isEmpty());
+    EXPECT_TRUE(sgTestSegmentFiles(kSgDataSegmentKey).isEmpty());
 }
 
 TEST(HeadlessDemo, ScriptFailuresAndArguments) {

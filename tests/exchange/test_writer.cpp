@@ -47,7 +47,7 @@ std::unique_ptr<SgNode> prop(const QString &label, SgPolyMesh *mesh,
     shape->setPolyMesh(mesh);
     for (SgMaterial *material : materials)
         shape->addMaterial(material);
-    return std::unique_ptr<SgNode>(makeNode(label, shape));
+    return std::unique_ptr<SgNode>(sgTestAttach(new SgNode(label), shape));
 }
 
 QString writeImage(const QString &path, QColor color) {
@@ -61,8 +61,8 @@ QString writeImage(const QString &path, QColor color) {
 } // namespace
 
 TEST_F(ExchangeWriterTest, WorkedRecordByteForByte) {
-    SgPolyMesh *mesh = makeMesh({{0, 0, 0}, {10, 0, 0}, {0, 10, 0}});
-    addFacet(*mesh, 0, {{0, 0, 0}, {1, 0, 0}, {2, 0, 0}});
+    SgPolyMesh *mesh = sgTestMesh({{0, 0, 0}, {10, 0, 0}, {0, 10, 0}});
+    sgTestAddFacet(*mesh, 0, {{0, 0, 0}, {1, 0, 0}, {2, 0, 0}});
     auto node = prop("A", mesh, {new BareMaterial("M")});
 
     std::int32_t measured = 0;
@@ -109,9 +109,9 @@ TEST_F(ExchangeWriterTest, WorkedRecordByteForByte) {
 
 TEST_F(ExchangeWriterTest, RecordSizesAndScaling) {
     // No UVs, triangles only, one material: U = 0 and every facet a 41-byte 'T' record.
-    SgPolyMesh *triangles = makeMesh({{10, 20, 30}, {0, 0, 0}, {1, 1, 1}, {2, 2, 2}});
-    addFacet(*triangles, 0, {{0}, {1}, {2}});
-    addFacet(*triangles, 0, {{1}, {2}, {3}});
+    SgPolyMesh *triangles = sgTestMesh({{10, 20, 30}, {0, 0, 0}, {1, 1, 1}, {2, 2, 2}});
+    sgTestAddFacet(*triangles, 0, {{0}, {1}, {2}});
+    sgTestAddFacet(*triangles, 0, {{1}, {2}, {3}});
     auto triNode = prop("T", triangles, {new BareMaterial("M")});
     const QByteArray t = writeNode(triNode.get(), "end");
     EXPECT_FLOAT_EQ(f32At(t, 9), 1.0f);
@@ -130,8 +130,8 @@ TEST_F(ExchangeWriterTest, RecordSizesAndScaling) {
 
     // A 7-corner polygon is 9 + 84 bytes; UVs are copied as they stand.
     std::vector<SgVec3> ring(7);
-    SgPolyMesh *polygon = makeMesh(ring, {{0.25f, 0.5f}, {1.0f, 0.0f}});
-    addFacet(*polygon, 0, {{0, 1, 0}, {1, 0, 0}, {2}, {3}, {4}, {5}, {6, 1, 9}});
+    SgPolyMesh *polygon = sgTestMesh(ring, {{0.25f, 0.5f}, {1.0f, 0.0f}});
+    sgTestAddFacet(*polygon, 0, {{0, 1, 0}, {1, 0, 0}, {2}, {3}, {4}, {5}, {6, 1, 9}});
     auto polyNode = prop("P", polygon, {new BareMaterial("M")});
     const QByteArray p = writeNode(polyNode.get());
     const qsizetype pu = 9 + 7 * 12;
@@ -143,15 +143,29 @@ TEST_F(ExchangeWriterTest, RecordSizesAndScaling) {
     EXPECT_EQ(i32At(p, pf + 9), 7);
     EXPECT_EQ(i32At(p, pf + 13 + 6 * 12 + 8), 9); // third index of the last corner
     EXPECT_EQ(p.size(), pf + 4 + 9 + 84 + 4);
+
+    // Polygons of the most corners the host holds stay inside the measured size.
+    const int most = SgPolyMesh::kMaxPolygonCorners;
+    SgPolyMesh *wide = sgTestMesh(std::vector<SgVec3>(size_t(most)));
+    std::vector<std::vector<int>> corners;
+    for (int i = 0; i < most; ++i)
+        corners.push_back({i});
+    for (int n = 0; n < 3; ++n)
+        sgTestAddFacet(*wide, 0, corners);
+    auto wideNode = prop("W", wide, {new BareMaterial("M")});
+    std::int32_t measured = 0;
+    const QByteArray w = writeNode(wideNode.get(), QString(), &measured);
+    EXPECT_EQ(w.size(), 9 + most * 12 + 4 + 67 + 4 + 3 * (9 + most * 12) + 4);
+    EXPECT_LE(w.size(), measured);
 }
 
 TEST_F(ExchangeWriterTest, FacetsGoInMaterialOrderAndUnknownMaterialsAreLeftOut) {
-    SgPolyMesh *mesh = makeMesh({{0, 0, 0}, {1, 0, 0}, {0, 1, 0}, {1, 1, 0}, {2, 2, 0}});
-    addFacet(*mesh, 1, {{0}, {1}, {2}});           // triangle of material 1 first
-    addFacet(*mesh, 0, {{0}, {1}, {3}, {2}});      // quad of material 0
-    addFacet(*mesh, 5, {{1}, {2}, {3}});           // material 5 of 2: left out
-    addFacet(*mesh, 0, {{3}, {2}, {1}});           // triangle of material 0
-    addFacet(*mesh, 1, {{0}, {1}, {2}, {3}, {4}}); // polygon of material 1
+    SgPolyMesh *mesh = sgTestMesh({{0, 0, 0}, {1, 0, 0}, {0, 1, 0}, {1, 1, 0}, {2, 2, 0}});
+    sgTestAddFacet(*mesh, 1, {{0}, {1}, {2}});           // triangle of material 1 first
+    sgTestAddFacet(*mesh, 0, {{0}, {1}, {3}, {2}});      // quad of material 0
+    sgTestAddFacet(*mesh, 5, {{1}, {2}, {3}});           // material 5 of 2: left out
+    sgTestAddFacet(*mesh, 0, {{3}, {2}, {1}});           // triangle of material 0
+    sgTestAddFacet(*mesh, 1, {{0}, {1}, {2}, {3}, {4}}); // polygon of material 1
     auto node = prop("O", mesh, {new BareMaterial("a"), new BareMaterial("b")});
     const QByteArray r = writeNode(node.get());
     qsizetype at = 9 + 5 * 12 + 4 + 4 + 2 * 63;
@@ -185,7 +199,7 @@ TEST_F(ExchangeWriterTest, MaterialEntryRules) {
     mapped->setOpacityStrength(0.2f);
     mapped->getOpacityControl()->setMapped(true);
     auto *bare = new BareMaterial("bare");
-    auto node = prop("X", makeMesh({}), {material, mapped, bare});
+    auto node = prop("X", sgTestMesh({}), {material, mapped, bare});
     const QByteArray r = writeNode(node.get());
 
     qsizetype at = 4 + 1 + 4 + 4 + 4; // name, V, U, M
@@ -235,7 +249,7 @@ TEST_F(ExchangeWriterTest, ImagesAreCopiedAsJpegOncePerImageFileUnderSafeUniqueN
     auto *second = new SgDefaultMaterial("second");
     second->setColorMap(wood);
     mapBump(*second, otherWood);
-    auto node = prop("W", makeMesh({}), {first, second});
+    auto node = prop("W", sgTestMesh({}), {first, second});
 
     const QString copy = SgMaterialBlockWriter::jpegCopyPath(wood);
     EXPECT_TRUE(QRegularExpression(".*/FacetorMaps/wood-[0-9a-f]{8}\\.jpg").match(copy).hasMatch())
@@ -261,6 +275,15 @@ TEST_F(ExchangeWriterTest, ImagesAreCopiedAsJpegOncePerImageFileUnderSafeUniqueN
     QFile::resize(copy, 3);
     EXPECT_EQ(SgMaterialBlockWriter::exportTextureAsJpeg(wood), copy);
     EXPECT_EQ(QFileInfo(copy).size(), 3);
+    // One older than its image (the image was edited since) is written again.
+    {
+        QFile older(copy);
+        ASSERT_TRUE(older.open(QIODevice::ReadWrite));
+        older.setFileTime(QFileInfo(source).lastModified().addSecs(-60),
+                          QFileDevice::FileModificationTime);
+    }
+    EXPECT_EQ(SgMaterialBlockWriter::exportTextureAsJpeg(wood), copy);
+    EXPECT_GT(QFileInfo(copy).size(), 3);
 
     // A name beyond 8 bits travels as an ASCII name the modeler can open.
     const QString accented =
@@ -285,7 +308,7 @@ TEST_F(ExchangeWriterTest, LongImagePathsStayInsideTheMeasuredSize) {
     auto *material = new SgDefaultMaterial("long");
     material->setColorMap(sgApp->getImageMgr()->getImage(source));
     mapBump(*material, sgApp->getImageMgr()->getImage(source));
-    auto node = prop("L", makeMesh({}), {material});
+    auto node = prop("L", sgTestMesh({}), {material});
 
     SgExchangeWriter writer(node.get(), QString());
     QByteArray buffer(writer.getSize() + 16, '\x7f');
@@ -297,8 +320,8 @@ TEST_F(ExchangeWriterTest, LongImagePathsStayInsideTheMeasuredSize) {
 }
 
 TEST_F(ExchangeWriterTest, AShapeWithoutMaterialsOrUVsStillFits) {
-    SgPolyMesh *mesh = makeMesh({{0, 0, 0}, {1, 0, 0}, {0, 1, 0}});
-    addFacet(*mesh, 0, {{0}, {1}, {2}});
+    SgPolyMesh *mesh = sgTestMesh({{0, 0, 0}, {1, 0, 0}, {0, 1, 0}});
+    sgTestAddFacet(*mesh, 0, {{0}, {1}, {2}});
     auto node = prop("N", mesh, {});
     std::int32_t measured = 0;
     const QByteArray r = writeNode(node.get(), QString(), &measured);
@@ -320,7 +343,7 @@ TEST_F(ExchangeWriterTest, SubdivisionPatchesAreWrittenAsQuads) {
     shape->setGeometry(subd);
     shape->addMaterial(new BareMaterial("a"));
     shape->addMaterial(new BareMaterial("b"));
-    std::unique_ptr<SgNode> node(makeNode("S", shape));
+    std::unique_ptr<SgNode> node(sgTestAttach(new SgNode("S"), shape));
 
     std::int32_t measured = 0;
     const QByteArray r = writeNode(node.get(), QString(), &measured);
@@ -351,17 +374,22 @@ TEST_F(ExchangeWriterTest, NothingToSendMeasuresZeroAndWritesNothing) {
 }
 
 TEST_F(ExchangeWriterTest, ADestinationTooSmallIsNeverOverrun) {
-    SgPolyMesh *mesh = makeMesh({{0, 0, 0}, {10, 0, 0}, {0, 10, 0}});
-    addFacet(*mesh, 0, {{0}, {1}, {2}});
+    SgPolyMesh *mesh = sgTestMesh({{0, 0, 0}, {10, 0, 0}, {0, 10, 0}});
+    sgTestAddFacet(*mesh, 0, {{0}, {1}, {2}});
     auto node = prop("A", mesh, {new BareMaterial("a-long-material-name")});
     SgExchangeWriter writer(node.get(), QString());
-    for (const int capacity : {3, 60, 130}) {
+    // Every capacity short of the record fails without a byte past it; the exact one fits.
+    QByteArray whole(200, '\x7f');
+    const std::int32_t size = writer.write(whole.data(), 200);
+    ASSERT_GT(size, 100);
+    for (int capacity = 0; capacity < size; ++capacity) {
         clearLog();
         QByteArray buffer(200, '\x7f');
-        EXPECT_EQ(writer.write(buffer.data(), capacity), 0);
-        EXPECT_EQ(buffer.mid(capacity), QByteArray(200 - capacity, '\x7f'));
-        EXPECT_TRUE(logLines().contains("Error writting node to shared memory map."));
+        ASSERT_EQ(writer.write(buffer.data(), capacity), 0) << capacity;
+        ASSERT_EQ(buffer.mid(capacity), QByteArray(200 - capacity, '\x7f')) << capacity;
+        EXPECT_EQ(logLines().isEmpty(), capacity == 0) << capacity; // the failure is logged
     }
+    EXPECT_EQ(writer.write(whole.data(), size), size);
     // A string that does not fit says so too.
     clearLog();
     QByteArray buffer(200, '\x7f');

@@ -54,7 +54,7 @@ TEST(SgSharedMemoryPosix, KilledLockHolderReleasesTheLock) {
     ASSERT_TRUE(peer.ok("open " + key));
     ASSERT_TRUE(peer.ok("create 16"));
     ASSERT_TRUE(peer.ok("attach 1"));
-    SgSharedMemory memory(key);
+    SgTestSegment memory(key);
     ASSERT_TRUE(memory.attach(SgSharedMemory::kReadWrite));
     ASSERT_TRUE(peer.ok("lock"));
 
@@ -64,7 +64,7 @@ TEST(SgSharedMemoryPosix, KilledLockHolderReleasesTheLock) {
 
     peer.kill();
     const auto afterKill = Clock::now();
-    ASSERT_TRUE(memory.lock());
+    ASSERT_TRUE(memory.lock()) << kSgTestStuckLock;
     EXPECT_LT(msSince(afterKill), 1000);
     memory.unlock();
     EXPECT_TRUE(memory.remove(SgSharedMemory::kRemoveLocked));
@@ -79,7 +79,7 @@ TEST(SgSharedMemoryPosix, KilledHoldersLeaveNothingOnceTheSurvivorRemoves) {
         ASSERT_TRUE(peer.ok("open " + key));
         ASSERT_TRUE(peer.ok("create 16"));
         ASSERT_TRUE(peer.ok("attach 1"));
-        SgSharedMemory memory(key);
+        SgTestSegment memory(key);
         ASSERT_TRUE(memory.attach(SgSharedMemory::kReadWrite));
         EXPECT_EQ(memory.attachCount(), 2);
         peer.kill();
@@ -100,7 +100,7 @@ TEST(SgSharedMemoryPosix, KilledHoldersLeaveNothingOnceTheSurvivorRemoves) {
     ASSERT_TRUE(peer.ok("lock"));
     peer.kill();
     EXPECT_FALSE(objectsOf(lone).empty());
-    SgSharedMemory memory(lone);
+    SgTestSegment memory(lone);
     EXPECT_FALSE(memory.exists());
     ASSERT_TRUE(memory.create(16));
     ASSERT_TRUE(memory.attach(SgSharedMemory::kReadWrite));
@@ -113,11 +113,11 @@ TEST(SgSharedMemoryPosix, KilledHoldersLeaveNothingOnceTheSurvivorRemoves) {
 
 TEST(SgSharedMemoryPosix, ObjectsArePrivateToTheUser) {
     const std::string key = uniqueKey("mode");
-    SgSharedMemory memory(key);
+    SgTestSegment memory(key);
     EXPECT_FALSE(memory.lock()); // a lock on a missing segment creates nothing
     EXPECT_TRUE(objectsOf(key).empty());
     ASSERT_TRUE(memory.create(16));
-    ASSERT_TRUE(memory.lock());
+    ASSERT_TRUE(memory.lock()) << kSgTestStuckLock;
     const std::vector<std::string> objects = objectsOf(key);
     EXPECT_EQ(objects.size(), 3u);
     for (const std::string &name : objects) {
@@ -136,7 +136,7 @@ TEST(SgSharedMemoryPosix, ObjectsArePrivateToTheUser) {
     const int fd = shm_open(name.c_str(), O_RDWR | O_CREAT | O_EXCL, 0600);
     ASSERT_GE(fd, 0);
     ASSERT_EQ(fchmod(fd, 0644), 0);
-    SgSharedMemory intruded(exposed);
+    SgTestSegment intruded(exposed);
     EXPECT_FALSE(intruded.exists());
     EXPECT_FALSE(intruded.create(16));
     EXPECT_EQ(intruded.status(), SgSharedMemory::StatusFailed);
@@ -151,7 +151,7 @@ TEST(SgSharedMemoryPosix, ObjectsArePrivateToTheUser) {
 TEST(SgSharedMemoryPosix, ManyProcessesChurningOneKeyLoseNoUpdate) {
     const std::string anchored = uniqueKey("anchored");
     const std::string loose = uniqueKey("loose");
-    SgSharedMemory memory(anchored);
+    SgTestSegment memory(anchored);
     ASSERT_TRUE(memory.create(64));
     ASSERT_TRUE(memory.attach(SgSharedMemory::kReadWrite));
 
@@ -170,7 +170,7 @@ TEST(SgSharedMemoryPosix, ManyProcessesChurningOneKeyLoseNoUpdate) {
     long long ownIncrements = 0;
     const auto start = Clock::now();
     while (msSince(start) < 2000) {
-        ASSERT_TRUE(memory.lock());
+        ASSERT_TRUE(memory.lock()) << kSgTestStuckLock;
         std::uint32_t value = readWord(memory, 0) + 1;
         std::memcpy(memory.data(), &value, sizeof value);
         memory.unlock();

@@ -29,22 +29,22 @@ void writeWord(SgSharedMemory &memory, int offset, std::uint32_t value) {
 } // namespace
 
 TEST(SgSharedMemory, DerivesNamesFromKeyBytes) {
-    SgSharedMemory abc("abc");
+    SgTestSegment abc("abc");
     EXPECT_EQ(abc.dataName(), "sgsharedmemory-616263");
     EXPECT_EQ(abc.lockName(), "sgsharedmemory-616263-lock");
     EXPECT_EQ(abc.referenceName(), "sgsharedmemory-616263-ref");
     EXPECT_EQ(abc.status(), SgSharedMemory::StatusFailed);
 
-    SgSharedMemory bytes(std::string("\xff\x01 \x80", 4));
+    SgTestSegment bytes(std::string("\xff\x01 \x80", 4));
     EXPECT_EQ(bytes.dataName(), "sgsharedmemory-ff012080");
 
-    SgSharedMemory control(kSgControlSegmentKey);
+    SgTestSegment control(kSgControlSegmentKey);
     EXPECT_EQ(control.dataName(),
               "sgsharedmemory-46414345544f525f4252494447455f5354415449435f4d4150");
 }
 
 TEST(SgSharedMemory, RejectsBadSizeAndEmptyKeyLeavingNothingOpen) {
-    SgSharedMemory memory(uniqueKey("size"));
+    SgTestSegment memory(uniqueKey("size"));
     EXPECT_FALSE(memory.create(0));
     EXPECT_EQ(memory.status(), SgSharedMemory::StatusBadSize);
     EXPECT_FALSE(memory.create(-5));
@@ -52,14 +52,14 @@ TEST(SgSharedMemory, RejectsBadSizeAndEmptyKeyLeavingNothingOpen) {
     EXPECT_FALSE(memory.exists());
     EXPECT_FALSE(memory.lock());
 
-    SgSharedMemory empty("");
+    SgTestSegment empty("");
     EXPECT_FALSE(empty.create(16));
     EXPECT_EQ(empty.status(), SgSharedMemory::StatusEmptyKey);
     EXPECT_FALSE(empty.exists());
 }
 
 TEST(SgSharedMemory, MissingSegmentFailsLockAttachAndDetach) {
-    SgSharedMemory memory(uniqueKey("missing"));
+    SgTestSegment memory(uniqueKey("missing"));
     long long fastest = 1000;
     for (int attempt = 0; attempt < 3; ++attempt) { // the fastest of three, against load spikes
         const auto start = Clock::now();
@@ -83,7 +83,7 @@ TEST(SgSharedMemory, MissingSegmentFailsLockAttachAndDetach) {
 
 TEST(SgSharedMemory, TwoProcessesShareDataCountAndRefuseSecondCreate) {
     const std::string key = uniqueKey("share");
-    SgSharedMemory memory(key);
+    SgTestSegment memory(key);
     ASSERT_TRUE(memory.create(64));
     EXPECT_TRUE(memory.exists());
     EXPECT_FALSE(memory.isAttached());
@@ -119,14 +119,14 @@ TEST(SgSharedMemory, TwoProcessesShareDataCountAndRefuseSecondCreate) {
 
 TEST(SgSharedMemory, LockIsExclusiveNestedAndTimed) {
     const std::string key = uniqueKey("lock");
-    SgSharedMemory memory(key);
+    SgTestSegment memory(key);
     ASSERT_TRUE(memory.create(16));
     ShmPeerProcess peer;
     ASSERT_TRUE(peer.ok("open " + key));
     ASSERT_TRUE(peer.ok("attach 1"));
 
-    ASSERT_TRUE(memory.lock());
-    ASSERT_TRUE(memory.lock());
+    ASSERT_TRUE(memory.lock()) << kSgTestStuckLock;
+    ASSERT_TRUE(memory.lock()) << kSgTestStuckLock;
     EXPECT_EQ(memory.lockDepth(), 2);
     memory.unlock();
     EXPECT_EQ(memory.lockDepth(), 1);
@@ -160,7 +160,7 @@ TEST(SgSharedMemory, SegmentOutlivesDestroyedCreatorAndVanishesWithTheLastHolder
         ASSERT_TRUE(peer.ok("attach 1"));
         ASSERT_TRUE(peer.ok("write 4 777"));
 
-        SgSharedMemory memory(key);
+        SgTestSegment memory(key);
         ASSERT_TRUE(memory.attach(SgSharedMemory::kReadWrite));
         EXPECT_EQ(memory.size(), 32);
         ASSERT_TRUE(peer.ok("destroy")); // the creator's object goes while we are attached
@@ -168,15 +168,15 @@ TEST(SgSharedMemory, SegmentOutlivesDestroyedCreatorAndVanishesWithTheLastHolder
         EXPECT_EQ(memory.attachCount(), 1);
         peer.quit(); // and then its process
         EXPECT_TRUE(memory.isAttached());
-        EXPECT_TRUE(SgSharedMemory(key).exists());
+        EXPECT_TRUE(SgTestSegment(key).exists());
         EXPECT_EQ(readWord(memory, 4), 777u);
     }
-    EXPECT_FALSE(SgSharedMemory(key).exists());
+    EXPECT_FALSE(SgTestSegment(key).exists());
 }
 
 TEST(SgSharedMemory, RemoveUncountsAndWaitsForTheOthers) {
     const std::string key = uniqueKey("remove");
-    SgSharedMemory memory(key);
+    SgTestSegment memory(key);
     ASSERT_TRUE(memory.create(16));
     ASSERT_TRUE(memory.attach(SgSharedMemory::kReadWrite));
     ShmPeerProcess peer;
@@ -199,7 +199,7 @@ TEST(SgSharedMemory, RemoveUncountsAndWaitsForTheOthers) {
     ASSERT_TRUE(memory.attach(SgSharedMemory::kReadWrite));
     ASSERT_TRUE(peer.ok("attach 0"));
     EXPECT_EQ(memory.attachCount(), 2);
-    ASSERT_TRUE(memory.lock()); // an outer level that remove gives back as well
+    ASSERT_TRUE(memory.lock()) << kSgTestStuckLock; // an outer level that remove gives back as well
     EXPECT_TRUE(memory.remove(SgSharedMemory::kRemoveLocked));
     EXPECT_EQ(peer.call("count").at(2), 1);
     EXPECT_EQ(peer.call("trylock 0").at(0), 1);
@@ -212,16 +212,16 @@ TEST(SgSharedMemory, RemoveUncountsAndWaitsForTheOthers) {
     EXPECT_TRUE(memory.remove(SgSharedMemory::kRemoveWhenAlone));
     EXPECT_LT(msSince(alone), 1000);
     peer.quit();
-    EXPECT_FALSE(SgSharedMemory(key).exists());
+    EXPECT_FALSE(SgTestSegment(key).exists());
 }
 
 TEST(SgSharedMemory, APeerKilledHoldingTheLockCostsOnlyBoundedWaits) {
     const std::string key = uniqueKey("killheld");
-    SgSharedMemory memory(key);
+    SgTestSegment memory(key);
     ASSERT_TRUE(memory.create(16));
     ASSERT_TRUE(memory.attach(SgSharedMemory::kReadWrite));
     memory.setWaitLimit(50);
-    auto other = std::make_unique<SgSharedMemory>(key);
+    auto other = std::make_unique<SgTestSegment>(key);
     other->setWaitLimit(50);
     ASSERT_TRUE(other->attach(SgSharedMemory::kReadWrite));
     {
@@ -255,9 +255,9 @@ TEST(SgSharedMemory, APeerKilledHoldingTheLockCostsOnlyBoundedWaits) {
     memory.detach();
     EXPECT_TRUE(memory.remove(SgSharedMemory::kRemoveUnlocked));
     EXPECT_LT(msSince(start), 400);
-    EXPECT_FALSE(SgSharedMemory(key).exists());
+    EXPECT_FALSE(SgTestSegment(key).exists());
     // With the last handle gone the key starts afresh, its lock free.
-    SgSharedMemory fresh(key);
+    SgTestSegment fresh(key);
     ASSERT_TRUE(fresh.create(16));
     EXPECT_TRUE(fresh.tryLock(0));
     fresh.unlock();

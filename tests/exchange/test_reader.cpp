@@ -66,10 +66,10 @@ std::vector<Facet> facetsByKind(const SgPolyMesh &mesh, bool withUVs) {
 } // namespace
 
 TEST_F(ExchangeReaderTest, ReturnedRecordBecomesAShape) {
-    SgPolyMesh *mesh =
-        makeMesh({{1, 2, 3}, {0, 0, 0}, {1, 0, 0}, {0, 1, 0}, {1, 1, 0}}, {{0.5f, 0.25f}, {1, 1}});
-    addFacet(*mesh, 1, {{0, 1}, {1, 0}, {2, -1}});
-    addFacet(*mesh, 0, {{1, 0}, {2, 0}, {4, 1}, {3, 1}});
+    SgPolyMesh *mesh = sgTestMesh({{1, 2, 3}, {0, 0, 0}, {1, 0, 0}, {0, 1, 0}, {1, 1, 0}},
+                                  {{0.5f, 0.25f}, {1, 1}});
+    sgTestAddFacet(*mesh, 1, {{0, 1}, {1, 0}, {2, -1}});
+    sgTestAddFacet(*mesh, 0, {{1, 0}, {2, 0}, {4, 1}, {3, 1}});
     std::unique_ptr<SgPolyMesh> owner(mesh);
     SgReturnMaterial skin;
     skin.name = "skin";
@@ -122,7 +122,8 @@ TEST_F(ExchangeReaderTest, ReturnedRecordBecomesAShape) {
 }
 
 TEST_F(ExchangeReaderTest, EmptyBlocksAndUnknownFacetTypes) {
-    // name "E", V = 3, U = 0, M = 0, F = 3: 'X' (no corners), 'T', a 'P' of 2 corners; trailer.
+    // name "E", V = 3, U = 0, M = 0, F = 4: 'X' (no corners), 'T' in material 1 of 1 (read as
+    // 0), a 'P' of 2 corners, a 'P' of 5 corners in material 1; trailer.
     const QByteArray record = QByteArray::fromHex(
         "01000000"
         "45"
@@ -130,11 +131,11 @@ TEST_F(ExchangeReaderTest, EmptyBlocksAndUnknownFacetTypes) {
         "0000803f000000400000404000000000000000000000000000000000000000000000803f"
         "00000000"
         "00000000"
-        "03000000"
+        "04000000"
         "58"
         "00000000"
         "54"
-        "00000000"
+        "01000000"
         "000000000700000009000000"
         "010000000000000000000000"
         "020000000000000000000000"
@@ -143,14 +144,25 @@ TEST_F(ExchangeReaderTest, EmptyBlocksAndUnknownFacetTypes) {
         "02000000"
         "000000000000000000000000"
         "010000000000000000000000"
+        "50"
+        "01000000"
+        "05000000"
+        "000000000000000000000000"
+        "010000000000000000000000"
+        "020000000000000000000000"
+        "000000000000000000000000"
+        "010000000000000000000000"
         "00000000");
     auto shape = read(record);
     ASSERT_TRUE(shape);
     const SgPolyMesh *mesh = shape->getPolyMesh();
     EXPECT_EQ(mesh->getVertex(0), SgVec3(10, 20, 30));
     EXPECT_FALSE(mesh->getUVList());
-    ASSERT_EQ(mesh->getFacetCount(), 1);
+    ASSERT_EQ(mesh->getFacetCount(), 2);
     EXPECT_EQ(mesh->getTriangleCorners(0)[0], (SgFaceCorner{0, -1, -1})); // UV means nothing
+    EXPECT_EQ(mesh->getTriangleMaterial(0), 0);
+    ASSERT_EQ(mesh->getPolygonCount(), 1);
+    EXPECT_EQ(mesh->getPolygonMaterial(0), 0);
     ASSERT_EQ(shape->getMaterialCount(), 1);
     EXPECT_EQ(shape->getMaterial(0)->getName(), "default");
     EXPECT_TRUE(logLines().isEmpty());
@@ -168,10 +180,10 @@ TEST_F(ExchangeReaderTest, FigureRoundTripKeepsVerticesUVsAndFacetOrder) {
         std::vector<SgVec3> moved = points;
         for (SgVec3 &p : moved)
             p += SgVec3(100.0f * float(b + 1), 0, 0);
-        SgPolyMesh *mesh = makeMesh(moved, uvs);
-        addFacet(*mesh, 1, {{0, 0}, {1, 1}, {2, 2}});
-        addFacet(*mesh, 0, {{0, 0}, {1, 1}, {3, 3}, {2, 2}});
-        addFacet(*mesh, 0, {{1, 1}, {3, 3}, {2, 2}});
+        SgPolyMesh *mesh = sgTestMesh(moved, uvs);
+        sgTestAddFacet(*mesh, 1, {{0, 0}, {1, 1}, {2, 2}});
+        sgTestAddFacet(*mesh, 0, {{0, 0}, {1, 1}, {3, 3}, {2, 2}});
+        sgTestAddFacet(*mesh, 0, {{1, 1}, {3, 3}, {2, 2}});
         auto *shape = new SgPolyShape(bone->getName());
         shape->setPolyMesh(mesh);
         shape->addMaterial(new SgDefaultMaterial(b == 0 ? "skin" : "nails"));

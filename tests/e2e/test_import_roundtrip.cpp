@@ -1,0 +1,353 @@
+// Returned geometry imported through the real reference modeler: the bridge in this process,
+// the modeler as a second process that edits what it receives and sends it straight back. The
+// returns go through the bridge's own questions, or through the "Target Importer" dialog when
+// the application setting "FacetorBridgeTools" is not 0.
+
+#include "app/sgobjexport.h"
+#include "bridge/sgfacbridge.h"
+#include "tests/support/sgtestmodal.h"
+#include "tests/support/sgtestprocess.h"
+#include "tests/support/sgtestscene.h"
+
+#include "sgcore/app/sgappsettings.h"
+#include "sgcore/app/sgmessagesink.h"
+#include "sgcore/geometry/sgobject.h"
+#include "sgcore/geometry/sgpolymesh.h"
+#include "sgcore/geometry/sgpolyshape.h"
+#include "sgcore/io/sgobjreader.h"
+#include "sgcore/io/sgscenefile.h"
+#include "sgcore/materials/sgdefaultmaterial.h"
+#include "sgcore/morph/sgmorph.h"
+#include "sgcore/morph/sgmorphdeltas.h"
+#include "sgcore/properties/sgfloatproperty.h"
+#include "sgcore/scene/sgbone.h"
+#include "sgcore/scene/sgscene.h"
+#include "sgcore/scene/sgskeleton.h"
+#include "sgcore/widgets/sgbasicdialog.h"
+
+#include <QComboBox>
+#include <QDialogButtonBox>
+#include <QElapsedTimer>
+#include <QMainWindow>
+#include <QMessageBox>
+#include <QPushButton>
+#include <QTextBrowser>
+
+#include <gtest/gtest.h>
+
+namespace {
+
+class TestBridge : public SgFacBridge {
+public:
+    using SgFacBridge::executeAction;
+    using SgFacBridge::importReturnedShape;
+};
+
+// One round trip: the selected nodes go to the modeler, which applies `edit` and quits once
+// its returns have been read; `answers` answer the windows the import opens meanwhile.
+class RoundTrip : public SgTestModeler {
+public:
+    explicit RoundTrip(const QByteArray &edit)
+        : SgTestModeler(
+              FACETOR_BIN_DIR,
+              {{"FACETOR_EXPECT", "1"}, {"FACETOR_QUIT_WHEN_DONE", "1"}, {"FACETOR_EDIT", edit}}) {}
+    // Sends the selection and runs the event loop until the modeler has quit and every return
+    // has been imported; true when it did, and every answer was used.
+    bool run(QList<SgTestHandler> answers = {}) {
+        SgTestModalAnswer answer(answers, 30000);
+        TestBridge bridge;
+        bridge.executeAction();
+        const bool done =
+            bridge.isActive() &&
+            sgTestWaitUntil([&] { return !bridge.isActive() && bridge.pendingImports() == 0; },
+                            30000);
+        EXPECT_EQ(answer.answered(), answers.size()) << "a window was never opened";
+        return done;
+    }
+};
+
+SgMorph *morphOn(SgNode *node, const QString &name = QStringLiteral("MyMorph")) {
+    return node && node->getObject()
+               ? dynamic_cast<SgMorph *>(node->getObject()->findModifier(name))
+               : nullptr;
+}
+
+int modifierCount(const SgNode *node) {
+    return node->getObject() ? node->getObject()->getModifierCount() : 0;
+}
+
+// A figure of two bones, hip and then thigh, showing separate triangles.
+SgSkeleton *twoBoneFigure() {
+    auto *figure = new SgSkeleton(QStringLiteral("Body"));
+    auto *hip = sgTestNode<SgBone>(QStringLiteral("hip"),
+                                   sgTestPolygon({{0, 100, 3.25f}, {7, 100, 0}, {0, 112.5f, 0}}));
+    auto *thigh = sgTestNode<SgBone>(
+        QStringLiteral("thigh"), sgTestPolygon({{20, 100, 3.25f}, {27, 100, 0}, {20, 112.5f, 0}}));
+    figure->addBone(hip);
+    figure->addBone(thigh, hip);
+    return figure;
+}
+
+// Answers the "Changed Geometry" question with `button`.
+SgTestHandler changedGeometry(QMessageBox::StandardButton button) {
+    return sgTestAs<QMessageBox>([button](QMessageBox *box) {
+        EXPECT_EQ(box->windowTitle(), QStringLiteral("Changed Geometry"));
+        box->button(button)->click();
+    });
+}
+
+// Picks `action` in the dialog's "Action:" box.
+void pickAction(QWidget *dialog, const QString &action) {
+    auto *combo = dialog->findChild<QComboBox *>(QStringLiteral("FcBridgehAction"));
+    ASSERT_NE(combo, nullptr) << dialog->windowTitle().toStdString();
+    combo->setCurrentIndex(combo->findText(action));
+    emit combo->textActivated(action);
+}
+
+// Picks `action` in the bridge morph dialog and accepts it.
+SgTestHandler morphDialog(const QString &action) {
+    return [action](QWidget *modal) {
+        pickAction(modal, action);
+        qobject_cast<QDialog *>(modal)->accept();
+    };
+}
+
+QPushButton *okButton(QWidget *dialog) {
+    return static_cast<SgBasicDialog *>(dialog)->buttonBox()->button(QDialogButtonBox::Ok);
+}
+
+class ImportRoundTrip : public ::testing::Test {
+protected:
+    void SetUp() override { sgApp->getScene()->clear(); }
+    void TearDown() override {
+        SgAppSettings().remove(QStringLiteral("FacetorBridgeTools"));
+        sgApp->setInterface(nullptr);
+        sgApp->getScene()->clear();
+    }
+    SgScene *scene() const { return sgApp->getScene(); }
+    // A selected prop "Cup" whose material "Skin" has the diffuse colour (10, 20, 30).
+    SgDefaultMaterial *selectedCup() {
+        scene()->addNode(sgTestProp(QStringLiteral("Cup"), {1, 2, 3}));
+        m_cup = scene()->findNodeByLabel(QStringLiteral("Cup"));
+        scene()->selectNode(m_cup);
+        auto *skin = static_cast<SgDefaultMaterial *>(
+            m_cup->getObject()->getCurrentShape()->findMaterial(QStringLiteral("Skin")));
+        skin->setDiffuseColor(QColor(10, 20, 30));
+        return skin;
+    }
+    // The "Target Importer" in its bridge mode takes the returns, in a window.
+    void useTargetImporter() {
+        sgApp->setInterface(&m_window);
+        SgAppSettings().setInt(QStringLiteral("FacetorBridgeTools"), 1);
+    }
+
+    QMainWindow m_window;
+    SgNode *m_cup = nullptr;
+};
+
+} // namespace
+
+TEST_F(ImportRoundTrip, EditedFigureGivesOneMorphPerMovedBoneDrivenByItsControl) {
+    SgSkeleton *figure = twoBoneFigure();
+    scene()->addNode(figure);
+    scene()->selectNode(figure);
+    // Vertex 0 of the welded figure is the hip's first vertex; 0.5 modeler units are 5 host units.
+    RoundTrip trip("vertex=0,0,0,0.5");
+    ASSERT_TRUE(trip.run()) << trip.log().toStdString();
+
+    SgNode *hip = scene()->findNodeByLabel(QStringLiteral("hip"));
+    SgNode *thigh = scene()->findNodeByLabel(QStringLiteral("thigh"));
+    SgMorph *morph = morphOn(hip);
+    ASSERT_NE(morph, nullptr) << sgApp->getMessageSink()->logLines().join('\n').toStdString();
+    EXPECT_EQ(morphOn(thigh), nullptr);
+    EXPECT_EQ(morph->getDeltas()->getNumEntries(), 1);
+    EXPECT_EQ(morph->getValueChannel()->getLabel(), QStringLiteral("p_MyMorph"));
+    EXPECT_TRUE(morph->getValueChannel()->isHidden());
+    EXPECT_EQ(morph->getValueChannel()->getControllerCount(), 1);
+    auto *control =
+        dynamic_cast<SgFloatProperty *>(figure->findProperty(QStringLiteral("MyMorph")));
+    ASSERT_NE(control, nullptr);
+    EXPECT_FLOAT_EQ(control->getValue(), 1.0f);
+    EXPECT_FLOAT_EQ(control->getMin(), -1.0f);
+    EXPECT_TRUE(control->isClamped());
+    EXPECT_EQ(control->getPath(), QStringLiteral("Morphs"));
+    EXPECT_EQ(scene()->getNodeCount(), 3); // no prop
+
+    // Exported at value 1 the figure is the edited shape; at 0 it is the original again.
+    const QString file = trip.path(QStringLiteral("body.obj"));
+    ASSERT_TRUE(SgObjExport::exportNode(figure, file));
+    SgObjReader reader;
+    ASSERT_TRUE(reader.readFile(file)) << reader.getErrorString().toStdString();
+    const SgPolyMesh *out = reader.getMesh();
+    ASSERT_EQ(out->getVertexCount(), 6);
+    EXPECT_NEAR(out->getVertex(0).z, 8.25f, 1e-4);
+    for (int i = 1; i < 6; ++i) {
+        const SgNode *bone = i < 3 ? hip : thigh;
+        const SgVec3 rest = bone->getObject()->getCurrentShape()->getGeometry()->getVertex(i % 3);
+        for (int k = 0; k < 3; ++k)
+            EXPECT_NEAR(out->getVertex(i)[k], rest[k], 1e-4) << i;
+    }
+    control->setValue(0.0f);
+    EXPECT_NEAR(hip->getObject()->getCachedGeom()->getVertex(0).z, 3.25f, 1e-4);
+}
+
+TEST_F(ImportRoundTrip, AReturnThatCannotBeAMorphAsksWhetherToMakeAProp) {
+    SgSkeleton *figure = twoBoneFigure();
+    scene()->addNode(figure);
+    scene()->selectNode(figure);
+    // Unchanged: no morph; "No" keeps the scene as it was, the control property included.
+    ASSERT_TRUE(RoundTrip("move=0,0,0").run({changedGeometry(QMessageBox::No)}));
+    EXPECT_EQ(scene()->getNodeCount(), 3);
+    for (SgBone *bone : figure->getAllBones())
+        EXPECT_EQ(modifierCount(bone), 0);
+    EXPECT_EQ(figure->findProperty(QStringLiteral("MyMorph")), nullptr);
+    ASSERT_TRUE(RoundTrip("move=0,0,0").run({changedGeometry(QMessageBox::Yes)}));
+    EXPECT_NE(scene()->findNodeByLabel(QStringLiteral("Body (1)")), nullptr);
+    EXPECT_EQ(figure->findProperty(QStringLiteral("MyMorph")), nullptr);
+    scene()->clear();
+
+    // A fourth vertex: "No" changes nothing, "Yes" makes a prop of the returned shape.
+    selectedCup();
+    ASSERT_TRUE(RoundTrip("extra=0,0,5").run({changedGeometry(QMessageBox::No)}));
+    EXPECT_EQ(scene()->getNodeCount(), 1);
+    EXPECT_EQ(modifierCount(m_cup), 0);
+    EXPECT_EQ(m_cup->getObject()->getCurrentShape()->getGeometry()->getVertexCount(), 3);
+    ASSERT_TRUE(RoundTrip("extra=0,0,5").run({changedGeometry(QMessageBox::Yes)}));
+    EXPECT_EQ(modifierCount(m_cup), 0);
+    SgNode *prop = scene()->findNodeByLabel(QStringLiteral("Cup (1)"));
+    ASSERT_NE(prop, nullptr);
+    const SgVertexMesh *mesh = prop->getObject()->getCurrentShape()->getGeometry();
+    ASSERT_EQ(mesh->getVertexCount(), 4);
+    EXPECT_NEAR(mesh->getVertex(3).z, 50.0f, 1e-4);
+    scene()->clear();
+
+    // Namesakes are tried in scene order: the first Cup has four vertices, the one sent three.
+    auto *first = sgTestNode(QStringLiteral("Cup"),
+                             sgTestPolygon({{0, 0, 0}, {1, 0, 0}, {1, 1, 0}, {0, 1, 0}}));
+    scene()->addNode(first);
+    scene()->addNode(sgTestProp(QStringLiteral("Cup")));
+    SgNode *second = scene()->getNode(1);
+    scene()->selectNode(second);
+    ASSERT_TRUE(RoundTrip("move=0.5,0,0").run({changedGeometry(QMessageBox::Yes)}));
+    EXPECT_EQ(modifierCount(first), 0);
+    EXPECT_NE(morphOn(second), nullptr);
+    EXPECT_EQ(scene()->getNodeCount(), 2);
+}
+
+TEST_F(ImportRoundTrip, TheImportDialogsChooseMaterialsMorphOrProp) {
+    sgApp->setInterface(&m_window);
+    SgDefaultMaterial *skin = selectedCup();
+    const QColor specular = skin->getSpecularColor();
+    ASSERT_TRUE(RoundTrip("diffuse=1,0,0;move=0,1,0").run({morphDialog("Copy Materials")}));
+    EXPECT_EQ(skin->getDiffuseColor(), QColor(255, 0, 0));
+    EXPECT_EQ(skin->getSpecularColor(), specular);
+    EXPECT_EQ(modifierCount(m_cup), 0);
+    ASSERT_TRUE(RoundTrip("diffuse=0,1,0;move=0,1,0")
+                    .run({morphDialog("Create Morph And Copy Materials")}));
+    EXPECT_EQ(skin->getDiffuseColor(), QColor(0, 255, 0));
+    ASSERT_NE(morphOn(m_cup, QStringLiteral("My Morph")), nullptr);
+    EXPECT_EQ(morphOn(m_cup, QStringLiteral("My Morph"))->getValueChannel()->getPath(),
+              QStringLiteral("Morphs/FacetorBridge"));
+    // A cancelled dialog leaves everything as it was.
+    ASSERT_TRUE(RoundTrip("diffuse=0,0,1;move=0,1,0").run({[](QWidget *modal) {
+        qobject_cast<QDialog *>(modal)->reject();
+    }}));
+    EXPECT_EQ(skin->getDiffuseColor(), QColor(0, 255, 0));
+    EXPECT_EQ(modifierCount(m_cup), 1);
+    EXPECT_EQ(scene()->getNodeCount(), 1);
+    scene()->clear();
+
+    // The "Target Importer" in bridge mode: one in-memory source, no file buttons; cancelled,
+    // nothing changes.
+    useTargetImporter();
+    skin = selectedCup();
+    ASSERT_TRUE(RoundTrip("diffuse=0,0,1;move=0,1,0").run({[](QWidget *modal) {
+        EXPECT_EQ(modal->windowTitle(), QStringLiteral("Target Importer"));
+        EXPECT_EQ(modal->findChild<QPushButton *>(QStringLiteral("MorphLoaderBrowseBtn")), nullptr);
+        qobject_cast<QDialog *>(modal)->reject();
+    }}));
+    EXPECT_EQ(modifierCount(m_cup), 0);
+    EXPECT_EQ(skin->getDiffuseColor(), QColor(10, 20, 30));
+    // Morph and materials: the run makes the morph and shows its log; the materials are copied
+    // when the dialog closes.
+    ASSERT_TRUE(RoundTrip("diffuse=0,1,0;move=0,1,0").run({[&](QWidget *modal) {
+        pickAction(modal, QStringLiteral("Create Morph And Copy Materials"));
+        okButton(modal)->click();
+        auto *log = modal->findChild<QTextBrowser *>(QStringLiteral("MorphLoaderLog"));
+        ASSERT_NE(log, nullptr);
+        EXPECT_TRUE(log->isVisible());
+        EXPECT_EQ(modifierCount(m_cup), 1) << log->toPlainText().toStdString();
+        EXPECT_EQ(skin->getDiffuseColor(), QColor(10, 20, 30));
+        okButton(modal)->click();
+    }}));
+    EXPECT_EQ(skin->getDiffuseColor(), QColor(0, 255, 0));
+    ASSERT_EQ(modifierCount(m_cup), 1);
+    EXPECT_EQ(
+        static_cast<SgMorph *>(m_cup->getObject()->getModifier(0))->getDeltas()->getNumEntries(),
+        3);
+    // "Create Prop" closes at once and makes a prop.
+    ASSERT_TRUE(RoundTrip("move=0,1,0").run({[](QWidget *modal) {
+        pickAction(modal, QStringLiteral("Create Prop"));
+        EXPECT_FALSE(
+            modal->findChild<QWidget *>(QStringLiteral("MorphLoaderSourceList"))->isEnabled());
+        okButton(modal)->click();
+    }}));
+    EXPECT_EQ(modifierCount(m_cup), 1);
+    EXPECT_NE(scene()->findNodeByLabel(QStringLiteral("Cup (1)")), nullptr);
+    // A shape without geometry opens the dialog in file mode, which deals with it.
+    bool fileMode = false;
+    SgTestModalAnswer answer([&fileMode](QWidget *modal) {
+        fileMode =
+            modal->findChild<QPushButton *>(QStringLiteral("MorphLoaderBrowseBtn")) != nullptr &&
+            modal->findChild<QComboBox *>(QStringLiteral("FcBridgehAction")) == nullptr;
+        okButton(modal)->click(); // runs the empty list
+        okButton(modal)->click();
+    });
+    SgPolyShape shape(QStringLiteral("Cup"));
+    EXPECT_TRUE(TestBridge().importReturnedShape(&shape, m_cup));
+    EXPECT_TRUE(fileMode);
+    EXPECT_EQ(modifierCount(m_cup), 1);
+}
+
+TEST_F(ImportRoundTrip, ExampleFigureAndPropComeBackAsMorphsInTime) {
+    SgSceneFile file;
+    ASSERT_TRUE(file.load(QStringLiteral(SG_EXAMPLES_DIR "/demo/scene.json"), scene()))
+        << file.getErrorString().toStdString();
+    SgNode *figure = scene()->findNodeByLabel(QStringLiteral("Blobby"));
+    SgNode *box = scene()->findNodeByLabel(QStringLiteral("Box"));
+    ASSERT_NE(figure, nullptr);
+    ASSERT_NE(box, nullptr);
+    scene()->selectNode(figure);
+    scene()->selectNode(box, true);
+    RoundTrip trip("move=0,0.5,0");
+    trip.set("FACETOR_EXPECT", "2");
+    // From the send (the modeler's launch included) to each node's morph.
+    QElapsedTimer clock;
+    clock.start();
+    TestBridge bridge;
+    bridge.executeAction();
+    qint64 figureMs = -1;
+    qint64 boxMs = -1;
+    SgNode *hip = scene()->findNodeByLabel(QStringLiteral("hip"));
+    ASSERT_TRUE(sgTestWaitUntil(
+        [&] {
+            if (figureMs < 0 && morphOn(hip))
+                figureMs = clock.elapsed();
+            if (boxMs < 0 && morphOn(box))
+                boxMs = clock.elapsed();
+            return !bridge.isActive();
+        },
+        30000))
+        << trip.log().toStdString();
+    ASSERT_GE(figureMs, 0) << trip.log().toStdString();
+    ASSERT_GE(boxMs, 0) << trip.log().toStdString();
+    for (SgBone *bone : static_cast<SgSkeleton *>(figure)->getAllBones())
+        EXPECT_NE(morphOn(bone), nullptr) << bone->getLabel().toStdString();
+    // The prop's morph moves it by the edit: 0.5 modeler units are 5 host units.
+    const float restY = box->getObject()->getCurrentShape()->getGeometry()->getVertex(0).y;
+    morphOn(box)->getValueChannel()->setValue(1.0f);
+    EXPECT_NEAR(box->getObject()->getCachedGeom()->getVertex(0).y, restY + 5.0f, 1e-4);
+    std::printf("round trip from send to morph: figure %lld ms, prop %lld ms (modeler launch "
+                "included)\n",
+                figureMs, boxMs);
+}
