@@ -140,21 +140,18 @@ TEST(HeadlessDemo, ScriptFailuresAndArguments) {
     EXPECT_TRUE(thrown.err.contains(QStringLiteral(":2: Error: broken")))
         << thrown.err.toStdString();
     // So does a syntax error, a missing file, and an exception inside a waited-for callback.
-    EXPECT_NE(runScenara({QStringLiteral("--script"),
-                          writeScript(dir, QStringLiteral("syntax.js"), "var = ;\n")},
-                         env)
-                  .status,
-              0);
+    for (const auto &[name, text] :
+         {std::pair<const char *, QByteArray>{"syntax.js", "var = ;\n"},
+          {"later.js", "app.later(10, function () { throw new Error('late'); });\n"}})
+        EXPECT_NE(runScenara({QStringLiteral("--script"),
+                              writeScript(dir, QString::fromLatin1(name), text)},
+                             env)
+                      .status,
+                  0)
+            << name;
     EXPECT_NE(runScenara({QStringLiteral("--script"), dir.filePath(QStringLiteral("none.js"))}, env)
                   .status,
               0);
-    EXPECT_NE(
-        runScenara({QStringLiteral("--script"),
-                    writeScript(dir, QStringLiteral("later.js"),
-                                "app.later(10, function () { throw new Error('late'); });\n")},
-                   env)
-            .status,
-        0);
     // Host arguments reach the plug-ins' view of the command line; script arguments follow "--".
     const ScenaraRun args =
         runScenara({QStringLiteral("--script"),

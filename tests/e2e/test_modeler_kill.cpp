@@ -19,7 +19,6 @@
 #include <QElapsedTimer>
 #include <QFile>
 #include <QProcess>
-#include <QRandomGenerator>
 #include <QTimer>
 
 #include <algorithm>
@@ -245,51 +244,6 @@ TEST_F(ModelerKill, HostStaysResponsiveAndARestartedModelerWorks) {
     EXPECT_TRUE(poll.slowSteps().isEmpty()) << poll.slowSteps().join('\n').toStdString();
     std::printf("kill test: %d moments, %d poll steps, worst step %.2f ms, %lld ms in all\n", round,
                 poll.steps(), double(poll.worstNs()) / 1e6, total.elapsed());
-}
-
-TEST_F(ModelerKill, AtRandomMomentsTheSceneGetsAWholeMorphOrNothing) {
-    SgScene *scene = sgApp->getScene();
-    TestBridge bridge;
-    TimedPoll poll(bridge);
-    // Every checkpoint sleeps up to 15 ms, so that a kill after a random delay lands anywhere
-    // in the exchange; the restarted modeler takes the selection as complete once the host
-    // falls idle, however many nodes it receives.
-    m_modeler.set("FACETOR_PAUSE_JITTER_MS", "15");
-    const quint32 seed = QRandomGenerator::global()->generate();
-    QRandomGenerator random(seed);
-    SCOPED_TRACE(seed);
-    for (int round = 1; round <= 3; ++round) {
-        poll.setMoment(QStringLiteral("random %1").arg(round));
-        scene->addNode(sgTestProp(QStringLiteral("Cup%1").arg(round), {1, 2, 3}));
-        SgNode *cup = scene->getNode(scene->getNodeCount() - 1);
-        const int nodes = scene->getNodeCount();
-        {
-            ModelerKiller modeler(send(bridge, cup, QByteArray(), 1));
-            sgTestIdle(int(random.bounded(50, 450)));
-            ASSERT_TRUE(modeler.kill());
-        }
-        sgTestIdle(250);
-        EXPECT_EQ(bridge.pollTimer()->isActive(), bridge.isActive());
-        EXPECT_EQ(scene->getNodeCount(), nodes);
-        ASSERT_LE(modifierCount(cup), 1);
-        if (SgMorph *morph = morphOn(cup)) {
-            EXPECT_EQ(morph->getDeltas()->getNumEntries(), 3);
-        }
-
-        m_modeler.set("FACETOR_PAUSE_JITTER_MS", "0");
-        scene->addNode(sgTestProp(QStringLiteral("Mug%1").arg(round), {4, 5, 6}));
-        SgNode *mug = scene->getNode(scene->getNodeCount() - 1);
-        ModelerKiller restarted(send(bridge, mug, QByteArray(), 0));
-        m_modeler.set("FACETOR_PAUSE_JITTER_MS", "15");
-        ASSERT_TRUE(sgTestWaitUntil(
-            [&] { return !bridge.isActive() && bridge.pendingImports() == 0; }, 10000))
-            << log().toStdString();
-        EXPECT_NE(morphOn(mug), nullptr) << log().toStdString();
-        EXPECT_LE(modifierCount(cup), 1);
-        EXPECT_TRUE(sgTestWaitUntil([] { return sgTestLeftovers().isEmpty(); }, 2000))
-            << sgTestLeftovers().join(' ').toStdString();
-    }
-    EXPECT_TRUE(poll.slowSteps().isEmpty()) << poll.slowSteps().join('\n').toStdString();
 }
 
 TEST_F(ModelerKill, HostThatQuitsAfterAKilledModelerLeavesNothingBehind) {

@@ -1,6 +1,7 @@
 // The second process of the segment tests: reads one command per line on stdin, runs it on its
 // own SgSharedMemory object and answers one line on stdout: "<result> <status> [value...]".
 #include "exchange/shm/sgsharedmemory.h"
+#include "shmtestsupport.h"
 
 #include <chrono>
 #include <cstdint>
@@ -24,16 +25,6 @@ constexpr int kWaitLimitMs = 3000;
 
 std::int64_t elapsedMs(Clock::time_point since) {
     return std::chrono::duration_cast<std::chrono::milliseconds>(Clock::now() - since).count();
-}
-
-std::uint32_t readWord(const SgSharedMemory &memory, int offset) {
-    std::uint32_t value = 0;
-    std::memcpy(&value, memory.data() + offset, sizeof value);
-    return value;
-}
-
-void writeWord(SgSharedMemory &memory, int offset, std::uint32_t value) {
-    std::memcpy(memory.data() + offset, &value, sizeof value);
 }
 
 // Adds one to the word at `offset` under the lock; false when the lock was not had.

@@ -3,6 +3,8 @@
 #include "tests/support/sgtestsegment.h"
 
 #include <chrono>
+#include <cstdint>
+#include <cstring>
 #include <string>
 
 #ifdef _WIN32
@@ -24,4 +26,14 @@ inline long long msSince(std::chrono::steady_clock::time_point start) {
     return std::chrono::duration_cast<std::chrono::milliseconds>(std::chrono::steady_clock::now() -
                                                                  start)
         .count();
+}
+
+// The 32-bit word at `offset` of an attached segment, read and written in place.
+inline std::uint32_t readWord(const SgSharedMemory &memory, int offset) {
+    std::uint32_t value = 0;
+    std::memcpy(&value, memory.data() + offset, sizeof value);
+    return value;
+}
+inline void writeWord(SgSharedMemory &memory, int offset, std::uint32_t value) {
+    std::memcpy(memory.data() + offset, &value, sizeof value);
 }

@@ -14,20 +14,6 @@
 
 using Clock = std::chrono::steady_clock;
 
-namespace {
-
-std::uint32_t readWord(const SgSharedMemory &memory, int offset) {
-    std::uint32_t value = 0;
-    std::memcpy(&value, memory.data() + offset, sizeof value);
-    return value;
-}
-
-void writeWord(SgSharedMemory &memory, int offset, std::uint32_t value) {
-    std::memcpy(memory.data() + offset, &value, sizeof value);
-}
-
-} // namespace
-
 TEST(SgSharedMemory, DerivesNamesFromKeyBytes) {
     SgTestSegment abc("abc");
     EXPECT_EQ(abc.dataName(), "sgsharedmemory-616263");

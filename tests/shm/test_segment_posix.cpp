@@ -40,12 +40,6 @@ std::vector<std::string> objectsOf(const std::string &key) {
     return found;
 }
 
-std::uint32_t readWord(const SgSharedMemory &memory, int offset) {
-    std::uint32_t value = 0;
-    std::memcpy(&value, memory.data() + offset, sizeof value);
-    return value;
-}
-
 } // namespace
 
 TEST(SgSharedMemoryPosix, KilledLockHolderReleasesTheLock) {
@@ -171,8 +165,7 @@ TEST(SgSharedMemoryPosix, ManyProcessesChurningOneKeyLoseNoUpdate) {
     const auto start = Clock::now();
     while (msSince(start) < 2000) {
         ASSERT_TRUE(memory.lock()) << kSgTestStuckLock;
-        std::uint32_t value = readWord(memory, 0) + 1;
-        std::memcpy(memory.data(), &value, sizeof value);
+        writeWord(memory, 0, readWord(memory, 0) + 1);
         memory.unlock();
         ++ownIncrements;
         std::this_thread::sleep_for(std::chrono::microseconds(200));
