@@ -79,13 +79,26 @@ TEST_F(Deltas, MatchAPlainLoopWhateverTheMixOfMovedAndQuietVertices) {
     }
 }
 
-// Non-finite targets are refused in every scan path (test_morphcreation, all or nothing).
-TEST_F(Deltas, CountMismatchAndInvalidBaseGiveNoTable) {
+TEST_F(Deltas, CountMismatchAndInvalidTargetsGiveNoTable) {
     std::unique_ptr<SgPolyMesh> base(sgTestRowMesh(200));
     std::unique_ptr<SgPolyMesh> shorter(sgTestRowMesh(10, 1.0f));
     EXPECT_EQ(SgMorphLoader::computeDeltas(*base, *shorter), nullptr);
     EXPECT_EQ(statusLines().last(), QString("Vertex Count mismatch - delta calculation failed."));
 
+    // A coordinate that is not a number or infinite must never become a delta, wherever it is:
+    // beside a move, in a block without one, or in the tail.
+    for (float bad :
+         {std::numeric_limits<float>::quiet_NaN(), std::numeric_limits<float>::infinity()}) {
+        for (int at : {0, 100, 199}) {
+            std::unique_ptr<SgPolyMesh> morph(sgTestCopyVertices(*base));
+            morph->setVertex(5, base->getVertex(5) + SgVec3(1.0f, 0.0f, 0.0f));
+            const SgVec3 b = base->getVertex(at); // only one coordinate of the vertex is bad
+            morph->setVertex(at, SgVec3(b.x, bad, b.z));
+            EXPECT_EQ(SgMorphLoader::computeDeltas(*base, *morph), nullptr);
+            EXPECT_EQ(statusLines().last(),
+                      QString("Morph target has invalid coordinates - delta calculation failed."));
+        }
+    }
     // The fault in the node's own geometry is named as such, in a full block and in the tail.
     for (int at : {3, 70}) {
         std::unique_ptr<SgPolyMesh> broken(sgTestRowMesh(72));

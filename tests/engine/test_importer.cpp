@@ -10,7 +10,6 @@
 #include "sharedsource/engine/sgmorphloader.h"
 #include "sharedsource/engine/sgmorphloadlog.h"
 
-#include <QFile>
 #include <QTemporaryDir>
 
 #include <memory>

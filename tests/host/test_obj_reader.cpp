@@ -1,12 +1,10 @@
 #include "sgcore/geometry/sgpolymesh.h"
 #include "sgcore/geometry/sgpolyshape.h"
 #include "sgcore/io/sgobjreader.h"
-#include "sgcore/materials/sgmaterial.h"
 #include "tests/support/sgtestmain.h"
 
 #include <gtest/gtest.h>
 
-#include <QFile>
 #include <QTemporaryDir>
 
 #include <charconv>

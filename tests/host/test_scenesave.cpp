@@ -2,12 +2,10 @@
 // and channels, control properties and their links, returned props, and copied materials.
 
 #include "sgcore/app/sgimagemgr.h"
-#include "sgcore/geometry/sgobject.h"
 #include "sgcore/geometry/sgpolymesh.h"
 #include "sgcore/geometry/sgpolyshape.h"
 #include "sgcore/io/sgscenefile.h"
 #include "sgcore/materials/sgdefaultmaterial.h"
-#include "sgcore/materials/sgtexture.h"
 #include "sgcore/morph/sgerclink.h"
 #include "sgcore/morph/sgmorph.h"
 #include "sgcore/morph/sgmorphdeltas.h"

@@ -5,9 +5,7 @@
 
 #include "sgcore/app/sgapp.h"
 #include "sgcore/app/sgmessagesink.h"
-#include "sgcore/geometry/sgobject.h"
 #include "sgcore/geometry/sgpolymesh.h"
-#include "sgcore/geometry/sgpolyshape.h"
 #include "sgcore/importer/sgfileiosettings.h"
 #include "sgcore/io/sgobjreader.h"
 #include "sgcore/morph/sgmorph.h"
@@ -24,7 +22,6 @@
 #include "tests/support/sgtestscene.h"
 
 #include <QAbstractButton>
-#include <QFile>
 #include <QMessageBox>
 #include <QTemporaryDir>
 #include <QTreeWidgetItemIterator>

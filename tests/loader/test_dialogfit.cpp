@@ -16,7 +16,6 @@
 
 #include <QComboBox>
 #include <QDir>
-#include <QFile>
 #include <QImage>
 #include <QTextBrowser>
 #include <gtest/gtest.h>

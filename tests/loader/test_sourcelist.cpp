@@ -3,9 +3,7 @@
 #include "tests/support/sgtestmodal.h"
 
 #include "sgcore/script/sgscript.h"
-#include "sharedsource/engine/sgmorphloader.h"
 #include "sharedsource/loaderui/sgmorphfileitem.h"
-#include "sharedsource/loaderui/sgmorphmeshitem.h"
 #include "sharedsource/loaderui/sgmorphposeitem.h"
 #include "sharedsource/loaderui/sgmorphsourceboolitem.h"
 #include "sharedsource/loaderui/sgmorphsourcelist.h"
@@ -13,8 +11,6 @@
 #include <QDropEvent>
 #include <QMimeData>
 #include <QSignalSpy>
-#include <QTemporaryDir>
-#include <QTest>
 #include <QUrl>
 #include <gtest/gtest.h>
 

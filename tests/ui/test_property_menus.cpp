@@ -4,7 +4,6 @@
 #include "sgcore/properties/sgcolorproperty.h"
 #include "sgcore/properties/sgfloatproperty.h"
 #include "sgcore/properties/sgintproperty.h"
-#include "sgcore/properties/sgpropertygrouptree.h"
 #include "sgcore/scene/sgbone.h"
 #include "sgcore/scene/sgnode.h"
 #include "sgcore/scene/sgscene.h"
