@@ -67,8 +67,6 @@ TEST_F(MorphCreation, NewMorphCarriesDeltasChannelSettingsAndLogEntries) {
     EXPECT_FLOAT_EQ(channel->getMin(), -1.0f);
     EXPECT_FLOAT_EQ(channel->getMax(), 1.0f);
     EXPECT_TRUE(channel->isClamped());
-    EXPECT_TRUE(logLines().contains("Creating morph for Box..."));
-    EXPECT_TRUE(logLines().contains("Morph contains 1 deltas"));
 
     // The channel drives the cached geometry, clamped to its range.
     channel->setValue(2.0f);
