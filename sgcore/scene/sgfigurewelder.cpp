@@ -128,9 +128,11 @@ SgFaceCorner remapCorner(const SgFaceCorner &c, int32_t vertex, int32_t uvCount,
     return out;
 }
 
-// Appends `from[i]` mapped by `map` to `to` for every i.
+// Appends `from[i]` mapped by `map` to `to` for every i. The map is taken by value and holds
+// values, not references: the batch's stores could otherwise alias what it refers to, and the
+// compiler would load it again for every item.
 template <typename T, typename U, typename Map>
-void appendMapped(std::vector<T> &to, const std::vector<U> &from, Map &&map) {
+void appendMapped(std::vector<T> &to, const std::vector<U> &from, Map map) {
     SgBatchAppender<T> out(to);
     for (const U &item : from) {
         out.push(map(item));
@@ -140,17 +142,19 @@ void appendMapped(std::vector<T> &to, const std::vector<U> &from, Map &&map) {
 // Appends `bone`'s facets to `out` with vertex indices mapped by `vertexOf`.
 template <typename V>
 void appendFacets(SgPolyMesh &out, const SgPolyMesh &bone, const std::vector<uint8_t> &materialMap,
-                  int32_t group, int32_t uvOffset, V &&vertexOf) {
+                  int32_t group, int32_t uvOffset, V vertexOf) {
     const int32_t uvCount = bone.getUVCount();
     auto copyCorners = [&](const std::vector<SgFaceCorner> &from, std::vector<SgFaceCorner> &to) {
-        appendMapped(to, from, [&](const SgFaceCorner &c) {
+        appendMapped(to, from, [vertexOf, uvCount, uvOffset](const SgFaceCorner &c) {
             return remapCorner(c, vertexOf(c.vertex), uvCount, uvOffset);
         });
     };
+    const uint8_t *materials = materialMap.data();
+    const size_t materialCount = materialMap.size();
     auto copyFacets = [&](const std::vector<uint8_t> &mats, std::vector<uint8_t> &toMats,
                           std::vector<int32_t> &toGroups) {
-        appendMapped(toMats, mats, [&](uint8_t local) {
-            return local < materialMap.size() ? materialMap[local] : uint8_t(255);
+        appendMapped(toMats, mats, [materials, materialCount](uint8_t local) {
+            return local < materialCount ? materials[local] : uint8_t(255);
         });
         toGroups.insert(toGroups.end(), mats.size(), group);
     };
@@ -226,10 +230,15 @@ inline bool insideAny(const std::vector<SgBox3> &boxes, const SgVec3 &p) {
 template <typename Slices> std::vector<std::vector<SgBox3>> seamRegions(const Slices &slices) {
     std::vector<SgBox3> boxes(slices.size());
     for (size_t b = 0; b < slices.size(); ++b) {
+        // Grown in a local: the positions are floats as the box is, so a box in the vector
+        // would be stored and loaded again for every vertex.
+        SgBox3 box;
+        const SgVec3 *p = slices[b].source;
         const int32_t n = slices[b].base->getVertexCount();
         for (int32_t i = 0; i < n; ++i) {
-            boxes[b].extend(slices[b].source[size_t(i)]);
+            box.extend(p[i]);
         }
+        boxes[b] = box;
     }
     std::vector<std::vector<SgBox3>> regions(slices.size());
     for (size_t b = 0; b < slices.size(); ++b) {
@@ -312,11 +321,19 @@ SgPolyMesh *SgFigureWelder::getGeometry() const {
 }
 
 SgMap *SgFigureWelder::joinedUVs() const {
+    // Room for all at once: a list grown by doubling is copied again and again.
+    size_t total = 0;
+    for (const BoneSlice &s : m_slices) {
+        if (const SgMap *uvs = s.base->getUVList()) {
+            total += size_t(std::max(uvs->getValueCount(), 0));
+        }
+    }
     SgMap *uvList = nullptr;
     for (const BoneSlice &s : m_slices) {
         if (const SgMap *uvs = s.base->getUVList(); uvs && uvs->getValueCount() > 0) {
             if (!uvList) {
                 uvList = new SgMap(SgMap::UVMap);
+                uvList->values().reserve(total);
             }
             uvList->values().insert(uvList->values().end(), uvs->values().begin(),
                                     uvs->values().end());
@@ -337,7 +354,7 @@ void SgFigureWelder::complete() const {
     for (const BoneSlice &s : m_slices) {
         const int32_t group = welded->addFaceGroup(s.bone->getName());
         appendFacets(*welded, *s.base, s.materialMap, group, s.uvOffset,
-                     [&](int32_t v) { return s.weldIndex[size_t(v)]; });
+                     [weldIndex = s.weldIndex.data()](int32_t v) { return weldIndex[size_t(v)]; });
     }
 }
 
@@ -471,8 +488,6 @@ SgVertexMesh *SgFigureWelder::unWeld(const SgVertexMesh *edited) const {
     reserveFor(*out, m_slices);
     for (const BoneSlice &s : m_slices) {
         const int32_t group = out->addFaceGroup(s.bone->getName());
-        // The offset in a local: the batch's stores could otherwise alias it for the compiler,
-        // which then reloads it for every corner (twice the time of the whole copy).
         const int32_t offset = s.outStart;
         appendFacets(*out, *s.base, s.materialMap, group, s.uvOffset,
                      [offset](int32_t v) { return v + offset; });
