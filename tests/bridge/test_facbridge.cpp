@@ -551,7 +551,8 @@ TEST_F(BridgeAction, ANodeThatCannotBeWrittenIsReportedAndTheNextGoesOut) {
     EXPECT_EQ(peer.take(), SgHostMessage::NodeWritten);
     EXPECT_TRUE(bridge.isExchangeBusy());
     EXPECT_EQ(bridge.sendList().count(), 0);
-    ::kill(pid_t(bridge.modelerProcessId()), SIGKILL);
+    if (const qint64 pid = bridge.modelerProcessId(); pid > 0)
+        ::kill(pid_t(pid), SIGKILL);
 }
 
 TEST_F(BridgeAction, PropLabelsAreMadeUnique) {

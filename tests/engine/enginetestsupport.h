@@ -9,6 +9,7 @@
 #include "sgcore/scene/sgscene.h"
 #include "sgcore/scene/sgskeleton.h"
 #include "sharedsource/engine/sgmorphloaderquestions.h"
+#include "tests/support/sgtestmain.h"
 #include "tests/support/sgtestscene.h"
 
 #include <gtest/gtest.h>

@@ -20,11 +20,7 @@ using namespace enginetest;
 namespace {
 
 QString writeFile(const QTemporaryDir &dir, const QString &name, const QByteArray &text) {
-    const QString path = dir.filePath(name);
-    QFile file(path);
-    file.open(QIODevice::WriteOnly);
-    file.write(text);
-    return path;
+    return sgTestWriteFile(dir.filePath(name), text);
 }
 
 // OBJ text for the vertices of `mesh`, with vertex `moved` shifted by `by`, and one face.

@@ -84,11 +84,8 @@ TEST_F(ReverseDeformations, LoadedSculptOfAPoseIsReproducedWhenPosedAgain) {
 TEST_F(ReverseDeformations, PoseFileRunsOrAsksWhetherToGoOn) {
     Arm arm;
     QTemporaryDir dir;
-    const QString pose = dir.filePath("bend.sgs");
-    QFile file(pose);
-    ASSERT_TRUE(file.open(QIODevice::WriteOnly));
-    file.write("scene.setRotation('lower', 90, 0, 0);\nprint('bent');\n");
-    file.close();
+    const QString pose = sgTestWriteFile(dir.filePath("bend.sgs"),
+                                         "scene.setRotation('lower', 90, 0, 0);\nprint('bent');\n");
 
     SgMorphLoader loader;
     loader.setMorphName("Fix");
@@ -127,10 +124,7 @@ TEST_F(ReverseDeformations, ScriptsAreCheckedBeforeTheyRunAndReportTheirErrors) 
     Arm arm;
     QTemporaryDir dir;
     const auto write = [&](const QString &name, const QByteArray &text) {
-        QFile file(dir.filePath(name));
-        file.open(QIODevice::WriteOnly);
-        file.write(text);
-        return file.fileName();
+        return sgTestWriteFile(dir.filePath(name), text);
     };
     SgScript script;
     // A syntax error fails the load without running the lines before it.

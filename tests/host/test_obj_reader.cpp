@@ -2,6 +2,7 @@
 #include "sgcore/geometry/sgpolyshape.h"
 #include "sgcore/io/sgobjreader.h"
 #include "sgcore/materials/sgmaterial.h"
+#include "tests/support/sgtestmain.h"
 
 #include <gtest/gtest.h>
 
@@ -159,13 +160,10 @@ TEST(HostObjReader, RejectsMalformedInputWithFileAndLine) {
 
 TEST(HostObjReader, ReadsFilesAndOddButValidText) {
     QTemporaryDir dir;
-    const QString path = dir.filePath(QStringLiteral("a.obj"));
-    QFile f(path);
-    ASSERT_TRUE(f.open(QIODevice::WriteOnly));
     // No final newline, tabs, a w component, a forward reference and ignored statements.
-    f.write("o thing\ns 1\nf 1 2 3\nv\t+1.5 -2 3 1\nv 1e-50 0 0\nv .5 0 0 0.2 0.3 0.4\nl 1 2\nf 1 "
-            "2 3 # tail");
-    f.close();
+    const QString path = sgTestWriteFile(dir.filePath(QStringLiteral("a.obj")),
+                                         "o thing\ns 1\nf 1 2 3\nv\t+1.5 -2 3 1\nv 1e-50 0 0\nv .5 "
+                                         "0 0 0.2 0.3 0.4\nl 1 2\nf 1 2 3 # tail");
     SgObjReader r;
     ASSERT_TRUE(r.readFile(path)) << r.getErrorString().toStdString();
     const SgPolyMesh *m = r.getMesh();

@@ -30,11 +30,6 @@
 
 namespace {
 
-QByteArray readAll(const QString &path) {
-    QFile file(path);
-    return file.open(QIODevice::ReadOnly) ? file.readAll() : QByteArray();
-}
-
 SgPolyMesh *meshOf(const SgNode *node) {
     return static_cast<SgPolyShape *>(node->getObject()->getCurrentShape())->getPolyMesh();
 }
@@ -173,9 +168,9 @@ TEST(HostSceneSave, ReopensToTheSameStateAndSavesTheSameFileAgain) {
     const QString second = sgTestPath(QStringLiteral("two/work.json"));
     QDir().mkpath(sgTestPath(QStringLiteral("two")));
     ASSERT_TRUE(file.save(second, &reopened)) << file.getErrorString().toStdString();
-    QByteArray text = readAll(first);
-    EXPECT_EQ(readAll(second), text.replace(sgTestPath(QStringLiteral("one")).toUtf8(),
-                                            sgTestPath(QStringLiteral("two")).toUtf8()));
+    QByteArray text = sgTestReadFile(first);
+    EXPECT_EQ(sgTestReadFile(second), text.replace(sgTestPath(QStringLiteral("one")).toUtf8(),
+                                                   sgTestPath(QStringLiteral("two")).toUtf8()));
 }
 
 TEST(HostSceneSave, AFailedSaveLeavesTheFileAndABadMorphIsRefusedWhole) {
@@ -184,16 +179,13 @@ TEST(HostSceneSave, AFailedSaveLeavesTheFileAndABadMorphIsRefusedWhole) {
     SgSceneFile file;
     const QString path = sgTestPath(QStringLiteral("kept.json"));
     ASSERT_TRUE(file.save(path, &scene));
-    const QByteArray saved = readAll(path);
+    const QByteArray saved = sgTestReadFile(path);
     // Deltas that do not fit the geometry, or a link to nothing, are refused with their place,
     // and nothing is added.
     const QJsonObject root = QJsonDocument::fromJson(saved).object();
     using Edit = std::function<void(QJsonObject &)>;
     auto deltasFile = [](const char *name, const QByteArray &text) {
-        QFile file(sgTestPath(QString::fromLatin1(name)));
-        file.open(QIODevice::WriteOnly);
-        file.write(text);
-        return file.fileName();
+        return sgTestWriteFile(sgTestPath(QString::fromLatin1(name)), text);
     };
     // Each bone has 7 vertices: a delta line short of a number, a vertex repeated or out of
     // order, one past the last vertex, and a header for another count.
@@ -258,5 +250,5 @@ TEST(HostSceneSave, AFailedSaveLeavesTheFileAndABadMorphIsRefusedWhole) {
     blocker.close();
     EXPECT_FALSE(file.save(path, &scene));
     EXPECT_TRUE(file.getErrorString().contains(QStringLiteral("kept-geometry")));
-    EXPECT_EQ(readAll(path), saved);
+    EXPECT_EQ(sgTestReadFile(path), saved);
 }

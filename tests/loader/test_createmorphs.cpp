@@ -79,11 +79,7 @@ protected:
     }
 
     QString writeFile(const QString &name, const QByteArray &data) {
-        const QString path = dir.filePath(name);
-        QFile file(path);
-        EXPECT_TRUE(file.open(QIODevice::WriteOnly));
-        file.write(data);
-        return path;
+        return sgTestWriteFile(dir.filePath(name), data);
     }
     // The nodes the run tried, in order, from the host log.
     QStringList triedNodes() const {

@@ -64,10 +64,7 @@ protected:
             }
             faces += '\n';
         }
-        QFile file(dir.filePath(name));
-        EXPECT_TRUE(file.open(QIODevice::WriteOnly));
-        file.write(vertices + faces);
-        return file.fileName();
+        return sgTestWriteFile(dir.filePath(name), vertices + faces);
     }
 };
 

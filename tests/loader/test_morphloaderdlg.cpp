@@ -59,18 +59,6 @@ SgTestHandler saveOptions(bool saveObjects, bool relative) {
     });
 }
 
-void writeFile(const QString &path, const QByteArray &bytes) {
-    QDir().mkpath(QFileInfo(path).absolutePath());
-    QFile file(path);
-    ASSERT_TRUE(file.open(QIODevice::WriteOnly | QIODevice::Truncate));
-    file.write(bytes);
-}
-
-QByteArray readFile(const QString &path) {
-    QFile file(path);
-    return file.open(QIODevice::ReadOnly) ? file.readAll() : QByteArray();
-}
-
 const QByteArray TriangleObj = "v 0 0 0\nv 1 0 0\nv 0 1 0\nf 1 2 3\n";
 
 // The setting row with `key` below `row` (depth first), or null.
@@ -167,7 +155,7 @@ TEST_F(MorphLoaderDlgTest, ObjectFileOfDefaultsIsByteExact) {
                                 "  </UpdateOverrideExisting>\n"
                                 " </FileType>\n"
                                 "</VarnTargetImporter>\n";
-    EXPECT_EQ(readFile(path("head.obj.scx")), expected);
+    EXPECT_EQ(sgTestReadFile(path("head.obj.scx")), expected);
     // A source without setting rows writes no file.
     qDeleteAll(topSource(dialog)->takeChildren());
     dialog.saveObjectConfiguration(path("empty.obj"), topSource(dialog), m_dir.path());
@@ -175,8 +163,8 @@ TEST_F(MorphLoaderDlgTest, ObjectFileOfDefaultsIsByteExact) {
 }
 
 TEST_F(MorphLoaderDlgTest, ProjectPathsRelativeAbsoluteAndNetwork) {
-    writeFile(path("proj/a.obj"), TriangleObj);
-    writeFile(path("proj-other/b.obj"), TriangleObj);
+    sgTestWriteFile(path("proj/a.obj"), TriangleObj);
+    sgTestWriteFile(path("proj-other/b.obj"), TriangleObj);
     {
         SgMorphLoaderDlg dialog(nullptr, true, nullptr, nullptr);
         dialog.sourceList()->addFiles({path("proj-other/b.obj"), path("proj/a.obj")});
@@ -189,7 +177,7 @@ TEST_F(MorphLoaderDlgTest, ProjectPathsRelativeAbsoluteAndNetwork) {
                                ",is not in the relative path and will be saved as absolute.");
         // The order of two attributes in an element is the DOM's own; the values are compared.
         QDomDocument project;
-        ASSERT_TRUE(project.setContent(readFile(path("proj/set.scx"))));
+        ASSERT_TRUE(project.setContent(sgTestReadFile(path("proj/set.scx"))));
         const QDomNodeList objects = project.elementsByTagName("Object");
         ASSERT_EQ(objects.size(), 2);
         EXPECT_EQ(objects.at(0).toElement().attribute("Name"), "a.obj");
@@ -198,8 +186,8 @@ TEST_F(MorphLoaderDlgTest, ProjectPathsRelativeAbsoluteAndNetwork) {
         EXPECT_TRUE(QFile::exists(path("proj/a.obj.scx")));
     }
     // The project moved with its geometry loads the moved copy.
-    writeFile(path("copy/set.scx"), readFile(path("proj/set.scx")));
-    writeFile(path("copy/a.obj"), TriangleObj);
+    sgTestWriteFile(path("copy/set.scx"), sgTestReadFile(path("proj/set.scx")));
+    sgTestWriteFile(path("copy/a.obj"), TriangleObj);
     SgMorphLoaderDlg dialog(nullptr, true, nullptr, nullptr);
     dialog.loadConfigurationFile(path("copy/set.scx"), path("copy"));
     EXPECT_EQ(listedPaths(dialog.sourceList()),
@@ -213,7 +201,7 @@ TEST_F(MorphLoaderDlgTest, ProjectPathsRelativeAbsoluteAndNetwork) {
     // folder wins.
     EXPECT_EQ(SgMorphConfiguration::resolvePath("/nowhere", path("proj/a.obj")),
               path("proj/a.obj"));
-    writeFile(path("copy") + path("proj/a.obj"), TriangleObj);
+    sgTestWriteFile(path("copy") + path("proj/a.obj"), TriangleObj);
     EXPECT_EQ(SgMorphConfiguration::resolvePath(path("copy"), path("proj/a.obj")),
               path("copy") + path("proj/a.obj"));
 }
@@ -223,14 +211,15 @@ TEST_F(MorphLoaderDlgTest, ProjectLoadsInSavedOrderAndSkipsMissingGeometry) {
     QByteArray project = "<VarnTargetImporter Version=\"1\"><FileType Type=\"Project\">";
     for (const QString &name : names) {
         if (name != "gone.obj")
-            writeFile(path(name), TriangleObj);
+            sgTestWriteFile(path(name), TriangleObj);
         project += "<Object Name=\"" + name.toUtf8() + "\" Path=\"/" + name.toUtf8() + "\"/>";
     }
     project += "</FileType></VarnTargetImporter>";
-    writeFile(path("set.scx"), project);
+    sgTestWriteFile(path("set.scx"), project);
     // The object file of "two" renames its morph.
-    writeFile(path("two.obj.scx"), "<VarnTargetImporter><FileType Type=\"Object\">"
-                                   "<Name Value=\"second\"/></FileType></VarnTargetImporter>");
+    sgTestWriteFile(path("two.obj.scx"),
+                    "<VarnTargetImporter><FileType Type=\"Object\">"
+                    "<Name Value=\"second\"/></FileType></VarnTargetImporter>");
     SgMorphLoaderDlg dialog(nullptr, true, nullptr, nullptr);
     SgTestModalAnswer script(QList<SgTestHandler>{});
     dialog.loadConfigurationFile(path("set.scx"), m_dir.path());
@@ -270,7 +259,7 @@ TEST_F(MorphLoaderDlgTest, BrokenFilesEndInLoadErrors) {
         {nested(65), "deep65.scx", "Error: Document could not set as xml."},
     };
     for (const auto &entry : cases) {
-        writeFile(path(entry.file), entry.bytes);
+        sgTestWriteFile(path(entry.file), entry.bytes);
         SgMorphLoaderDlg dialog(nullptr, true, nullptr, nullptr);
         QString text;
         SgTestModalAnswer script(sgTestPressButton(QMessageBox::NoButton, nullptr, &text));
@@ -287,18 +276,19 @@ TEST_F(MorphLoaderDlgTest, BrokenFilesEndInLoadErrors) {
 }
 
 TEST_F(MorphLoaderDlgTest, ObjectValuesLoadAsTheRowsRead) {
-    writeFile(path("head.obj"), TriangleObj);
+    sgTestWriteFile(path("head.obj"), TriangleObj);
     SgMorphLoaderDlg dialog(nullptr, true, nullptr, nullptr);
     dialog.sourceList()->addFile(path("head.obj"));
     SgMorphFileItem *source = topSource(dialog);
     findRow(source, "UpdateOverrideExisting")->setValueText("Deltas Only");
     findRow(source, "ERCType")->setValueText("3");
-    writeFile(path("head.obj.scx"),
-              "<VarnTargetImporter Version=\"1\"><FileType Type=\"Object\">"
-              "<CreateControlProperty Value=\"True\"><ERCType Value=\"7\">"
-              "<UseCustom Value=\"true\"/></ERCType></CreateControlProperty>"
-              "<ReverseDeformations Value=\"True\"><Pose Value=\"/pose.ds\"/></ReverseDeformations>"
-              "</FileType></VarnTargetImporter>");
+    sgTestWriteFile(
+        path("head.obj.scx"),
+        "<VarnTargetImporter Version=\"1\"><FileType Type=\"Object\">"
+        "<CreateControlProperty Value=\"True\"><ERCType Value=\"7\">"
+        "<UseCustom Value=\"true\"/></ERCType></CreateControlProperty>"
+        "<ReverseDeformations Value=\"True\"><Pose Value=\"/pose.ds\"/></ReverseDeformations>"
+        "</FileType></VarnTargetImporter>");
     SgTestModalAnswer script(QList<SgTestHandler>{});
     dialog.loadConfigurationFile(path("head.obj.scx"), m_dir.path());
     // The file's geometry was listed already: its settings go to that row, with no warning.
@@ -313,7 +303,7 @@ TEST_F(MorphLoaderDlgTest, ObjectValuesLoadAsTheRowsRead) {
 }
 
 TEST_F(MorphLoaderDlgTest, SaveThenLoadReproducesEveryRowAndTheControlProperty) {
-    writeFile(path("head.obj"), TriangleObj);
+    sgTestWriteFile(path("head.obj"), TriangleObj);
     QStringList saved;
     SgPropertySettings savedAttributes;
     {
@@ -347,7 +337,7 @@ TEST_F(MorphLoaderDlgTest, SaveThenLoadReproducesEveryRowAndTheControlProperty) 
         saved = allValues(source);
         dialog.saveObjectConfiguration(path("head.obj"), source, m_dir.path());
     }
-    EXPECT_TRUE(readFile(path("head.obj.scx")).contains("Value=\"/poses/p.ds\""));
+    EXPECT_TRUE(sgTestReadFile(path("head.obj.scx")).contains("Value=\"/poses/p.ds\""));
     SgMorphLoaderDlg dialog(nullptr, true, nullptr, nullptr);
     dialog.loadConfigurationFile(path("head.obj.scx"), m_dir.path());
     ASSERT_EQ(dialog.sourceList()->topLevelItemCount(), 1);
@@ -387,7 +377,7 @@ TEST_F(MorphLoaderDlgTest, SaveThenLoadReproducesEveryRowAndTheControlProperty) 
 }
 
 TEST_F(MorphLoaderDlgTest, SaveOptionsCancelAbsoluteAndWithoutObjects) {
-    writeFile(path("geo/a.obj"), TriangleObj);
+    sgTestWriteFile(path("geo/a.obj"), TriangleObj);
     SgMorphLoaderDlg dialog(nullptr, true, nullptr, nullptr);
     dialog.sourceList()->addFile(path("geo/a.obj"));
     auto *save = dialog.findChild<QPushButton *>("MorphLoaderSaveConfigurationBtn");
@@ -406,7 +396,7 @@ TEST_F(MorphLoaderDlgTest, SaveOptionsCancelAbsoluteAndWithoutObjects) {
         save->click();
         EXPECT_EQ(script.titles(),
                   (QStringList{"Project Save Options", "Choose a Configuration file"}));
-        EXPECT_TRUE(readFile(path("projects/abs.scx"))
+        EXPECT_TRUE(sgTestReadFile(path("projects/abs.scx"))
                         .contains("Path=\"" + path("geo/a.obj").toUtf8() + "\""));
         EXPECT_TRUE(QFile::exists(path("geo/a.obj.scx")));
         EXPECT_EQ(SgAppSettings().getString("LastDirectory"), path("projects"));
@@ -419,7 +409,7 @@ TEST_F(MorphLoaderDlgTest, SaveOptionsCancelAbsoluteAndWithoutObjects) {
             {saveOptions(false, true), sgTestChooseFile(path("geo/only.scx"), &directory)});
         save->click();
         EXPECT_EQ(directory, path("projects"));
-        EXPECT_TRUE(readFile(path("geo/only.scx")).contains("Path=\"/a.obj\""));
+        EXPECT_TRUE(sgTestReadFile(path("geo/only.scx")).contains("Path=\"/a.obj\""));
         EXPECT_FALSE(QFile::exists(path("geo/a.obj.scx")));
     }
 }
@@ -442,7 +432,7 @@ TEST_F(MorphLoaderDlgTest, RunThenSecondOkAcceptsOnlyWithoutProblems) {
             box->setObject(object);
             sgApp->getScene()->addNode(box);
             sgApp->getScene()->selectNode(box);
-            writeFile(path("lift.obj"), "v 0 0 0\nv 1 0.5 0\nv 0 1 0\nf 1 2 3\n");
+            sgTestWriteFile(path("lift.obj"), "v 0 0 0\nv 1 0.5 0\nv 0 1 0\nf 1 2 3\n");
             dialog.sourceList()->addFile(path("lift.obj"));
             findRow(topSource(dialog), "CreateControlProperty")->setValueText("False");
         }
@@ -520,7 +510,7 @@ TEST_F(MorphLoaderDlgTest, ChooseFilesStartsInDocumentsAndRemembersFolder) {
     const QString documents = path("docs");
     QDir().mkpath(documents);
     sgApp->setDocumentsPath(documents);
-    writeFile(path("geo/a.obj"), TriangleObj);
+    sgTestWriteFile(path("geo/a.obj"), TriangleObj);
     SgMorphLoaderDlg dialog(nullptr, true, nullptr, nullptr);
     QString directory;
     SgTestModalAnswer script(sgTestChooseFile(path("geo/a.obj"), &directory));

@@ -27,6 +27,7 @@
 #include "sgcore/app/sgapp.h"
 #include "sgcore/app/sgmessagesink.h"
 
+#include <QByteArray>
 #include <QString>
 
 #include <ostream>
@@ -36,6 +37,13 @@ QString sgTestFolder();
 
 // A path inside that folder ("<folder>/<name>").
 QString sgTestPath(const QString &name);
+
+// Writes `bytes` to the file `path`, making its folders; returns `path` (a file that cannot be
+// written fails the test).
+QString sgTestWriteFile(const QString &path, const QByteArray &bytes);
+
+// The whole content of the file `path` (empty when it cannot be read).
+QByteArray sgTestReadFile(const QString &path);
 
 // Changes the fail-safe's time-out for stray modal dialogs and popups (milliseconds).
 void sgTestSetModalTimeout(int milliseconds);
