@@ -126,6 +126,7 @@ TEST_F(ExchangeRobustnessTest, BadCountsAndIndicesAreRejected) {
         {polygon + 5, 256}, // more corners than a polygon can have
         {polygon + 5, -1},
         {polygon + 5, 7}, // more corners than the record holds
+        {polygon + 9, 6}, // a polygon's vertex index = vertex count
         // Values that are not finite numbers, or become infinite in host units.
         {v + 4, 0x7fc00000},
         {v + 8, 0x7f800000},
@@ -145,19 +146,24 @@ TEST_F(ExchangeRobustnessTest, IndicesOutsideTheReturnedListsAndNonFiniteStrengt
     // A modeler that returns fewer materials or UVs than its facets name keeps the edit: the
     // facet falls back to material 0, the corner to no UV. Strengths that are not numbers are
     // dropped.
-    std::unique_ptr<SgPolyMesh> mesh(sgTestMesh({{0, 0, 0}, {1, 0, 0}, {0, 1, 0}}, {{0, 0}}));
+    std::unique_ptr<SgPolyMesh> mesh(
+        sgTestMesh({{0, 0, 0}, {1, 0, 0}, {0, 1, 0}, {1, 1, 0}, {2, 2, 0}}, {{0, 0}}));
     sgTestAddFacet(*mesh, 0, {{0, 0}, {1, 0}, {2, 0}});
+    sgTestAddFacet(*mesh, 0, {{0, 0}, {1, 0}, {3, 0}, {4, 0}, {2, 0}});
     SgReturnMaterial odd;
     odd.name = "odd";
     odd.glossiness = std::numeric_limits<float>::quiet_NaN();
     odd.opacity = std::numeric_limits<float>::infinity();
     QByteArray record = SgReturnRecordWriter("few", *mesh, {odd}, "").toByteArray();
-    const qsizetype triangle = record.size() - 4 - 41;
+    const qsizetype polygon = record.size() - 4 - 69;
+    const qsizetype triangle = polygon - 41;
     ASSERT_EQ(record.at(triangle), 'T');
+    ASSERT_EQ(record.at(polygon), 'P');
     for (const auto &[at, value] : {std::pair{triangle + 1, 300},
                                     {triangle + 9, 1},
                                     {triangle + 21, -2},
-                                    {triangle + 33, 0x7fffffff}})
+                                    {triangle + 33, 0x7fffffff},
+                                    {polygon + 13, 1}})
         putInt(record, at, value);
     auto shape = readExact(record);
     ASSERT_TRUE(shape) << logLines().join('\n').toStdString();
@@ -167,6 +173,9 @@ TEST_F(ExchangeRobustnessTest, IndicesOutsideTheReturnedListsAndNonFiniteStrengt
     EXPECT_EQ(back->getTriangleMaterial(0), 0);
     for (int corner = 0; corner < 3; ++corner)
         EXPECT_EQ(back->getTriangleCorners(0)[corner].uv, -1);
+    ASSERT_EQ(back->getPolygonCount(), 1);
+    EXPECT_EQ(back->getPolygonCorners(0)[0].uv, -1);
+    EXPECT_EQ(back->getPolygonCorners(0)[1].uv, 0);
     auto *material = dynamic_cast<SgDefaultMaterial *>(shape->getMaterial(0));
     ASSERT_TRUE(material);
     EXPECT_TRUE(std::isfinite(material->getGlossinessStrength()));

@@ -17,8 +17,14 @@
 #include <QTimer>
 #include <QWidget>
 
+#include <atomic>
+#include <chrono>
+#include <cstdio>
 #include <cstdlib>
 #include <memory>
+#include <mutex>
+#include <string>
+#include <thread>
 
 namespace {
 
@@ -63,7 +69,64 @@ private:
     QElapsedTimer m_since;
 };
 
+// Ends the program when one test runs past the limit: a hang then fails with the test's name
+// within seconds instead of waiting for ctest's time-out. It watches from a thread of its own,
+// since the stuck test holds the main thread.
+class StuckTestWatchdog : public ::testing::EmptyTestEventListener {
+public:
+    explicit StuckTestWatchdog(int seconds) : m_limitSeconds(seconds) {
+        m_thread = std::thread([this] { watch(); });
+    }
+    ~StuckTestWatchdog() override {
+        m_stop = true;
+        m_thread.join();
+    }
+    void setLimit(int seconds) { m_limitSeconds = seconds; }
+
+private:
+    using Clock = std::chrono::steady_clock;
+    void OnTestStart(const ::testing::TestInfo &test) override {
+        std::lock_guard guard(m_mutex);
+        m_test = std::string(test.test_suite_name()) + "." + test.name();
+        m_start = Clock::now();
+    }
+    void OnTestEnd(const ::testing::TestInfo &) override {
+        std::lock_guard guard(m_mutex);
+        m_test.clear();
+    }
+    void watch() {
+        while (!m_stop) {
+            std::this_thread::sleep_for(std::chrono::milliseconds(100));
+            std::lock_guard guard(m_mutex);
+            const int limit = m_limitSeconds;
+            if (m_test.empty() || limit <= 0 ||
+                Clock::now() - m_start < std::chrono::seconds(limit))
+                continue;
+            std::fprintf(stderr,
+                         "[  STUCK   ] %s has run for more than %d s: a wait that should give up "
+                         "never returned (SG_TEST_STUCK_SECONDS sets the limit)\n",
+                         m_test.c_str(), limit);
+            std::fflush(stderr);
+            std::_Exit(1);
+        }
+    }
+
+    std::atomic<int> m_limitSeconds;
+    std::atomic<bool> m_stop{false};
+    std::mutex m_mutex;
+    std::string m_test;
+    Clock::time_point m_start;
+    std::thread m_thread;
+};
+
+StuckTestWatchdog *g_watchdog = nullptr;
+
 } // namespace
+
+void sgTestSetStuckLimit(int seconds) {
+    if (g_watchdog)
+        g_watchdog->setLimit(seconds);
+}
 
 QString sgTestFolder() {
     return g_folder ? g_folder->path() : QDir::tempPath();
@@ -98,6 +161,9 @@ int main(int argc, char **argv) {
         g_modalTimeoutMs = std::max(100, std::atoi(t));
     }
     ::testing::InitGoogleTest(&argc, argv);
+    const char *stuck = std::getenv("SG_TEST_STUCK_SECONDS");
+    g_watchdog = new StuckTestWatchdog(stuck ? std::atoi(stuck) : 30);
+    ::testing::UnitTest::GetInstance()->listeners().Append(g_watchdog); // owned by gtest
     QApplication app(argc, argv);
     QApplication::setApplicationName(QStringLiteral("scenara-tests"));
 

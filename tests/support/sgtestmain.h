@@ -8,6 +8,9 @@
 //     file (SgAppSettings::setFileName) at "<folder>/settings.ini";
 //   - makes the application object `sgApp` (SgApp) with its temporary path "<folder>/temp"
 //     and its documents path "<folder>/documents" (both created);
+//   - starts a watchdog: a test that runs longer than SG_TEST_STUCK_SECONDS (default 30; 0
+//     turns it off) is reported as stuck, with its name, and the program ends with status 1,
+//     so that a wait that should give up but never does fails fast instead of hanging;
 //   - starts a fail-safe: a modal dialog or popup that stays open for more than a few seconds
 //     (5 s; SG_TEST_MODAL_TIMEOUT_MS overrides) is closed, and the running test fails with its
 //     window title, so a broken test fails instead of hanging.
@@ -44,6 +47,9 @@ QByteArray sgTestReadFile(const QString &path);
 
 // Changes the fail-safe's time-out for stray modal dialogs and popups (milliseconds).
 void sgTestSetModalTimeout(int milliseconds);
+
+// Changes the watchdog's limit for the running test and those after it (seconds; 0: none).
+void sgTestSetStuckLimit(int seconds);
 
 // Readable QString values in test failure messages.
 inline void PrintTo(const QString &text, std::ostream *out) {
