@@ -188,7 +188,7 @@ TEST_F(ModelerSaves, EverySaveStyleGivesExactlyOneCompleteReturn) {
     {
         QFile file(obj);
         ASSERT_TRUE(file.open(QIODevice::WriteOnly | QIODevice::Truncate));
-        file.write(text.left(text.indexOf("\nf ") + 4)); // "f 1" ends the write
+        file.write(text.left(text.indexOf("\nf ") + 1)); // every vertex, no face yet
     }
     EXPECT_TRUE(
         sgTestWaitUntil([&] { return run.log().contains(QStringLiteral("not returned")); }, 5000))

@@ -105,7 +105,7 @@ TEST(SgSharedMemoryPosix, KilledHoldersLeaveNothingOnceTheSurvivorRemoves) {
     EXPECT_TRUE(objectsOf(lone).empty());
 }
 
-TEST(SgSharedMemoryPosix, ObjectsArePrivateToTheUser) {
+TEST(SgSharedMemoryPosix, ObjectsArePrivateAndForeignOnesAreNotTrusted) {
     const std::string key = uniqueKey("mode");
     SgTestSegment memory(key);
     EXPECT_FALSE(memory.lock()); // a lock on a missing segment creates nothing
@@ -140,6 +140,35 @@ TEST(SgSharedMemoryPosix, ObjectsArePrivateToTheUser) {
     close(fd);
     shm_unlink(name.c_str());
     EXPECT_TRUE(objectsOf(exposed).empty());
+
+    // A live data object whose reference record has gone is not taken over.
+    const std::string orphan = uniqueKey("orphan");
+    SgTestSegment holder(orphan);
+    ASSERT_TRUE(holder.create(16));
+    ASSERT_TRUE(holder.attach(SgSharedMemory::kReadWrite));
+    ASSERT_EQ(shm_unlink(SgShmPlatform::nativeName(holder.referenceName()).c_str()), 0);
+    SgTestSegment taken(orphan);
+    EXPECT_FALSE(taken.create(16));
+    EXPECT_EQ(taken.status(), SgSharedMemory::StatusAlreadyExists);
+
+    // A size in the reference record beyond the data object is held to what is mapped.
+    const std::string lying = uniqueKey("lying");
+    SgTestSegment creator(lying);
+    ASSERT_TRUE(creator.create(16));
+    const int ref = shm_open(SgShmPlatform::nativeName(creator.referenceName()).c_str(), O_RDWR, 0);
+    ASSERT_GE(ref, 0);
+    void *record = mmap(nullptr, 8, PROT_READ | PROT_WRITE, MAP_SHARED, ref, 0);
+    ASSERT_NE(record, MAP_FAILED);
+    const std::uint32_t claimed = 1u << 30;
+    std::memcpy(static_cast<char *>(record) + 4, &claimed, 4);
+    munmap(record, 8);
+    close(ref);
+    SgTestSegment reader(lying);
+    ASSERT_TRUE(reader.attach(SgSharedMemory::kReadOnly));
+    EXPECT_GE(reader.size(), 16);
+    EXPECT_LE(reader.size(), 1 << 16);
+    reader.detach();
+    EXPECT_TRUE(creator.remove(SgSharedMemory::kRemoveUnlocked));
 }
 
 TEST(SgSharedMemoryPosix, ManyProcessesChurningOneKeyLoseNoUpdate) {
