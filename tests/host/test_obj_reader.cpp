@@ -55,6 +55,7 @@ TEST(HostObjReader, KeepsVertexOrderPolygonsGroupsAndMaterials) {
     ASSERT_EQ(m->getTriangleCount(), 2);
     ASSERT_EQ(m->getQuadCount(), 1);
     ASSERT_EQ(m->getPolygonCount(), 1);
+    EXPECT_EQ(m->getPolygonCornerCount(0), 5);
     EXPECT_EQ(vertexIndices(m->getTriangleCorners(0), 3), (std::vector<int>{0, 1, 2}));
     // Negative indices count back from the last item read so far.
     EXPECT_EQ(vertexIndices(m->getTriangleCorners(1), 3), (std::vector<int>{4, 3, 2}));

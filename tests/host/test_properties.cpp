@@ -3,7 +3,9 @@
 #include "sgcore/properties/sgfloatproperty.h"
 #include "sgcore/properties/sgintproperty.h"
 #include "sgcore/properties/sgpropertygrouptree.h"
+#include "sgcore/properties/sgskeletonproperty.h"
 #include "sgcore/scene/sgnode.h"
+#include "sgcore/scene/sgskeleton.h"
 #include "tests/support/sgtestmain.h"
 
 #include <gtest/gtest.h>
@@ -87,6 +89,12 @@ TEST(HostProperties, ValuesPassThroughControllersAndClampOnReading) {
     channel.removeAllControllers();
     EXPECT_EQ(channel.getLinkProperty(), nullptr);
 
+    SgIntProperty count(QStringLiteral("count"));
+    count.setValue(7);
+    count.setMax(5);
+    count.setIsClamped(true);
+    EXPECT_EQ(count.getIntValue(), 5);
+
     SgEnumProperty e(QStringLiteral("mode"));
     EXPECT_EQ(e.getValue(), -1);
     e.addItem(QStringLiteral("a"));
@@ -97,6 +105,13 @@ TEST(HostProperties, ValuesPassThroughControllersAndClampOnReading) {
     EXPECT_EQ(e.getItemValue(1), 10);
     e.removeItem(1);
     EXPECT_EQ(e.getValue(), 0);
+
+    // A skeleton property takes figures only.
+    SgSkeleton figure(QStringLiteral("fig"));
+    SgNode prop(QStringLiteral("prop"));
+    SgSkeletonProperty sk(QStringLiteral("target"));
+    EXPECT_FALSE(sk.setValue(&prop));
+    EXPECT_TRUE(sk.setValue(&figure));
 }
 
 TEST(HostProperties, PathsFormTheGroupTree) {

@@ -23,6 +23,9 @@ TEST(HostScene, NodesKeepSceneOrderAndSelection) {
     for (SgNode *node : {a, b, c, a}) // a again: stays where it is
         scene.addNode(node);
     ASSERT_EQ(scene.getNodes(), (SgNodeList{a, b, c}));
+    b->setLabel(QStringLiteral("Bee")); // found by its label only
+    EXPECT_EQ(scene.findNodeByLabel(QStringLiteral("Bee")), b);
+    EXPECT_EQ(scene.findNodeByLabel(QStringLiteral("b")), nullptr);
 
     // Selected nodes come in scene order; the primary selection is the last one selected.
     scene.selectNode(c);

@@ -9,6 +9,7 @@
 #include "sgcore/morph/sgerclink.h"
 #include "sgcore/morph/sgmorph.h"
 #include "sgcore/morph/sgmorphdeltas.h"
+#include "sgcore/properties/sgenumproperty.h"
 #include "sgcore/properties/sgfloatproperty.h"
 #include "sgcore/scene/sgbone.h"
 #include "sgcore/scene/sgscene.h"
@@ -33,7 +34,8 @@ SgPolyMesh *meshOf(const SgNode *node) {
 }
 
 // What a session adds to a figure: a morph per bone driven by a control property on the
-// figure, a returned prop with a polygon, UVs and two materials, and copied colours and maps.
+// figure, an enum property, a hidden returned prop with a polygon, UVs and two materials, and
+// copied colours and maps.
 void addUserWork(SgScene &scene) {
     SgSkeleton *figure = sgTestFigure(QStringLiteral("Blobby"), 3, 2, true);
     scene.addNode(figure);
@@ -43,7 +45,13 @@ void addUserWork(SgScene &scene) {
     control->setMax(1);
     control->setIsClamped(true);
     control->setValue(0.75f);
+    control->setIsUserProperty(true);
     figure->addProperty(control);
+    auto *mood = new SgEnumProperty(QStringLiteral("Mood"));
+    mood->addItem(QStringLiteral("Calm"));
+    mood->addItem(QStringLiteral("Happy"), 5);
+    mood->setValue(1);
+    figure->addProperty(mood);
     for (SgBone *bone : figure->getAllBones()) {
         auto *deltas = new SgMorphDeltas;
         deltas->setVertCount(meshOf(bone)->getVertexCount());
@@ -75,8 +83,10 @@ void addUserWork(SgScene &scene) {
     auto *paint = static_cast<SgDefaultMaterial *>(shape->getMaterial(1));
     paint->setDiffuseColor(QColor(12, 34, 56));
     paint->setBumpStrength(0.4f);
+    paint->setGlossinessStrength(0.25f);
     SgNode *prop = sgTestAttach(new SgNode(QStringLiteral("Blobby (1)")), shape);
     prop->setOrigin(SgVec3(0.25f, 0.5f, 0));
+    prop->setHidden(true);
     prop->setParent(figure->getAllBones().back());
     scene.addNode(prop);
 }
