@@ -2,7 +2,6 @@
 
 #include "sgcore/morph/sgerclink.h"
 #include "sgcore/morph/sgmorph.h"
-#include "sgcore/morph/sgmorphdeltas.h"
 #include "sgcore/properties/sgfloatproperty.h"
 #include "sgcore/properties/sgintproperty.h"
 #include "sharedsource/engine/sgmorphloader.h"

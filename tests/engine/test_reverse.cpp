@@ -4,13 +4,11 @@
 #include "sgcore/morph/sgmorphdeltas.h"
 #include "sgcore/morph/sgrigidskinbinding.h"
 #include "sgcore/properties/sgfloatproperty.h"
-#include "sgcore/scene/sgscene.h"
 #include "sgcore/script/sgscript.h"
 #include "sharedsource/engine/sgmorphloader.h"
 #include "sharedsource/engine/sgmorphloadlog.h"
 #include "tests/support/sgtestmodal.h"
 
-#include <QFile>
 #include <QTemporaryDir>
 
 #include <cmath>

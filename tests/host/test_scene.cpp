@@ -1,14 +1,4 @@
-#include "sgcore/app/sgapp.h"
-#include "sgcore/geometry/sgobject.h"
-#include "sgcore/geometry/sgpolymesh.h"
-#include "sgcore/geometry/sgpolyshape.h"
-#include "sgcore/io/sgfileio.h"
 #include "sgcore/io/sgscenefile.h"
-#include "sgcore/materials/sgdefaultmaterial.h"
-#include "sgcore/materials/sgtexture.h"
-#include "sgcore/properties/sgenumproperty.h"
-#include "sgcore/properties/sgfloatproperty.h"
-#include "sgcore/properties/sgpropertygrouptree.h"
 #include "sgcore/scene/sgbone.h"
 #include "sgcore/scene/sgscene.h"
 #include "sgcore/scene/sgskeleton.h"
@@ -22,10 +12,6 @@ namespace {
 
 const QString kExamples = QStringLiteral(SG_EXAMPLES_DIR);
 
-const SgPolyMesh *meshOf(SgNode *node) {
-    return static_cast<SgPolyShape *>(node->getObject()->getCurrentShape())->getPolyMesh();
-}
-
 } // namespace
 
 TEST(HostScene, NodesKeepSceneOrderAndSelection) {
@@ -33,38 +19,26 @@ TEST(HostScene, NodesKeepSceneOrderAndSelection) {
     QSignalSpy selection(&scene, &SgScene::selectionChanged);
     auto *a = new SgNode(QStringLiteral("a"));
     auto *b = new SgNode(QStringLiteral("b"));
-    b->setLabel(QStringLiteral("Bee"));
     auto *c = new SgNode(QStringLiteral("c"));
-    scene.addNode(a);
-    scene.addNode(b);
-    scene.addNode(c);
-    scene.addNode(a); // already there: stays where it is
-    ASSERT_EQ(scene.getNodeCount(), 3);
-    EXPECT_EQ(scene.getNode(0), a);
-    EXPECT_EQ(scene.findNodeByLabel(QStringLiteral("Bee")), b);
-    EXPECT_EQ(scene.findNodeByLabel(QStringLiteral("b")), nullptr);
+    for (SgNode *node : {a, b, c, a}) // a again: stays where it is
+        scene.addNode(node);
+    ASSERT_EQ(scene.getNodes(), (SgNodeList{a, b, c}));
 
     // Selected nodes come in scene order; the primary selection is the last one selected.
     scene.selectNode(c);
     scene.selectNode(a, true);
     EXPECT_EQ(scene.getPrimarySelection(), a);
-    SgNodeListIterator it = scene.selectedNodeListIterator();
-    EXPECT_EQ(it.next(), a);
-    EXPECT_EQ(it.next(), c);
-    EXPECT_EQ(it.next(), nullptr);
+    EXPECT_EQ(scene.getSelectedNodes(), (SgNodeList{a, c}));
     scene.deselectNode(a);
     EXPECT_EQ(scene.getPrimarySelection(), c);
     scene.selectNode(b);
-    EXPECT_EQ(scene.getSelectedNodes(), SgNodeList{b});
     EXPECT_EQ(selection.count(), 4);
 
     // Removing a node takes it out of the selection; iterators keep their snapshot.
     SgNodeListIterator all = scene.nodeListIterator();
     scene.removeNode(b);
     EXPECT_EQ(scene.getPrimarySelection(), nullptr);
-    EXPECT_EQ(scene.getNodeCount(), 2);
     EXPECT_EQ(all.count(), 3);
-    ASSERT_NE(sgApp, nullptr);
 }
 
 TEST(HostScene, FigureHierarchyAndNodeChildren) {
@@ -99,42 +73,6 @@ TEST(HostScene, FigureHierarchyAndNodeChildren) {
     scene.removeNode(figure);
     EXPECT_EQ(scene.getNodes(), SgNodeList{follower});
     EXPECT_EQ(follower->getFollowTarget(), nullptr);
-}
-
-TEST(HostSceneFile, LoadsTheExampleFigureWithSeamsMaterialsAndProperties) {
-    SgScene scene;
-    SgSceneFile file;
-    ASSERT_TRUE(file.load(kExamples + QStringLiteral("/scenes/figure.json"), &scene))
-        << file.getErrorString().toStdString();
-    EXPECT_EQ(file.getAddedNodeCount(), 6);
-    auto *figure = dynamic_cast<SgSkeleton *>(scene.findNodeByLabel(QStringLiteral("Figure 1")));
-    ASSERT_NE(figure, nullptr);
-    const SgBoneList bones = figure->getAllBones();
-    ASSERT_EQ(bones.size(), 3);
-    EXPECT_EQ(bones[1]->getParent(), bones[0]);
-    SgNode *hat = scene.findNodeByName(QStringLiteral("Hat"));
-    ASSERT_NE(hat, nullptr);
-    EXPECT_EQ(hat->getParent(), bones[2]);
-    EXPECT_TRUE(hat->isHidden());
-
-    // Each bone has its own copy of the seam ring it shares with its neighbour.
-    EXPECT_EQ(meshOf(bones[0])->getVertexCount(), 8);
-    EXPECT_EQ(meshOf(bones[2])->getVertexCount(), 8);
-
-    // Materials with their maps, and properties of each kind with their groups.
-    auto *skin = dynamic_cast<SgDefaultMaterial *>(
-        bones[2]->getObject()->getCurrentShape()->findMaterial(QStringLiteral("Skin")));
-    ASSERT_NE(skin, nullptr);
-    ASSERT_NE(skin->getColorMap(), nullptr);
-    EXPECT_TRUE(skin->getColorMap()->isLoaded());
-    EXPECT_FLOAT_EQ(skin->getGlossinessStrength(), 0.25f);
-    auto *mood = dynamic_cast<SgEnumProperty *>(figure->findProperty(QStringLiteral("Mood")));
-    ASSERT_NE(mood, nullptr);
-    EXPECT_EQ(mood->getValueLabel(), QStringLiteral("Happy"));
-    EXPECT_TRUE(figure->findProperty(QStringLiteral("Height"))->isUserProperty());
-    EXPECT_EQ(figure->getPropertyGroups()->getAllPaths(),
-              (QStringList{QStringLiteral("Morphs"), QStringLiteral("Morphs/Face"),
-                           QStringLiteral("Body")}));
 }
 
 TEST(HostSceneFile, RejectsBadFilesWholeWithPlace) {

@@ -2,12 +2,10 @@
 // and channels, control properties and their links, returned props, and copied materials.
 
 #include "sgcore/app/sgimagemgr.h"
-#include "sgcore/geometry/sgobject.h"
 #include "sgcore/geometry/sgpolymesh.h"
 #include "sgcore/geometry/sgpolyshape.h"
 #include "sgcore/io/sgscenefile.h"
 #include "sgcore/materials/sgdefaultmaterial.h"
-#include "sgcore/materials/sgtexture.h"
 #include "sgcore/morph/sgerclink.h"
 #include "sgcore/morph/sgmorph.h"
 #include "sgcore/morph/sgmorphdeltas.h"
@@ -63,37 +61,21 @@ void addUserWork(SgScene &scene) {
         skin->setColorMap(sgApp->getImageMgr()->getImage(sgTestPath(QStringLiteral("skin.png"))));
     }
 
-    auto *mesh = new SgPolyMesh;
-    mesh->beginEdit(true);
-    SgVec3 *v = mesh->setVertexArray(6);
-    for (int i = 0; i < 6; ++i)
-        v[i] = SgVec3(float(i) * 0.1f, float(i % 2), 1.0f / float(i + 3));
-    auto *uvs = new SgMap;
-    for (int i = 0; i < 6; ++i)
-        uvs->appendPnt2Value(float(i) / 7.0f, 0.5f);
-    mesh->setUVList(uvs);
-    mesh->activateMaterial(1);
-    mesh->startFace();
-    for (int i = 0; i < 5; ++i)
-        mesh->addFaceEdge(i, i);
-    mesh->finishFace();
-    mesh->activateMaterial(0);
-    mesh->startFace();
-    for (int i : {0, 2, 5})
-        mesh->addFaceEdge(i); // no UVs on this one
-    mesh->finishFace();
-    mesh->finishEdit();
-    auto *shape = new SgPolyShape(QStringLiteral("Blobby (1)"));
-    shape->setPolyMesh(mesh);
-    shape->addMaterial(new SgDefaultMaterial(QStringLiteral("Unused first")));
-    auto *paint = new SgDefaultMaterial(QStringLiteral("Paint"));
+    std::vector<SgVec3> vertices;
+    std::vector<SgVec2> uvs;
+    for (int i = 0; i < 6; ++i) {
+        vertices.emplace_back(float(i) * 0.1f, float(i % 2), 1.0f / float(i + 3));
+        uvs.emplace_back(float(i) / 7.0f, 0.5f);
+    }
+    SgPolyMesh *mesh = sgTestMesh(vertices, uvs);
+    sgTestAddFacet(*mesh, 1, {{0, 0}, {1, 1}, {2, 2}, {3, 3}, {4, 4}});
+    sgTestAddFacet(*mesh, 0, {{0}, {2}, {5}}); // no UVs on this one
+    SgShape *shape = sgTestShape(QStringLiteral("Blobby (1)"), mesh,
+                                 {QStringLiteral("Unused first"), QStringLiteral("Paint")});
+    auto *paint = static_cast<SgDefaultMaterial *>(shape->getMaterial(1));
     paint->setDiffuseColor(QColor(12, 34, 56));
     paint->setBumpStrength(0.4f);
-    shape->addMaterial(paint);
-    auto *object = new SgObject(QStringLiteral("Blobby (1)"));
-    object->addShape(shape);
-    auto *prop = new SgNode(QStringLiteral("Blobby (1)"));
-    prop->setObject(object);
+    SgNode *prop = sgTestAttach(new SgNode(QStringLiteral("Blobby (1)")), shape);
     prop->setOrigin(SgVec3(0.25f, 0.5f, 0));
     prop->setParent(figure->getAllBones().back());
     scene.addNode(prop);

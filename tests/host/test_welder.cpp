@@ -1,5 +1,4 @@
 #include "sgcore/geometry/sgmodifier.h"
-#include "sgcore/geometry/sgobject.h"
 #include "sgcore/geometry/sgpolymesh.h"
 #include "sgcore/geometry/sgpolyshape.h"
 #include "sgcore/materials/sgmaterial.h"

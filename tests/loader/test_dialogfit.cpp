@@ -2,6 +2,8 @@
 // button or tree row is cut, elided or wider than its column. Pictures of the Target Importer
 // as a user sees it are kept as test artefacts (SG_TEST_ARTIFACTS, else the temporary folder).
 #include "sgcore/app/sgapp.h"
+#include "sgcore/app/sgmessagesink.h"
+#include "sgcore/geometry/sgobject.h"
 #include "sgcore/scene/sgbone.h"
 #include "sgcore/scene/sgscene.h"
 #include "sgcore/scene/sgskeleton.h"
@@ -15,9 +17,12 @@
 #include "tests/support/sgwidgetfit.h"
 
 #include <QComboBox>
+#include <QDialogButtonBox>
 #include <QDir>
-#include <QFile>
 #include <QImage>
+#include <QLabel>
+#include <QPushButton>
+#include <QTest>
 #include <QTextBrowser>
 #include <gtest/gtest.h>
 
@@ -88,13 +93,18 @@ TEST_F(DialogFit, TargetImporterInBothModesAndItsLogPage) {
     list->expandAll();
     expectWhole(&files);
 
-    files.accept();
+    files.buttonBox()->button(QDialogButtonBox::Ok)->click();
     auto *log = files.findChild<QTextBrowser *>("MorphLoaderLog");
     ASSERT_TRUE(log->isVisible());
     EXPECT_TRUE(log->toPlainText().contains("Created morph successfully."));
     EXPECT_FALSE(log->toPlainText().contains("Warning"));
+    EXPECT_EQ(files.findChild<QLabel *>("MorphLoaderLogHeading")->text(), "Morphs Loaded:");
+    EXPECT_EQ(sgApp->getMessageSink()->currentStatus(), "Morphs loaded.");
+    EXPECT_TRUE(figure->getAllBones().first()->getObject()->findModifier("smile"));
     expectWhole(&files, "target-importer-log.png");
-    files.accept();
+    // After the run Escape (or the close box) ends the dialog as the second "Ok" does.
+    QTest::keyClick(&files, Qt::Key_Escape);
+    EXPECT_FALSE(files.isVisible());
     EXPECT_EQ(files.result(), QDialog::Accepted);
 
     SgPolyMesh *returned = sgTestCopyVertices(*sgTestGeometry(figure->getAllBones().first()));

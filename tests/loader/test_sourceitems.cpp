@@ -3,7 +3,6 @@
 #include "tests/support/sgtestmodal.h"
 
 #include "sharedsource/engine/sgmorphloader.h"
-#include "sharedsource/loaderui/sgmorphcontrolvalueitem.h"
 #include "sharedsource/loaderui/sgmorphfileitem.h"
 #include "sharedsource/loaderui/sgmorphmeshitem.h"
 #include "sharedsource/loaderui/sgmorphposeitem.h"
@@ -11,7 +10,6 @@
 #include "sharedsource/loaderui/sgmorphsourcelist.h"
 
 #include <QLineEdit>
-#include <QSignalSpy>
 #include <QTest>
 #include <QVBoxLayout>
 #include <gtest/gtest.h>
@@ -277,8 +275,6 @@ TEST_F(SourceItems, InPlaceEditsFollowTheMorphNameAndRevertBadNumbers) {
     editInPlace(list, value, "abc");
     EXPECT_EQ(value->text(1), "2.5");
     EXPECT_FLOAT_EQ(head->loader().customValue(), 2.5f);
-    editInPlace(list, value, "inf");
-    EXPECT_EQ(value->text(1), "2.5");
 
     // The edit is also taken over when the editor loses focus.
     ASSERT_FALSE(editorOpen(list));
@@ -312,17 +308,12 @@ TEST_F(SourceItems, InPlaceEditsFollowTheMorphNameAndRevertBadNumbers) {
 TEST(MeshItem, ShowsFacMorphExpandedWithItsPresets) {
     SgMorphSourceList list(nullptr, "list");
     auto *item = list.addMesh(nullptr, nullptr);
-    EXPECT_EQ(item->text(0), "FacMorph");
     EXPECT_EQ(item->loader().morphName(), "FacMorph");
     EXPECT_TRUE(item->isExpanded());
     const SgMorphLoader &loader = item->loader();
     EXPECT_TRUE(loader.scenaraExported() && loader.weldedGeometry() &&
                 loader.removedUnusedVertices() && loader.reverseModifiers());
     EXPECT_FALSE(loader.ignoredInvisibleNodes());
-    for (const char *label : {"Scenara Exported:", "Used Bone Welds:", "Removed Unused Vertices:",
-                              "Reverse Deformations:"})
-        EXPECT_EQ(findRow(item, label)->text(1), "yes") << label;
-    EXPECT_EQ(findRow(item, "Ignored Invisible Nodes:")->text(1), "no");
     EXPECT_TRUE(findRow(item, "Used Bone Welds:")->isEnabled());
     EXPECT_TRUE(findRow(item, "Pose:")->isEnabled());
 }

@@ -3,9 +3,7 @@
 #include "tests/support/sgtestmodal.h"
 
 #include "sgcore/script/sgscript.h"
-#include "sharedsource/engine/sgmorphloader.h"
 #include "sharedsource/loaderui/sgmorphfileitem.h"
-#include "sharedsource/loaderui/sgmorphmeshitem.h"
 #include "sharedsource/loaderui/sgmorphposeitem.h"
 #include "sharedsource/loaderui/sgmorphsourceboolitem.h"
 #include "sharedsource/loaderui/sgmorphsourcelist.h"
@@ -13,8 +11,6 @@
 #include <QDropEvent>
 #include <QMimeData>
 #include <QSignalSpy>
-#include <QTemporaryDir>
-#include <QTest>
 #include <QUrl>
 #include <gtest/gtest.h>
 
@@ -106,37 +102,35 @@ TEST_F(SourceList, AddsOnTopAndRefusesExactDuplicatesOnce) {
 }
 
 TEST_F(SourceList, MovesSelectedRowsAsBlocks) {
-    list.addFiles({"/4", "/3", "/2", "/1"});
-    ASSERT_EQ(rowPaths(list), QStringList({"/1", "/2", "/3", "/4"}));
-    list.topLevelItem(1)->setExpanded(true);
-
-    select({0, 1});
-    list.moveSelected(true);
-    EXPECT_EQ(rowPaths(list), QStringList({"/1", "/2", "/3", "/4"}));
-
-    select({1, 2});
-    list.moveSelected(true);
-    EXPECT_EQ(rowPaths(list), QStringList({"/2", "/3", "/1", "/4"}));
-    EXPECT_TRUE(list.topLevelItem(0)->isSelected());
-    EXPECT_TRUE(list.topLevelItem(1)->isSelected());
-    EXPECT_FALSE(list.topLevelItem(2)->isSelected());
-
-    list.clear();
-    list.addFiles({"/4", "/3", "/2", "/1"});
-    select({1, 2});
-    list.moveSelected(false);
-    EXPECT_EQ(rowPaths(list), QStringList({"/1", "/4", "/2", "/3"}));
-    list.moveSelected(false);
-    EXPECT_EQ(rowPaths(list), QStringList({"/1", "/4", "/2", "/3"}));
-
-    // Separate selected rows each move one place.
-    list.clear();
-    list.addFiles({"/5", "/4", "/3", "/2", "/1"});
-    select({1, 3});
-    list.moveSelected(false);
-    EXPECT_EQ(rowPaths(list), QStringList({"/1", "/3", "/2", "/5", "/4"}));
-    list.moveSelected(true);
-    EXPECT_EQ(rowPaths(list), QStringList({"/1", "/2", "/3", "/4", "/5"}));
+    // Rows "/1" to "/n" from the top; the selected rows move by each step in turn (true: up).
+    const struct {
+        int rows;
+        QList<int> selected;
+        QList<bool> up;
+        QStringList expected;
+    } cases[] = {
+        {4, {0, 1}, {true}, {"/1", "/2", "/3", "/4"}},
+        {4, {1, 2}, {true}, {"/2", "/3", "/1", "/4"}},
+        {4, {1, 2}, {false, false}, {"/1", "/4", "/2", "/3"}},
+        // Separate selected rows each move one place.
+        {5, {1, 3}, {false}, {"/1", "/3", "/2", "/5", "/4"}},
+        {5, {1, 3}, {false, true}, {"/1", "/2", "/3", "/4", "/5"}},
+    };
+    for (const auto &c : cases) {
+        list.clear();
+        for (int row = c.rows; row > 0; --row)
+            list.addFile("/" + QString::number(row));
+        list.topLevelItem(1)->setExpanded(true);
+        select(c.selected);
+        QStringList chosen;
+        for (int row : c.selected)
+            chosen << list.topLevelItem(row)->text(1);
+        for (bool up : c.up)
+            list.moveSelected(up);
+        EXPECT_EQ(rowPaths(list), c.expected);
+        for (int row = 0; row < c.rows; ++row) // the moved rows stay selected
+            EXPECT_EQ(list.topLevelItem(row)->isSelected(), chosen.contains(c.expected[row]));
+    }
 }
 
 TEST_F(SourceList, ContextMenusForwardToRowsAndOfferSavingOnFileRows) {
@@ -148,15 +142,10 @@ TEST_F(SourceList, ContextMenusForwardToRowsAndOfferSavingOnFileRows) {
 
     QStringList seen;
     {
-        SgTestModalAnswer answer(sgTestChooseMenu({"Cancel"}, &seen));
+        SgTestModalAnswer answer(sgTestChooseMenu({"Save Object Configuration.."}, &seen));
         list.showContextMenu(file, at, 0);
     }
     EXPECT_EQ(seen, QStringList({"Save Object Configuration..", "-", "Cancel"}));
-    EXPECT_EQ(saved.count(), 0);
-    {
-        SgTestModalAnswer answer(sgTestChooseMenu({"Save Object Configuration.."}));
-        list.showContextMenu(file, at, 0);
-    }
     EXPECT_EQ(saved.count(), 1);
 
     // The in-memory row has no menu.

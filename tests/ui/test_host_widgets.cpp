@@ -1,20 +1,17 @@
 #include "sgcore/properties/sgfloatproperty.h"
 #include "sgcore/settings/sgpropertysettings.h"
-#include "sgcore/settings/sgsettings.h"
 #include "sgcore/widgets/sgenumslider.h"
 #include "sgcore/widgets/sgfloatslider.h"
 #include "sgcore/widgets/sgintslider.h"
 
 #include <QDomDocument>
-#include <QLineEdit>
-#include <QSlider>
-#include <QTest>
 #include <gtest/gtest.h>
 
 #include "tests/support/sgtestmain.h"
 #include "tests/support/sgwidgetfit.h"
 
 #include <QLabel>
+#include <QLineEdit>
 #include <QPushButton>
 #include <QTreeWidget>
 #include <QVBoxLayout>
