@@ -1,7 +1,7 @@
 // The host's plug-in machinery on its own: identifiers, definitions, the script constructor of
-// a class factory, actions and the loader's refusals.
+// a class factory and the loader's refusals (the bridge's action is triggered by the headless
+// test).
 
-#include "sgcore/plugin/sgaction.h"
 #include "sgcore/plugin/sgguid.h"
 #include "sgcore/plugin/sgplugin.h"
 #include "sgcore/plugin/sgpluginloader.h"
@@ -49,15 +49,6 @@ public:
     int lastArguments = -1;
 };
 
-class CountingAction : public SgAction {
-public:
-    CountingAction() : SgAction(QStringLiteral("Count")) {}
-    void executeAction() override { ++executed; }
-    void toggleAction(bool on) override { toggled += on ? 1 : 0; }
-    int executed = 0;
-    int toggled = 0;
-};
-
 } // namespace
 
 TEST(HostPlugin, GuidsParseTheUsualFormOnly) {
@@ -103,19 +94,6 @@ TEST(HostPlugin, FactoriesPublishAConstructorAndEnumsToEachEngine) {
     // Called without `new`, the constructor makes an object as well.
     std::unique_ptr<QObject> plain(engine.evaluate("SgTestWidgetThing()").toQObject());
     EXPECT_NE(qobject_cast<SgTestWidgetThing *>(plain.get()), nullptr);
-}
-
-TEST(HostPlugin, ActionsCallTheirVirtualSlots) {
-    coreApp();
-    CountingAction action;
-    EXPECT_EQ(action.getActionGroup(), QStringLiteral("Plug-ins"));
-    EXPECT_TRUE(action.getDefaultToolBar().isEmpty());
-    action.trigger();
-    action.trigger();
-    EXPECT_EQ(action.executed, 2);
-    action.setCheckable(true);
-    action.setChecked(true);
-    EXPECT_EQ(action.toggled, 1);
 }
 
 TEST(HostPlugin, TheLoaderRefusesFilesThatAreNoPlugins) {
