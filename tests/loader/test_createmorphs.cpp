@@ -1,6 +1,7 @@
 // Rows and runs that work on the scene. The run over all sources: target nodes per mode, sources in
 // list order into one log, the pose step that may skip a source, the in-memory source's own
 // targets, and the progress.
+#include "loadertestsupport.h"
 #include "tests/support/sgtestmodal.h"
 
 #include "sgcore/app/sgapp.h"
@@ -24,7 +25,6 @@
 #include <QAbstractButton>
 #include <QMessageBox>
 #include <QTemporaryDir>
-#include <QTreeWidgetItemIterator>
 #include <gtest/gtest.h>
 
 namespace {
@@ -191,11 +191,7 @@ TEST_F(FigureScene, NodeRowStartsOnTheSelectedFigureAndFindsBonesByName) {
     scene->selectNode(head);
     auto *file = new SgMorphFileItem(&list, "/m/a.obj");
     SgMorphLoader &loader = file->loader();
-    SgMorphSourceItem *node = nullptr;
-    for (QTreeWidgetItemIterator it(&list); *it; ++it) {
-        if ((*it)->text(0) == "Node:")
-            node = static_cast<SgMorphSourceItem *>(*it);
-    }
+    SgMorphSourceItem *node = findRow(file, "Node:");
     ASSERT_NE(node, nullptr);
     EXPECT_EQ(loader.controlNode(), figure);
     EXPECT_EQ(node->valueText(), "Figure");
@@ -226,20 +222,9 @@ TEST_F(FigureScene, GroupPropertyAndNodeRowsChooseFromTheirMenus) {
     SgMorphLoader &loader = file->loader();
     list.show();
     list.expandAll();
-    const auto row = [&](const QString &label) {
-        for (QTreeWidgetItemIterator it(&list); *it; ++it) {
-            if ((*it)->text(0) == label)
-                return *it;
-        }
-        return static_cast<QTreeWidgetItem *>(nullptr);
-    };
+    const auto row = [&](const QString &label) { return findRow(list.invisibleRootItem(), label); };
     const auto choose = [&](const QString &label, const QString &entry) {
-        QStringList seen;
-        SgTestModalAnswer answer(
-            sgTestChooseMenu(entry.isEmpty() ? QStringList() : QStringList{entry}, &seen));
-        list.showContextMenu(row(label), list.viewport()->mapToGlobal(QPoint(5, 5)), 1);
-        EXPECT_TRUE(answer.answered()) << label.toStdString();
-        return seen;
+        return editWithPopup(list, row(label), entry);
     };
 
     EXPECT_EQ(choose("Property Group:", "Morphs/Face"),

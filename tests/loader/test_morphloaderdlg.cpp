@@ -1,6 +1,7 @@
 // The morph loader dialog as a user drives it: the run and the two-step close, the stored
 // settings, file choice, the save options and the configuration files it writes and reads.
 
+#include "loadertestsupport.h"
 #include "sgcore/app/sgapp.h"
 #include "sgcore/app/sgappsettings.h"
 #include "sgcore/morph/sgmorph.h"
@@ -53,19 +54,19 @@ SgTestHandler saveOptions(bool saveObjects, bool relative) {
 const QByteArray TriangleObj = "v 0 0 0\nv 1 0 0\nv 0 1 0\nf 1 2 3\n";
 
 // The setting row with `key` below `row` (depth first), or null.
-SgMorphSourceItem *findRow(QTreeWidgetItem *row, const QString &key) {
+SgMorphSourceItem *findKey(QTreeWidgetItem *row, const QString &key) {
     for (int i = 0; i < row->childCount(); ++i) {
         auto *child = static_cast<SgMorphSourceItem *>(row->child(i));
         if (child->settingKey() == key)
             return child;
-        if (SgMorphSourceItem *found = findRow(child, key))
+        if (SgMorphSourceItem *found = findKey(child, key))
             return found;
     }
     return nullptr;
 }
 
 QString value(QTreeWidgetItem *source, const QString &key) {
-    SgMorphSourceItem *row = findRow(source, key);
+    SgMorphSourceItem *row = findKey(source, key);
     return row ? row->valueText() : QStringLiteral("<missing>");
 }
 
@@ -78,13 +79,6 @@ QStringList allValues(QTreeWidgetItem *row) {
         values << allValues(child);
     }
     return values;
-}
-
-QStringList listedPaths(SgMorphSourceList *list) {
-    QStringList paths;
-    for (int i = 0; i < list->topLevelItemCount(); ++i)
-        paths << list->topLevelItem(i)->text(1);
-    return paths;
 }
 
 SgMorphFileItem *topSource(SgMorphLoaderDlg &dialog) {
@@ -181,7 +175,7 @@ TEST_F(MorphLoaderDlgTest, ProjectPathsRelativeAbsoluteAndNetwork) {
     sgTestWriteFile(path("copy/a.obj"), TriangleObj);
     SgMorphLoaderDlg dialog(nullptr, true, nullptr, nullptr);
     dialog.loadConfigurationFile(path("copy/set.scx"), path("copy"));
-    EXPECT_EQ(listedPaths(dialog.sourceList()),
+    EXPECT_EQ(rowPaths(*dialog.sourceList()),
               (QStringList{path("copy/a.obj"), path("proj-other/b.obj")}));
 
     EXPECT_EQ(SgMorphConfiguration::resolvePath("E:/copy", "/a.obj"), "E:/copy/a.obj");
@@ -215,7 +209,7 @@ TEST_F(MorphLoaderDlgTest, ProjectLoadsInSavedOrderAndSkipsMissingGeometry) {
     SgTestModalAnswer script(QList<SgTestHandler>{});
     dialog.loadConfigurationFile(path("set.scx"), m_dir.path());
     EXPECT_TRUE(script.titles().isEmpty());
-    EXPECT_EQ(listedPaths(dialog.sourceList()),
+    EXPECT_EQ(rowPaths(*dialog.sourceList()),
               (QStringList{path("one.obj"), path("two.obj"), path("three.obj")}));
     EXPECT_EQ(value(dialog.sourceList()->topLevelItem(1), "Name"), "second");
     EXPECT_EQ(value(dialog.sourceList()->topLevelItem(0), "Name"), "one");
@@ -268,8 +262,8 @@ TEST_F(MorphLoaderDlgTest, ObjectValuesLoadAsTheRowsRead) {
     SgMorphLoaderDlg dialog(nullptr, true, nullptr, nullptr);
     dialog.sourceList()->addFile(path("head.obj"));
     SgMorphFileItem *source = topSource(dialog);
-    findRow(source, "UpdateOverrideExisting")->setValueText("Deltas Only");
-    findRow(source, "ERCType")->setValueText("3");
+    findKey(source, "UpdateOverrideExisting")->setValueText("Deltas Only");
+    findKey(source, "ERCType")->setValueText("3");
     sgTestWriteFile(
         path("head.obj.scx"),
         "<VarnTargetImporter Version=\"1\"><FileType Type=\"Object\">"
@@ -315,7 +309,7 @@ TEST_F(MorphLoaderDlgTest, SaveThenLoadReproducesEveryRowAndTheControlProperty) 
                                             {"ApplyAfterJointBinding", "True"},
                                             {"UpdateOverrideExisting", "Deltas and ERC Links"},
                                             {"CleanUp", "False"}})
-            findRow(source, key)->setValueText(text);
+            findKey(source, key)->setValueText(text);
         auto *property = new SgFloatProperty("smile");
         property->setLabel("Smile Control");
         property->setMin(-1.0f);
@@ -466,7 +460,7 @@ TEST_F(MorphLoaderDlgTest, ChooseFilesStartsInDocumentsAndRemembersFolder) {
     SgTestModalAnswer script(sgTestChooseFile(path("geo/a.obj"), &directory));
     dialog.findChild<QPushButton *>("MorphLoaderBrowseBtn")->click();
     EXPECT_EQ(directory, documents);
-    EXPECT_EQ(listedPaths(dialog.sourceList()), QStringList{path("geo/a.obj")});
+    EXPECT_EQ(rowPaths(*dialog.sourceList()), QStringList{path("geo/a.obj")});
     EXPECT_EQ(SgAppSettings("TargetImporter").getString("LastDirectory"), path("geo"));
 
     // A remembered folder that is gone opens its nearest existing parent, with no name typed.

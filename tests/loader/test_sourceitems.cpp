@@ -1,6 +1,6 @@
 // The settings tree under each morph source: shown order, values, enabling rules, editors and
 // configuration text, driven through the real list and its popups.
-#include "tests/support/sgtestmodal.h"
+#include "loadertestsupport.h"
 
 #include "sharedsource/engine/sgmorphloader.h"
 #include "sharedsource/loaderui/sgmorphfileitem.h"
@@ -27,32 +27,8 @@ std::string describe(QTreeWidgetItem *item, int depth = 0) {
     return out;
 }
 
-SgMorphSourceItem *findRow(QTreeWidgetItem *top, const QString &label) {
-    for (int i = 0; i < top->childCount(); ++i) {
-        QTreeWidgetItem *child = top->child(i);
-        if (child->text(0) == label)
-            return static_cast<SgMorphSourceItem *>(child);
-        if (SgMorphSourceItem *found = findRow(child, label))
-            return found;
-    }
-    return nullptr;
-}
-
 SgMorphSourceBoolItem *boolRow(QTreeWidgetItem *top, const QString &label) {
     return dynamic_cast<SgMorphSourceBoolItem *>(findRow(top, label));
-}
-
-// Opens a row's editor the way the list does on a right click over `column`, answering the
-// popup with `entry` ("" dismisses it).
-QStringList editWithPopup(SgMorphSourceList &list, QTreeWidgetItem *row, const QString &entry,
-                          int column = 1) {
-    QStringList seen;
-    SgTestModalAnswer answer(
-        sgTestChooseMenu(entry.isEmpty() ? QStringList() : QStringList{entry}, &seen));
-    list.showContextMenu(row, list.viewport()->mapToGlobal(list.visualItemRect(row).center()),
-                         column);
-    EXPECT_TRUE(answer.answered());
-    return seen;
 }
 
 // The open in-place editor of the list, if any.

@@ -1,6 +1,6 @@
 // The source list: adding, refusing duplicates, removing, reordering, dropping files and the
 // context menus, driven through the real list.
-#include "tests/support/sgtestmodal.h"
+#include "loadertestsupport.h"
 
 #include "sgcore/script/sgscript.h"
 #include "sharedsource/loaderui/sgmorphfileitem.h"
@@ -18,24 +18,6 @@ namespace {
 
 QString poseExtension() {
     return QString(SgScript::s_VarnScript2TextExtension);
-}
-
-QStringList rowPaths(const SgMorphSourceList &list) {
-    QStringList paths;
-    for (int i = 0; i < list.topLevelItemCount(); ++i)
-        paths.append(list.topLevelItem(i)->text(1));
-    return paths;
-}
-
-QTreeWidgetItem *findLabel(QTreeWidgetItem *top, const QString &label) {
-    for (int i = 0; i < top->childCount(); ++i) {
-        QTreeWidgetItem *child = top->child(i);
-        if (child->text(0) == label)
-            return child;
-        if (QTreeWidgetItem *found = findLabel(child, label))
-            return found;
-    }
-    return nullptr;
 }
 
 // Drops `files` onto the list's viewport at `point`.
@@ -158,7 +140,7 @@ TEST_F(SourceList, ContextMenusForwardToRowsAndOfferSavingOnFileRows) {
 
     // A right click on a setting row's value opens its editor.
     list.expandAll();
-    QTreeWidgetItem *reverse = findLabel(file, "Reverse Deformations:");
+    QTreeWidgetItem *reverse = findRow(file, "Reverse Deformations:");
     const QRect rect = list.visualItemRect(reverse);
     const QPoint click(list.columnViewportPosition(1) + 5, rect.center().y());
     {
@@ -171,7 +153,7 @@ TEST_F(SourceList, ContextMenusForwardToRowsAndOfferSavingOnFileRows) {
     EXPECT_TRUE(static_cast<SgMorphFileItem *>(file)->loader().reverseModifiers());
 
     // The context-menu key opens the editor of the current row.
-    list.setCurrentItem(findLabel(file, "Apply After Joint Binding:"));
+    list.setCurrentItem(findRow(file, "Apply After Joint Binding:"));
     {
         SgTestModalAnswer answer(sgTestChooseMenu({"yes"}));
         QContextMenuEvent event(QContextMenuEvent::Keyboard, QPoint(1, 1),
@@ -197,8 +179,8 @@ TEST_F(SourceList, DropsAddGeometryFilesAndSetPoses) {
 
     // A pose file onto the enabled "Pose:" row sets the pose and adds nothing.
     QTreeWidgetItem *file = list.topLevelItem(0);
-    auto *reverse = static_cast<SgMorphSourceBoolItem *>(findLabel(file, "Reverse Deformations:"));
-    auto *pose = static_cast<SgMorphPoseItem *>(findLabel(file, "Pose:"));
+    auto *reverse = static_cast<SgMorphSourceBoolItem *>(findRow(file, "Reverse Deformations:"));
+    auto *pose = static_cast<SgMorphPoseItem *>(findRow(file, "Pose:"));
     const QString script = "/poses/sit." + poseExtension();
     list.expandAll();
     {
