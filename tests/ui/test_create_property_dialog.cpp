@@ -68,6 +68,10 @@ protected:
     static void setText(Dlg &dialog, const char *name, const QString &text) {
         child<QLineEdit>(dialog, name)->setText(text);
     }
+    static void setNames(Dlg &dialog, const QString &name, const QString &label) {
+        setText(dialog, "SgPropertyInternalNameAttrib", name);
+        setText(dialog, "SgPropertyLabelAttrib", label);
+    }
     static void setOn(Dlg &dialog, const char *name, bool on) {
         child<SgBoolButton>(dialog, name)->setOn(on);
     }
@@ -146,8 +150,7 @@ TEST_F(CreatePropertyDialog, ValidationListsEveryFailedCheckInOrder) {
         auto dialog = makeDialog(c.type);
         dialog->show();
         dialog->setCreationNode(c.onNode ? node : nullptr);
-        setText(*dialog, "SgPropertyInternalNameAttrib", c.name);
-        setText(*dialog, "SgPropertyLabelAttrib", c.label);
+        setNames(*dialog, c.name, c.label);
         if (c.type == Dlg::IntType) {
             setInt(*dialog, "SgIntMinAttrib", int(c.min));
             setInt(*dialog, "SgIntMaxAttrib", int(c.max));
@@ -184,8 +187,7 @@ TEST_F(CreatePropertyDialog, IntMaxSliderReachesTheHostLimitWithoutTypedText) {
     auto dialog = makeDialog(Dlg::IntType);
     dialog->show();
     dialog->setCreationNode(node);
-    setText(*dialog, "SgPropertyInternalNameAttrib", "many");
-    setText(*dialog, "SgPropertyLabelAttrib", "Many");
+    setNames(*dialog, "many", "Many");
     setInt(*dialog, "SgIntMinAttrib", 2);
     // The Max slider takes no typed text, yet reaches the host's default limit of 100 (its span
     // starts at -1000).
@@ -206,8 +208,7 @@ TEST_F(CreatePropertyDialog, EachTypeCreatesItsPropertyFromTheDialogsValues) {
     auto dialog = makeDialog(Dlg::FloatType, false);
     dialog->show();
     setText(*dialog, "SgPathAttrib", "Morphs/Face");
-    setText(*dialog, "SgPropertyInternalNameAttrib", " smile ");
-    setText(*dialog, "SgPropertyLabelAttrib", "Smile");
+    setNames(*dialog, " smile ", "Smile");
     setOn(*dialog, "SgPropertyHiddenAttrib", true);
     setOn(*dialog, "SgPropertyLockedAttrib", true);
     setOn(*dialog, "SgPropertyAnimationAttrib", false);
@@ -294,8 +295,7 @@ TEST_F(CreatePropertyDialog, CreatesOnEveryNodeAndWarnsForARefusingOne) {
     // A list with a null entry (a node gone from the scene) must not crash "Create" later.
     SgNodeList withNull{first, nullptr, refusing, third};
     dialog->setCreationNodes(withNull);
-    setText(*dialog, "SgPropertyInternalNameAttrib", "wink");
-    setText(*dialog, "SgPropertyLabelAttrib", "Wink");
+    setNames(*dialog, "wink", "Wink");
     EXPECT_EQ(clickCreate(*dialog, true), "Unable to add property to refusing node");
     EXPECT_EQ(dialog->result(), QDialog::Accepted);
     ASSERT_EQ(first->getPropertyCount(), 1);
@@ -308,8 +308,7 @@ TEST_F(CreatePropertyDialog, CreatesOnEveryNodeAndWarnsForARefusingOne) {
     auto validateOnly = makeDialog(Dlg::FloatType, false);
     validateOnly->show();
     validateOnly->setCreationNode(third);
-    setText(*validateOnly, "SgPropertyInternalNameAttrib", "blink");
-    setText(*validateOnly, "SgPropertyLabelAttrib", "Blink");
+    setNames(*validateOnly, "blink", "Blink");
     clickCreate(*validateOnly, false);
     EXPECT_EQ(validateOnly->result(), QDialog::Accepted);
     EXPECT_EQ(third->getPropertyCount(), 1);
@@ -324,8 +323,7 @@ TEST_F(CreatePropertyDialog, EmptyMorphGoesFirstOrAfterTheJoint) {
     dialog->show();
     SgNodeList nodes{withObject, withoutObject};
     dialog->setCreationNodes(nodes);
-    setText(*dialog, "SgPropertyInternalNameAttrib", "bulge");
-    setText(*dialog, "SgPropertyLabelAttrib", "Bulge");
+    setNames(*dialog, "bulge", "Bulge");
     setFloat(*dialog, "SgFloatMaxAttrib", 2.0f);
     child<QCheckBox>(*dialog, "SgCreateAsMorphOption")->setChecked(true);
     clickCreate(*dialog, false);
@@ -343,8 +341,7 @@ TEST_F(CreatePropertyDialog, EmptyMorphGoesFirstOrAfterTheJoint) {
     auto after = makeDialog();
     after->show();
     after->setCreationNode(withObject);
-    setText(*after, "SgPropertyInternalNameAttrib", "late");
-    setText(*after, "SgPropertyLabelAttrib", "Late");
+    setNames(*after, "late", "Late");
     child<QCheckBox>(*after, "SgCreateAsMorphOption")->setChecked(true);
     child<QCheckBox>(*after, "SgCreateAfterJointOption")->setChecked(true);
     clickCreate(*after, false);
