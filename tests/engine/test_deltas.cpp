@@ -109,23 +109,3 @@ TEST_F(Deltas, CountMismatchAndInvalidTargetsGiveNoTable) {
                   QString("Base geometry has invalid coordinates - delta calculation failed."));
     }
 }
-
-TEST_F(Deltas, TableKeepsVertexOrderAndAppliesWithWeight) {
-    SgMorphDeltas deltas;
-    deltas.setVertCount(10);
-    deltas.addDelta(5, SgVec3(1, 0, 0), false);
-    deltas.addDelta(2, SgVec3(0, 1, 0), false);
-    deltas.addDelta(5, SgVec3(2, 0, 0), false);
-    deltas.addDelta(8, SgVec3(0, 0, 1), true);
-    ASSERT_EQ(deltas.getNumEntries(), 3);
-    EXPECT_EQ(deltas.getVertex(0), 2);
-    EXPECT_EQ(deltas.getVertex(1), 5);
-    EXPECT_EQ(deltas.getDelta(1), SgVec3(2, 0, 0));
-    EXPECT_EQ(deltas.findEntry(8), 2);
-    EXPECT_EQ(deltas.findEntry(3), -1);
-
-    std::vector<SgVec3> points(6);
-    deltas.apply(points.data(), 6, 0.5f); // vertex 8 lies outside these points
-    EXPECT_EQ(points[2], SgVec3(0, 0.5f, 0));
-    EXPECT_EQ(points[5], SgVec3(1, 0, 0));
-}

@@ -17,7 +17,6 @@
 #include "sharedsource/loaderui/sgmorphsourceitem.h"
 #include "sharedsource/loaderui/sgmorphsourcelist.h"
 #include "tests/support/sgtestmodal.h"
-#include "tests/support/sgtestscene.h"
 
 #include <QCheckBox>
 #include <QComboBox>
@@ -40,7 +39,6 @@ namespace {
 // Answers the save options dialog: objects saved or not, relative or absolute paths, "Ok".
 SgTestHandler saveOptions(bool saveObjects, bool relative) {
     return sgTestAs<SgConfigurationSaveOptionsDlg>([=](SgConfigurationSaveOptionsDlg *dialog) {
-        EXPECT_EQ(dialog->windowTitle(), "Project Save Options");
         dialog->findChild<QCheckBox *>("MorphLoaderSaveObjectConfigurationCheckBox")
             ->setChecked(saveObjects);
         dialog
@@ -429,25 +427,6 @@ TEST_F(MorphLoaderDlgTest, RunThenSecondOkAcceptsOnlyWithoutProblems) {
     // The stored index comes back.
     SgMorphLoaderDlg offered(nullptr, true, nullptr, nullptr);
     EXPECT_EQ(offered.findChild<QComboBox *>("MorphLoaderNodes")->currentIndex(), 1);
-}
-
-TEST_F(MorphLoaderDlgTest, BridgeModeCreatePropClosesWithoutRun) {
-    SgPolyMesh *mesh = sgTestPolygon({{0, 0, 0}, {1, 0, 0}, {0, 1, 0}});
-    mesh->ref();
-    SgMorphLoaderDlg bridge(nullptr, false, mesh, m_figure);
-    EXPECT_EQ(bridge.sourceList()->topLevelItemCount(), 1);
-    auto *actions = bridge.findChild<QComboBox *>("FcBridgehAction");
-    ASSERT_NE(actions, nullptr);
-    bridge.show();
-    actions->setCurrentIndex(1);
-    emit actions->textActivated(actions->currentText());
-    EXPECT_EQ(bridge.actionText(), "Create Prop");
-    EXPECT_FALSE(bridge.sourceList()->isEnabled());
-    bridge.buttonBox()->button(QDialogButtonBox::Ok)->click();
-    EXPECT_FALSE(bridge.isVisible());
-    EXPECT_EQ(bridge.result(), QDialog::Accepted);
-    EXPECT_EQ(bridge.findChild<QTextBrowser *>("MorphLoaderLog")->toPlainText(), "");
-    mesh->unref();
 }
 
 TEST_F(MorphLoaderDlgTest, ChooseFilesStartsInDocumentsAndRemembersFolder) {

@@ -42,9 +42,8 @@ protected:
 
     // A dialog as most callers make it: all types, create on accept, values kept between shows.
     std::unique_ptr<Dlg> makeDialog(int type = Dlg::FloatType, bool createOnAccept = true) {
-        auto dialog = std::make_unique<Dlg>(nullptr, "TestCreatePropertyDlg", false, type,
-                                            createOnAccept, false);
-        return dialog;
+        return std::make_unique<Dlg>(nullptr, "TestCreatePropertyDlg", false, type, createOnAccept,
+                                     false);
     }
 
     template <typename T> static T *child(Dlg &dialog, const char *name) {
@@ -227,13 +226,10 @@ TEST_F(CreatePropertyDialog, EachTypeCreatesItsPropertyFromTheDialogsValues) {
     EXPECT_EQ(floatProperty->getDefaultValue(), 0.25f);
     EXPECT_EQ(floatProperty->getMin(), -2.0f);
     EXPECT_EQ(floatProperty->getMax(), 3.0f);
-    EXPECT_EQ(floatProperty->getSensitivity(), 0.125f);
-    EXPECT_FALSE(floatProperty->getDisplayAsPercent());
     EXPECT_FALSE(floatProperty->isClamped());
     EXPECT_EQ(floatProperty->getName(), " smile "); // as typed
     EXPECT_EQ(floatProperty->getPath(), "Morphs/Face");
     EXPECT_TRUE(floatProperty->isHidden() && floatProperty->isLocked());
-    EXPECT_FALSE(floatProperty->canAnimate());
     EXPECT_EQ(floatProperty->getOwner(), nullptr);
 
     chooseType(*dialog, Dlg::NodeType);

@@ -8,13 +8,9 @@
 #include <gtest/gtest.h>
 
 #include "tests/support/sgtestmain.h"
-#include "tests/support/sgwidgetfit.h"
 
-#include <QLabel>
 #include <QLineEdit>
-#include <QPushButton>
-#include <QTreeWidget>
-#include <QVBoxLayout>
+#include <QSlider>
 
 TEST(HostWidgets, SlidersKeepExactValuesAndTakeTypedNumbersOnlyWhenEditable) {
     SgFloatSlider slider(nullptr, "f");
@@ -34,7 +30,6 @@ TEST(HostWidgets, SlidersKeepExactValuesAndTakeTypedNumbersOnlyWhenEditable) {
     EXPECT_EQ(slider.textField()->text(), "2.5");
 
     slider.setTextEditable(false);
-    EXPECT_FALSE(slider.isTextEditable());
     slider.textField()->setText("7");
     emit slider.textField()->editingFinished();
     EXPECT_EQ(slider.getValue(), 2.5f);
@@ -130,41 +125,4 @@ TEST(HostSettings, PropertyAttributesRoundTripExactlyThroughTheDom) {
     EXPECT_FALSE(back.fromDOM(bad.documentElement()));
     EXPECT_EQ(back.keys(), QStringList({"D"}));
     EXPECT_EQ(back.value("D").toInt(), 4);
-}
-
-TEST(WidgetFit, CutTextsFindsCutLabelsButtonsAndTreeRows) {
-    QWidget window;
-    auto *layout = new QVBoxLayout(&window);
-    auto *whole = new QLabel("Whole label", &window);
-    auto *cut = new QLabel("A label far too long for its width", &window);
-    cut->setObjectName("CutLabel");
-    cut->setMinimumWidth(1); // the layout may squeeze it below its text
-    cut->setFixedWidth(40);
-    auto *button = new QPushButton("A button with a long text", &window);
-    button->setFixedWidth(50);
-    auto *tree = new QTreeWidget(&window);
-    tree->setHeaderLabels({"Item", "Value"});
-    auto *top = new QTreeWidgetItem(tree, {"Source", "x"});
-    new QTreeWidgetItem(top, {"A setting row with a long label:", "Yes"});
-    tree->setColumnWidth(0, 80);
-    layout->addWidget(whole);
-    layout->addWidget(cut);
-    layout->addWidget(button);
-    layout->addWidget(tree);
-    window.resize(400, 300);
-    window.show();
-
-    // The child row is hidden while its parent is collapsed.
-    QStringList texts = sgCutTexts(&window);
-    EXPECT_EQ(texts.size(), 2) << texts.join('\n').toStdString();
-    EXPECT_TRUE(texts.filter("CutLabel \"A label far too long").size() == 1);
-    EXPECT_TRUE(texts.filter("button QPushButton \"A button").size() == 1);
-    tree->expandAll();
-    texts = sgCutTexts(&window);
-    EXPECT_EQ(texts.filter("A setting row with a long label:").size(), 1)
-        << texts.join('\n').toStdString();
-    tree->resizeColumnToContents(0);
-    cut->setFixedWidth(cut->sizeHint().width());
-    button->setFixedWidth(button->sizeHint().width());
-    EXPECT_EQ(sgCutTexts(&window), QStringList());
 }

@@ -114,7 +114,7 @@ TEST_F(PropertyMenus, CreateGroupDialogFromTheMenu) {
 TEST_F(PropertyMenus, TreeMenuListsNumericPropertiesAndChoosesThem) {
     auto *node = new SgNode("body");
     scene()->addNode(node);
-    auto *bend = addProperty(node, new SgFloatProperty("bend"), "Pose");
+    addProperty(node, new SgFloatProperty("bend"), "Pose");
     addProperty(node, new SgBoolProperty("flag"), "Pose");
     auto *count = addProperty(node, new SgIntProperty("count"), "Pose");
     addProperty(node, new SgColorProperty("tint"), "Pose");
@@ -142,7 +142,6 @@ TEST_F(PropertyMenus, TreeMenuListsNumericPropertiesAndChoosesThem) {
               nullptr);
     EXPECT_EQ(pick({}, [&] { return menu.chooseProperty(current.get(), QPoint()); }),
               current.get());
-    (void)bend;
 
     // No element: "- none -", which keeps the current property.
     SgPropertyTreeMenu none("Morph Name", nullptr, nullptr, "none");
