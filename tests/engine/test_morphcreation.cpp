@@ -10,7 +10,6 @@
 #include "sharedsource/engine/sgmorphloadlog.h"
 
 #include "tests/support/sgtestmodal.h"
-#include "tests/support/sgtestscene.h"
 
 #include <limits>
 #include <memory>
@@ -62,7 +61,6 @@ TEST_F(MorphCreation, NewMorphCarriesDeltasChannelSettingsAndLogEntries) {
     ASSERT_EQ(morph->getDeltas()->getNumEntries(), 1);
     EXPECT_EQ(morph->getDeltas()->getVertex(0), 4);
     SgFloatProperty *channel = morph->getValueChannel();
-    EXPECT_EQ(channel->getOwner(), morph);
     EXPECT_EQ(channel->getPath(), QString("Morphs/Face"));
 
     // The channel drives the cached geometry, clamped to its range.

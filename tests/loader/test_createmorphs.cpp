@@ -2,7 +2,6 @@
 // list order into one log, the pose step that may skip a source, the in-memory source's own
 // targets, and the progress.
 #include "loadertestsupport.h"
-#include "tests/support/sgtestmodal.h"
 
 #include "sgcore/app/sgapp.h"
 #include "sgcore/app/sgmessagesink.h"
@@ -18,14 +17,11 @@
 #include "sharedsource/loaderui/sgmorphfileitem.h"
 #include "sharedsource/loaderui/sgmorphmeshitem.h"
 #include "sharedsource/loaderui/sgmorphsourceboolitem.h"
-#include "sharedsource/loaderui/sgmorphsourceitem.h"
-#include "sharedsource/loaderui/sgmorphsourcelist.h"
 #include "tests/support/sgtestscene.h"
 
 #include <QAbstractButton>
 #include <QMessageBox>
 #include <QTemporaryDir>
-#include <gtest/gtest.h>
 
 namespace {
 

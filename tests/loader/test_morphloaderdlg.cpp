@@ -14,9 +14,6 @@
 #include "sharedsource/loaderui/sgmorphconfiguration.h"
 #include "sharedsource/loaderui/sgmorphfileitem.h"
 #include "sharedsource/loaderui/sgmorphloaderdlg.h"
-#include "sharedsource/loaderui/sgmorphsourceitem.h"
-#include "sharedsource/loaderui/sgmorphsourcelist.h"
-#include "tests/support/sgtestmodal.h"
 
 #include <QCheckBox>
 #include <QComboBox>
@@ -31,7 +28,6 @@
 #include <QTemporaryDir>
 #include <QTest>
 #include <QTextBrowser>
-#include <gtest/gtest.h>
 #include <memory>
 
 namespace {

@@ -7,12 +7,10 @@
 #include "sharedsource/loaderui/sgmorphmeshitem.h"
 #include "sharedsource/loaderui/sgmorphposeitem.h"
 #include "sharedsource/loaderui/sgmorphsourceboolitem.h"
-#include "sharedsource/loaderui/sgmorphsourcelist.h"
 
 #include <QLineEdit>
 #include <QTest>
 #include <QVBoxLayout>
-#include <gtest/gtest.h>
 
 namespace {
 

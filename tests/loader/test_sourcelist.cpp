@@ -6,13 +6,11 @@
 #include "sharedsource/loaderui/sgmorphfileitem.h"
 #include "sharedsource/loaderui/sgmorphposeitem.h"
 #include "sharedsource/loaderui/sgmorphsourceboolitem.h"
-#include "sharedsource/loaderui/sgmorphsourcelist.h"
 
 #include <QDropEvent>
 #include <QMimeData>
 #include <QSignalSpy>
 #include <QUrl>
-#include <gtest/gtest.h>
 
 namespace {
 
