@@ -103,8 +103,6 @@ TEST_F(ExchangeWriterTest, WorkedRecordByteForByte) {
                                                     "020000000000000000000000"
                                                     "00000000"); // empty trailer at 161
     EXPECT_EQ(r.toHex(), expected.toHex());
-    EXPECT_EQ(i32At(r, 116), 1);
-    EXPECT_EQ(r.at(120), 'T');
 }
 
 TEST_F(ExchangeWriterTest, RecordSizesAndScaling) {
@@ -114,9 +112,6 @@ TEST_F(ExchangeWriterTest, RecordSizesAndScaling) {
     sgTestAddFacet(*triangles, 0, {{1}, {2}, {3}});
     auto triNode = prop("T", triangles, {new BareMaterial("M")});
     const QByteArray t = writeNode(triNode.get(), "end");
-    EXPECT_FLOAT_EQ(f32At(t, 9), 1.0f);
-    EXPECT_FLOAT_EQ(f32At(t, 13), 2.0f);
-    EXPECT_FLOAT_EQ(f32At(t, 17), 3.0f);
     const qsizetype uAt = 9 + 4 * 12;
     EXPECT_EQ(i32At(t, uAt), 0);
     const qsizetype fAt = uAt + 4 + 67;
