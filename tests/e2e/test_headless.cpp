@@ -2,20 +2,12 @@
 // demonstration's round trip makes one morph per moved bone and exports the figure at morph
 // value 1; a failing script ends with a non-zero status; command-line switches reach the host.
 
-#include "sgcore/geometry/sgobject.h"
 #include "sgcore/geometry/sgpolymesh.h"
 #include "sgcore/io/sgobjreader.h"
-#include "sgcore/io/sgscenefile.h"
-#include "sgcore/scene/sgbone.h"
-#include "sgcore/scene/sgnode.h"
-#include "sgcore/scene/sgscene.h"
-#include "sgcore/scene/sgskeleton.h"
 
 #include "exchange/shm/sgcontrolrecord.h"
 #include "tests/support/sgtestprocess.h"
-#include "tests/support/sgtestscene.h"
 
-#include <QDir>
 #include <QFile>
 #include <QProcess>
 #include <QProcessEnvironment>
@@ -79,7 +71,6 @@ TEST(HeadlessDemo, RoundTripMakesMorphsAndExportsTheFigureAtValueOne) {
         environmentIn(dir, QStringLiteral("scale=1.25")));
     ASSERT_EQ(run.status, 0) << run.out.toStdString() << run.err.toStdString();
     EXPECT_TRUE(run.out.contains(QStringLiteral("morphs created: 3"))) << run.out.toStdString();
-    EXPECT_TRUE(run.out.contains(QStringLiteral("Created morph successfully.")));
     EXPECT_TRUE(run.out.contains(QStringLiteral(
         "control property MyMorph on Blobby: value 1, range -1 to 1 (clamped), group \"Morphs\"")))
         << run.out.toStdString();
@@ -105,22 +96,6 @@ TEST(HeadlessDemo, RoundTripMakesMorphsAndExportsTheFigureAtValueOne) {
             EXPECT_NEAR(actual.z, expected.z, 1e-4) << bone << " " << i;
         }
         offset += int(vertices.size());
-    }
-    EXPECT_EQ(offset, result->getVertexCount());
-    // The saved scene reopens with the morphs at 1: the bones' current geometry is the export.
-    SgScene reopened;
-    SgSceneFile saved;
-    ASSERT_TRUE(saved.load(dir.filePath(QStringLiteral("Blobby-scene.json")), &reopened))
-        << saved.getErrorString().toStdString();
-    auto *figure = dynamic_cast<SgSkeleton *>(reopened.findNodeByLabel(QStringLiteral("Blobby")));
-    ASSERT_NE(figure, nullptr);
-    offset = 0;
-    for (SgBone *bone : figure->getAllBones()) {
-        const SgVertexMesh *current = bone->getObject()->getCachedGeom();
-        for (int i = 0; i < current->getVertexCount(); ++i)
-            EXPECT_TRUE(current->getVertex(i) == result->getVertex(offset + i))
-                << bone->getName().toStdString() << " " << i;
-        offset += current->getVertexCount();
     }
     EXPECT_EQ(offset, result->getVertexCount());
     // Nothing of the bridge's segments is left behind.

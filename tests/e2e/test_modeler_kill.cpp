@@ -3,7 +3,7 @@
 // a broken exchange, a restarted modeler links and completes a round trip, and once both
 // sides have quit nothing of the two segments is left.
 
-#include "bridge/sgfacbridge.h"
+#include "tests/e2e/e2etestbridge.h"
 #include "tests/support/sgtestprocess.h"
 #include "tests/support/sgtestscene.h"
 
@@ -17,22 +17,15 @@
 #include "sgcore/scene/sgscene.h"
 
 #include <QElapsedTimer>
-#include <QFile>
 #include <QProcess>
 #include <QTimer>
 
 #include <algorithm>
-#include <cerrno>
-#include <csignal>
+#include <cstdio>
 
 #include <gtest/gtest.h>
 
 namespace {
-
-class TestBridge : public SgFacBridge {
-public:
-    using SgFacBridge::executeAction;
-};
 
 // A poll step may wait 25 ms for the control lock and do a little work besides; on a machine
 // busy with other tests the wait's end can come a few milliseconds late. A step that waited
@@ -129,16 +122,6 @@ private:
     qint64 m_pid;
 };
 
-SgMorph *morphOn(SgNode *node) {
-    return node && node->getObject()
-               ? dynamic_cast<SgMorph *>(node->getObject()->findModifier(QStringLiteral("MyMorph")))
-               : nullptr;
-}
-
-int modifierCount(const SgNode *node) {
-    return node->getObject() ? node->getObject()->getModifierCount() : 0;
-}
-
 class ModelerKill : public ::testing::Test {
 protected:
     void SetUp() override {
@@ -150,7 +133,7 @@ protected:
     // Selects `node` alone and sends it: the bridge launches a modeler when it is not linked;
     // when it is, the user starts one (the bridge only collects the node). The modeler stops
     // at `pauseAt` ("" for nowhere) and expects `expect` nodes. Returns its process id.
-    qint64 send(TestBridge &bridge, SgNode *node, const QByteArray &pauseAt, int expect) {
+    qint64 send(E2eBridge &bridge, SgNode *node, const QByteArray &pauseAt, int expect) {
         m_modeler.set("FACETOR_PAUSE_AT", pauseAt);
         m_modeler.set("FACETOR_EXPECT", QByteArray::number(expect));
         m_modeler.newLog();
@@ -178,7 +161,7 @@ protected:
 
 TEST_F(ModelerKill, HostStaysResponsiveAndARestartedModelerWorks) {
     SgScene *scene = sgApp->getScene();
-    TestBridge bridge;
+    E2eBridge bridge;
     TimedPoll poll(bridge);
     QElapsedTimer total;
     total.start();
@@ -198,7 +181,7 @@ TEST_F(ModelerKill, HostStaysResponsiveAndARestartedModelerWorks) {
                 5000))
                 << log().toStdString();
             if (moment.imported) {
-                ASSERT_TRUE(sgTestWaitUntil([&] { return morphOn(cup) != nullptr; }, 3000))
+                ASSERT_TRUE(sgTestWaitUntil([&] { return e2eMorphOn(cup) != nullptr; }, 3000))
                     << log().toStdString();
             }
             // A lock the modeler holds is held across a few poll steps before it dies.
@@ -216,7 +199,7 @@ TEST_F(ModelerKill, HostStaysResponsiveAndARestartedModelerWorks) {
                       moment.goodbyeSeen ? QStringLiteral("Facetor has quit.")
                                          : QStringLiteral("Facetor has quit unexpectedly."));
             EXPECT_EQ(scene->getNodeCount(), nodes);
-            EXPECT_EQ(modifierCount(cup), moment.imported ? 1 : 0);
+            EXPECT_EQ(e2eModifierCount(cup), moment.imported ? 1 : 0);
         }
 
         // A restarted modeler links and completes a round trip of a new node.
@@ -228,12 +211,12 @@ TEST_F(ModelerKill, HostStaysResponsiveAndARestartedModelerWorks) {
             [&] { return !bridge.isActive() && bridge.pendingImports() == 0; }, 10000))
             << log().toStdString();
         EXPECT_GT(poll.steps(), steps);
-        ASSERT_NE(morphOn(mug), nullptr) << log().toStdString();
-        morphOn(mug)->getValueChannel()->setValue(1.0f);
+        ASSERT_NE(e2eMorphOn(mug), nullptr) << log().toStdString();
+        e2eMorphOn(mug)->getValueChannel()->setValue(1.0f);
         EXPECT_NEAR(mug->getObject()->getCachedGeom()->getVertex(0).y, 5.0f + 5.0f, 1e-4);
         // The node of the broken exchange went to the restarted modeler when the dead one
         // never acknowledged it, and came back once at most.
-        EXPECT_EQ(modifierCount(cup), moment.imported || moment.restartReceives == 2 ? 1 : 0);
+        EXPECT_EQ(e2eModifierCount(cup), moment.imported || moment.restartReceives == 2 ? 1 : 0);
         EXPECT_EQ(bridge.sendList().count(), 0);
         EXPECT_FALSE(bridge.isExchangeBusy());
         EXPECT_TRUE(sgTestWaitUntil([] { return sgTestLeftovers().isEmpty(); }, 2000))
@@ -253,7 +236,7 @@ TEST_F(ModelerKill, HostThatQuitsAfterAKilledModelerLeavesNothingBehind) {
     // The modeler dies attached to the node record the host holds, and is never uncounted;
     // the host quits before its poll has noticed.
     {
-        TestBridge bridge;
+        E2eBridge bridge;
         ModelerKiller modeler(send(bridge, cup, "node-locked", 1));
         ASSERT_TRUE(sgTestWaitUntil(
             [&] { return log().contains(QStringLiteral("paused node-locked\n")); }, 5000))
@@ -266,12 +249,12 @@ TEST_F(ModelerKill, HostThatQuitsAfterAKilledModelerLeavesNothingBehind) {
     EXPECT_TRUE(sgTestLeftovers().isEmpty()) << sgTestLeftovers().join(' ').toStdString();
 
     // A host started afresh in the same process links a new modeler and gets its node back.
-    TestBridge bridge;
+    E2eBridge bridge;
     ModelerKiller modeler(send(bridge, cup, QByteArray(), 1));
     ASSERT_TRUE(
         sgTestWaitUntil([&] { return !bridge.isActive() && bridge.pendingImports() == 0; }, 10000))
         << log().toStdString();
-    EXPECT_NE(morphOn(cup), nullptr) << log().toStdString();
+    EXPECT_NE(e2eMorphOn(cup), nullptr) << log().toStdString();
     EXPECT_TRUE(sgTestWaitUntil([] { return sgTestLeftovers().isEmpty(); }, 2000))
         << sgTestLeftovers().join(' ').toStdString();
 }

@@ -3,7 +3,7 @@
 // reported and not sent. The modeler is set up through its settings file. A return that the
 // host asks the modeler to release (code 4) comes again instead of being lost.
 
-#include "bridge/sgfacbridge.h"
+#include "tests/e2e/e2etestbridge.h"
 #include "tests/support/sgtestprocess.h"
 #include "tests/support/sgtestscene.h"
 #include "tests/support/sgtestsegment.h"
@@ -32,37 +32,6 @@
 namespace {
 
 constexpr int kSettleMs = 300;
-
-class TestBridge : public SgFacBridge {
-public:
-    using SgFacBridge::closing;
-    using SgFacBridge::executeAction;
-};
-
-// A prop whose OBJ copy is long enough to be written in several chunks: a grid of quads.
-SgNode *makeGridProp(const QString &name, int side) {
-    auto *mesh = new SgPolyMesh;
-    mesh->beginEdit(true);
-    SgVec3 *v = mesh->setVertexArray(side * side);
-    for (int y = 0; y < side; ++y)
-        for (int x = 0; x < side; ++x)
-            v[y * side + x] = SgVec3(float(x), float(y), 0.5f);
-    mesh->activateMaterial(0);
-    for (int y = 0; y + 1 < side; ++y)
-        for (int x = 0; x + 1 < side; ++x) {
-            mesh->startFace();
-            for (int corner :
-                 {y * side + x, y * side + x + 1, (y + 1) * side + x + 1, (y + 1) * side + x})
-                mesh->addFaceEdge(corner);
-            mesh->finishFace();
-        }
-    mesh->finishEdit();
-    auto *object = new SgObject(name);
-    object->addShape(sgTestShape(name, mesh));
-    auto *node = new SgNode(name);
-    node->setObject(object);
-    return node;
-}
 
 QByteArray readAll(const QString &path) {
     QFile file(path);
@@ -124,10 +93,11 @@ protected:
 
 TEST_F(ModelerSaves, EverySaveStyleGivesExactlyOneCompleteReturn) {
     SgScene *scene = sgApp->getScene();
-    scene->addNode(makeGridProp(QStringLiteral("Grid"), 20));
+    // A prop whose OBJ copy is long enough to be written in several chunks.
+    scene->addNode(sgTestNode(QStringLiteral("Grid"), sgTestRowMesh(400)));
     scene->selectNode(scene->findNodeByLabel(QStringLiteral("Grid")));
     SettingsRun run;
-    TestBridge bridge;
+    E2eBridge bridge;
     bridge.executeAction();
     const QString obj = QDir(run.workspace()).filePath(QStringLiteral("Grid.obj"));
     ASSERT_TRUE(sgTestWaitUntil([&] { return QFile::exists(obj); }, 20000))
@@ -217,7 +187,7 @@ TEST_F(ModelerSaves, TheSettingsFileSetsUpALaunchedModelerAndTheEnvironmentOverr
     qputenv("FACETOR_QUIT_WHEN_DONE", "1");
     qputenv("FACETOR_EXPECT", "1");
     {
-        TestBridge bridge;
+        E2eBridge bridge;
         bridge.executeAction();
         EXPECT_TRUE(sgTestWaitUntil(
             [&] { return !bridge.isActive() && bridge.pendingImports() == 0; }, 20000))

@@ -11,7 +11,7 @@
 // (default 250; a soak: SG_USAGE_STEPS=5000).
 
 #include "app/sgappwindow.h"
-#include "bridge/sgfacbridge.h"
+#include "tests/e2e/e2etestbridge.h"
 #include "tests/support/sgtestprocess.h"
 #include "tests/support/sgtestscene.h"
 #include "tests/support/sgtestsegment.h"
@@ -43,13 +43,11 @@
 #include <QTimer>
 
 #include <atomic>
-#include <cerrno>
 #include <chrono>
 #include <csignal>
 #include <cstdio>
 #include <deque>
 #include <functional>
-#include <memory>
 #include <mutex>
 #include <thread>
 #include <utility>
@@ -58,12 +56,6 @@
 #include <gtest/gtest.h>
 
 namespace {
-
-class TestBridge : public SgFacBridge {
-public:
-    using SgFacBridge::closing;
-    using SgFacBridge::executeAction;
-};
 
 constexpr qint64 kBlockLimitMs = 100;
 // Four idle notices (one per 500 ms) fit in the modeler's host time-out, so that a loaded
@@ -155,7 +147,7 @@ public:
         QFile file(logPath());
         return file.open(QIODevice::ReadOnly) ? QString::fromUtf8(file.readAll()) : QString();
     }
-    TestBridge &bridge() { return m_bridge; }
+    E2eBridge &bridge() { return m_bridge; }
     QStringList &faults() { return m_faults; }
 
     // One random step: an action from the table, then a short while of the event loop.
@@ -338,7 +330,7 @@ private:
             return;
         scene->selectNode(scene->getNode(pick(0, scene->getNodeCount())));
         const int lines = int(sgApp->getMessageSink()->logLines().size());
-        TestBridge second;
+        E2eBridge second;
         second.executeAction();
         const QStringList log = sgApp->getMessageSink()->logLines().mid(lines);
         if (second.isActive() || second.modelerProcessId() != 0 ||
@@ -462,7 +454,7 @@ private:
     QTemporaryDir m_dir;
     QRandomGenerator m_random;
     SgAppWindow m_window;
-    TestBridge m_bridge;
+    E2eBridge m_bridge;
     QTimer m_heartbeat;
     QTimer m_answerer;
     QElapsedTimer m_beatClock;
