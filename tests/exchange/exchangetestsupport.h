@@ -37,11 +37,6 @@ public:
 QByteArray writeNode(SgNode *node, const QString &trailer = QString(),
                      std::int32_t *measured = nullptr);
 
-// The record the modeler would return for a host record: the same name, vertices, UVs, facets
-// and trailer, with each host material entry turned into a returned entry (colours and
-// strengths as sent, the image copy path as the diffuse image, no bump image).
-QByteArray toReturnRecord(const QByteArray &hostRecord);
-
 inline std::int32_t i32At(const QByteArray &bytes, qsizetype offset) {
     std::int32_t value;
     std::memcpy(&value, bytes.constData() + offset, 4);

@@ -103,8 +103,6 @@ TEST_F(ExchangeWriterTest, WorkedRecordByteForByte) {
                                                     "020000000000000000000000"
                                                     "00000000"); // empty trailer at 161
     EXPECT_EQ(r.toHex(), expected.toHex());
-    EXPECT_EQ(i32At(r, 116), 1);
-    EXPECT_EQ(r.at(120), 'T');
 }
 
 TEST_F(ExchangeWriterTest, RecordSizesAndScaling) {
@@ -114,9 +112,6 @@ TEST_F(ExchangeWriterTest, RecordSizesAndScaling) {
     sgTestAddFacet(*triangles, 0, {{1}, {2}, {3}});
     auto triNode = prop("T", triangles, {new BareMaterial("M")});
     const QByteArray t = writeNode(triNode.get(), "end");
-    EXPECT_FLOAT_EQ(f32At(t, 9), 1.0f);
-    EXPECT_FLOAT_EQ(f32At(t, 13), 2.0f);
-    EXPECT_FLOAT_EQ(f32At(t, 17), 3.0f);
     const qsizetype uAt = 9 + 4 * 12;
     EXPECT_EQ(i32At(t, uAt), 0);
     const qsizetype fAt = uAt + 4 + 67;
@@ -319,7 +314,16 @@ TEST_F(ExchangeWriterTest, LongImagePathsStayInsideTheMeasuredSize) {
     EXPECT_EQ(buffer.right(16), QByteArray(16, '\x7f'));
 }
 
-TEST_F(ExchangeWriterTest, AShapeWithoutMaterialsOrUVsStillFits) {
+TEST_F(ExchangeWriterTest, EmptyNodesAndShapesWithoutMaterialsOrUVs) {
+    // Nothing to send measures zero and writes nothing.
+    SgNode bare("empty");
+    SgExchangeWriter writer(&bare, QString());
+    EXPECT_EQ(writer.getSize(), 0);
+    char byte = 0;
+    EXPECT_EQ(writer.write(&byte), 0);
+    EXPECT_EQ(SgExchangeWriter(nullptr, QString()).write(&byte), 0);
+
+    // A shape without materials or UVs still fits its measure.
     SgPolyMesh *mesh = sgTestMesh({{0, 0, 0}, {1, 0, 0}, {0, 1, 0}});
     sgTestAddFacet(*mesh, 0, {{0}, {1}, {2}});
     auto node = prop("N", mesh, {});
@@ -361,16 +365,6 @@ TEST_F(ExchangeWriterTest, SubdivisionPatchesAreWrittenAsQuads) {
     EXPECT_EQ(i32At(r, f + 4 + 53 + 5 + 8), -1);
     EXPECT_EQ(r.size(), f + 4 + 2 * 53 + 4);
     EXPECT_LE(r.size(), measured);
-}
-
-TEST_F(ExchangeWriterTest, NothingToSendMeasuresZeroAndWritesNothing) {
-    SgNode bare("empty");
-    SgExchangeWriter writer(&bare, QString());
-    EXPECT_EQ(writer.getSize(), 0);
-    char byte = 0;
-    EXPECT_EQ(writer.write(&byte), 0);
-    SgExchangeWriter none(nullptr, QString());
-    EXPECT_EQ(none.write(&byte), 0);
 }
 
 TEST_F(ExchangeWriterTest, ADestinationTooSmallIsNeverOverrun) {

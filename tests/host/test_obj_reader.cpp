@@ -151,7 +151,7 @@ TEST(HostObjReader, RejectsMalformedInputWithFileAndLine) {
     EXPECT_TRUE(r.getErrorString().startsWith(QStringLiteral("/nonexistent/x.obj:0: ")));
 }
 
-TEST(HostObjReader, ReadsFilesAndOddButValidText) {
+TEST(HostObjReader, ReadsFilesOddButValidTextAndExactNumbers) {
     QTemporaryDir dir;
     // No final newline, tabs, a w component, a forward reference and ignored statements.
     const QString path = sgTestWriteFile(dir.filePath(QStringLiteral("a.obj")),
@@ -168,18 +168,15 @@ TEST(HostObjReader, ReadsFilesAndOddButValidText) {
     // An empty file is an empty mesh.
     EXPECT_TRUE(read(r, ""));
     EXPECT_EQ(r.getMesh()->getVertexCount(), 0);
-}
 
-// Numbers on the reader's fast lines are the floats std::from_chars gives (the fuzzer checks
-// that the fast lines read as the general reader does).
-TEST(HostObjReader, NumbersReadAsFromChars) {
+    // Numbers on the reader's fast lines are the floats std::from_chars gives (the fuzzer checks
+    // that the fast lines read as the general reader does).
     const char *numbers[] = {"0.1",        "-0.0",      "16777217",  "16777219",
                              "0.33333334", "123.45678", "9999999.5", "1.0000001"};
     std::string text;
     for (const char *n : numbers)
         text += std::string("v ") + n + " " + n + " " + n + "\n";
     text += std::string(100, '#') + "\n";
-    SgObjReader r;
     ASSERT_TRUE(read(r, text));
     for (size_t i = 0; i < std::size(numbers); ++i) {
         float expected = 0.0f;

@@ -89,12 +89,6 @@ TEST(HostProperties, ValuesPassThroughControllersAndClampOnReading) {
     channel.removeAllControllers();
     EXPECT_EQ(channel.getLinkProperty(), nullptr);
 
-    SgIntProperty count(QStringLiteral("count"));
-    count.setValue(7);
-    count.setMax(5);
-    count.setIsClamped(true);
-    EXPECT_EQ(count.getIntValue(), 5);
-
     SgEnumProperty e(QStringLiteral("mode"));
     EXPECT_EQ(e.getValue(), -1);
     e.addItem(QStringLiteral("a"));

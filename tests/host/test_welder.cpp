@@ -1,6 +1,5 @@
 #include "sgcore/geometry/sgmodifier.h"
 #include "sgcore/geometry/sgpolymesh.h"
-#include "sgcore/geometry/sgpolyshape.h"
 #include "sgcore/materials/sgmaterial.h"
 #include "sgcore/scene/sgbone.h"
 #include "sgcore/scene/sgfigurewelder.h"
@@ -12,10 +11,6 @@
 #include <memory>
 
 namespace {
-
-const SgPolyMesh *boneMesh(SgBone *bone) {
-    return static_cast<SgPolyShape *>(bone->getObject()->getCurrentShape())->getPolyMesh();
-}
 
 // The group extraction the morph engine applies to a bone: the vertices used by the bone's
 // face group, each once, in ascending order.
@@ -81,7 +76,7 @@ TEST(HostWelder, UnweldingTheUnchangedWeldGivesEveryBoneExactlyItsOwnVertices) {
         ASSERT_TRUE(result);
         EXPECT_TRUE(result->validate(&why)) << why.toStdString();
         for (SgBone *bone : figure->getAllBones()) {
-            const std::vector<SgVec3> own = boneMesh(bone)->vertices();
+            const std::vector<SgVec3> own = sgTestGeometry(bone)->vertices();
             EXPECT_EQ(extract(*result, bone->getName()), own) << bone->getName().toStdString();
         }
     }
@@ -99,7 +94,7 @@ TEST(HostWelder, OnlyVerticesOfDifferentBonesWeld) {
     auto result = unweld(welder, *welder.getGeometry());
     ASSERT_TRUE(result);
     for (SgBone *bone : bones)
-        EXPECT_EQ(extract(*result, bone->getName()), boneMesh(bone)->vertices());
+        EXPECT_EQ(extract(*result, bone->getName()), sgTestGeometry(bone)->vertices());
 }
 
 TEST(HostWelder, MovingOneSeamVertexChangesExactlyThatVertexInEachBoneSharingIt) {
@@ -124,7 +119,7 @@ TEST(HostWelder, MovingOneSeamVertexChangesExactlyThatVertexInEachBoneSharingIt)
     const SgBoneList bones = figure->getAllBones();
     const int changedIndex[3] = {4, 1, -1}; // right column row 1 in bone 0, left in bone 1
     for (int b = 0; b < 3; ++b) {
-        const std::vector<SgVec3> own = boneMesh(bones[b])->vertices();
+        const std::vector<SgVec3> own = sgTestGeometry(bones[b])->vertices();
         const std::vector<SgVec3> got = extract(*result, bones[b]->getName());
         ASSERT_EQ(got.size(), own.size());
         for (size_t i = 0; i < own.size(); ++i) {
@@ -164,7 +159,7 @@ TEST(HostWelder, FlagsSelectBonesSeamsAndMorphedGeometry) {
     EXPECT_EQ(visible.getGeometry()->getVertexCount(), 12);
     auto result = unweld(visible, *visible.getGeometry());
     EXPECT_EQ(result->findFaceGroup(QStringLiteral("bone1")), -1);
-    EXPECT_EQ(extract(*result, QStringLiteral("bone2")), boneMesh(bones[2])->vertices());
+    EXPECT_EQ(extract(*result, QStringLiteral("bone2")), sgTestGeometry(bones[2])->vertices());
     SgFigureWelder all(figure.get(), false, true, true, true);
     EXPECT_EQ(all.getBones().size(), 3);
     bones[1]->setHidden(false);
@@ -174,17 +169,17 @@ TEST(HostWelder, FlagsSelectBonesSeamsAndMorphedGeometry) {
     SgFigureWelder morphed(figure.get(), false, true, true, true);
     EXPECT_EQ(morphed.getGeometry()->getVertex(0), SgVec3(0, 0, 2));
     result = unweld(morphed, *morphed.getGeometry());
-    EXPECT_EQ(extract(*result, QStringLiteral("bone0")), boneMesh(bones[0])->vertices());
+    EXPECT_EQ(extract(*result, QStringLiteral("bone0")), sgTestGeometry(bones[0])->vertices());
     SgFigureWelder bare(figure.get(), false, true, true, false);
     EXPECT_EQ(bare.getGeometry()->getVertex(0), SgVec3(0, 0, 0));
 
     SgVertexMesh *morphOnly = SgFigureWelder::getMorphOnlyGeom(bones[0]);
-    ASSERT_NE(morphOnly, boneMesh(bones[0]));
+    ASSERT_NE(morphOnly, sgTestGeometry(bones[0]));
     EXPECT_EQ(morphOnly->getVertex(0), SgVec3(0, 0, 2));
     EXPECT_EQ(morphOnly->getVertex(1), SgVec3(0, 1, 0));
     EXPECT_EQ(static_cast<SgPolyMesh *>(morphOnly)->getQuadCount(), 2);
     delete morphOnly;
-    EXPECT_EQ(SgFigureWelder::getMorphOnlyGeom(bones[1]), boneMesh(bones[1]));
+    EXPECT_EQ(SgFigureWelder::getMorphOnlyGeom(bones[1]), sgTestGeometry(bones[1]));
 }
 
 TEST(HostWelder, OrderedBonesFollowTheFigureHierarchy) {

@@ -5,9 +5,6 @@
 
 #include <chrono>
 #include <cstdint>
-#include <cstdio>
-#include <cstdlib>
-#include <cstring>
 #include <iostream>
 #include <memory>
 #include <sstream>
@@ -22,10 +19,6 @@ std::unique_ptr<SgSharedMemory> segment;
 // Every wait of the peer is bounded: a lock that nobody releases makes a command answer
 // "failed" within seconds instead of leaving the test waiting for an answer.
 constexpr int kWaitLimitMs = 3000;
-
-std::int64_t elapsedMs(Clock::time_point since) {
-    return std::chrono::duration_cast<std::chrono::milliseconds>(Clock::now() - since).count();
-}
 
 // Adds one to the word at `offset` under the lock; false when the lock was not had.
 bool incrementLocked(SgSharedMemory &memory, int offset) {
@@ -45,7 +38,7 @@ std::string churn(const std::string &anchored, const std::string &loose, int mil
     long failures = 0;
     long cycles = 0;
     const auto start = Clock::now();
-    while (elapsedMs(start) < milliseconds) {
+    while (msSince(start) < milliseconds) {
         {
             SgSharedMemory memory(anchored);
             memory.setWaitLimit(kWaitLimitMs);
@@ -123,38 +116,26 @@ std::string run(const std::string &line) {
         in >> a;
         const auto start = Clock::now();
         const bool locked = memory.tryLock(static_cast<int>(a));
-        return answer(locked, std::to_string(elapsedMs(start)));
+        return answer(locked, std::to_string(msSince(start)));
     }
     if (command == "unlock") {
         memory.unlock();
         return answer(true);
     }
-    if (command == "remove") {
-        in >> a;
-        return answer(memory.remove(static_cast<int>(a)));
-    }
     if (command == "exists")
         return answer(memory.exists());
-    if (command == "attached")
-        return answer(memory.isAttached());
     if (command == "count")
         return answer(true, std::to_string(memory.attachCount()));
     if (command == "size")
         return answer(true, std::to_string(memory.size()));
-    if (command == "write" || command == "read" || command == "increment") {
+    if (command == "write" || command == "read") {
         in >> a >> b;
         if (!memory.data() || a < 0 || a + 4 > memory.size())
             return "0 -1 out of range";
         if (command == "read")
             return answer(true, std::to_string(readWord(memory, static_cast<int>(a))));
-        if (command == "write") {
-            writeWord(memory, static_cast<int>(a), static_cast<std::uint32_t>(b));
-            return answer(true);
-        }
-        long done = 0;
-        for (long i = 0; i < b; ++i)
-            done += incrementLocked(memory, static_cast<int>(a)) ? 1 : 0;
-        return answer(done == b, std::to_string(done));
+        writeWord(memory, static_cast<int>(a), static_cast<std::uint32_t>(b));
+        return answer(true);
     }
     if (command == "destroy") {
         segment.reset();

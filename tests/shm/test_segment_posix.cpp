@@ -42,29 +42,6 @@ std::vector<std::string> objectsOf(const std::string &key) {
 
 } // namespace
 
-TEST(SgSharedMemoryPosix, KilledLockHolderReleasesTheLock) {
-    const std::string key = uniqueKey("killlock");
-    ShmPeerProcess peer;
-    ASSERT_TRUE(peer.ok("open " + key));
-    ASSERT_TRUE(peer.ok("create 16"));
-    ASSERT_TRUE(peer.ok("attach 1"));
-    SgTestSegment memory(key);
-    ASSERT_TRUE(memory.attach(SgSharedMemory::kReadWrite));
-    ASSERT_TRUE(peer.ok("lock"));
-
-    const auto start = Clock::now();
-    EXPECT_FALSE(memory.tryLock(25));
-    EXPECT_LT(msSince(start), 400);
-
-    peer.kill();
-    const auto afterKill = Clock::now();
-    ASSERT_TRUE(memory.lock()) << kSgTestStuckLock;
-    EXPECT_LT(msSince(afterKill), 1000);
-    memory.unlock();
-    EXPECT_TRUE(memory.remove(SgSharedMemory::kRemoveLocked));
-    EXPECT_TRUE(objectsOf(key).empty());
-}
-
 TEST(SgSharedMemoryPosix, KilledHoldersLeaveNothingOnceTheSurvivorRemoves) {
     // A peer killed while attached: the survivor's remove takes every name with it.
     const std::string key = uniqueKey("killattached");

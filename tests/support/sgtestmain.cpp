@@ -149,10 +149,6 @@ QByteArray sgTestReadFile(const QString &path) {
     return file.open(QIODevice::ReadOnly) ? file.readAll() : QByteArray();
 }
 
-void sgTestSetModalTimeout(int milliseconds) {
-    g_modalTimeoutMs = milliseconds;
-}
-
 int main(int argc, char **argv) {
     if (qEnvironmentVariableIsEmpty("QT_QPA_PLATFORM")) {
         qputenv("QT_QPA_PLATFORM", "offscreen");

@@ -15,14 +15,8 @@
 //     (5 s; SG_TEST_MODAL_TIMEOUT_MS overrides) is closed, and the running test fails with its
 //     window title, so a broken test fails instead of hanging.
 //
-// Reading back what the code under test reported:
-//   sgApp->getMessageSink()->logLines()       every SgApp::log line, oldest first
-//   sgApp->getMessageSink()->statusLines()    every SgApp::statusLine text
-//   sgApp->getMessageSink()->currentStatus()  the last status line
-//   sgApp->getMessageSink()->progressRuns()   every progress run (text, total, steps, flags)
-//   sgApp->getMessageSink()->clear()          forget them (for example in a fixture's SetUp)
-// The scene is sgApp->getScene(); tests that fill it should clear it when done
-// (sgApp->getScene()->clear()).
+// What the code under test reported is read back from sgApp->getMessageSink(); tests that fill
+// the scene (sgApp->getScene()) clear it when done.
 
 #include "sgcore/app/sgapp.h"
 #include "sgcore/app/sgmessagesink.h"
@@ -44,9 +38,6 @@ QString sgTestWriteFile(const QString &path, const QByteArray &bytes);
 
 // The whole content of the file `path` (empty when it cannot be read).
 QByteArray sgTestReadFile(const QString &path);
-
-// Changes the fail-safe's time-out for stray modal dialogs and popups (milliseconds).
-void sgTestSetModalTimeout(int milliseconds);
 
 // Changes the watchdog's limit for the running test and those after it (seconds; 0: none).
 void sgTestSetStuckLimit(int seconds);
