@@ -47,10 +47,7 @@ public:
         SgTestModalAnswer answer(answers, 30000);
         E2eBridge bridge;
         bridge.executeAction();
-        const bool done =
-            bridge.isActive() &&
-            sgTestWaitUntil([&] { return !bridge.isActive() && bridge.pendingImports() == 0; },
-                            30000);
+        const bool done = bridge.isActive() && bridge.settles(30000);
         EXPECT_EQ(answer.answered(), answers.size()) << "a window was never opened";
         return done;
     }
@@ -126,31 +123,6 @@ protected:
 };
 
 } // namespace
-
-TEST_F(ImportRoundTrip, EditedFigureGivesOneMorphPerMovedBoneDrivenByItsControl) {
-    SgSkeleton *figure = twoBoneFigure();
-    scene()->addNode(figure);
-    scene()->selectNode(figure);
-    // Vertex 0 of the welded figure is the hip's first vertex; 0.5 modeler units are 5 host units.
-    RoundTrip trip("vertex=0,0,0,0.5");
-    ASSERT_TRUE(trip.run()) << trip.log().toStdString();
-
-    SgNode *hip = scene()->findNodeByLabel(QStringLiteral("hip"));
-    SgNode *thigh = scene()->findNodeByLabel(QStringLiteral("thigh"));
-    SgMorph *morph = e2eMorphOn(hip);
-    ASSERT_NE(morph, nullptr) << sgApp->getMessageSink()->logLines().join('\n').toStdString();
-    EXPECT_EQ(e2eMorphOn(thigh), nullptr);
-    EXPECT_EQ(morph->getDeltas()->getNumEntries(), 1);
-    auto *control =
-        dynamic_cast<SgFloatProperty *>(figure->findProperty(QStringLiteral("MyMorph")));
-    ASSERT_NE(control, nullptr);
-    EXPECT_EQ(scene()->getNodeCount(), 3); // no prop
-
-    // At the control's value 1 the hip shows the edit; at 0 it is the original again.
-    EXPECT_NEAR(hip->getObject()->getCachedGeom()->getVertex(0).z, 8.25f, 1e-4);
-    control->setValue(0.0f);
-    EXPECT_NEAR(hip->getObject()->getCachedGeom()->getVertex(0).z, 3.25f, 1e-4);
-}
 
 TEST_F(ImportRoundTrip, AReturnThatCannotBeAMorphAsksWhetherToMakeAProp) {
     SgSkeleton *figure = twoBoneFigure();
@@ -249,8 +221,6 @@ TEST_F(ImportRoundTrip, TheImportDialogsChooseMaterialsMorphOrProp) {
     // "Create Prop" closes at once and makes a prop.
     ASSERT_TRUE(RoundTrip("move=0,1,0").run({[](QWidget *modal) {
         pickAction(modal, QStringLiteral("Create Prop"));
-        EXPECT_FALSE(
-            modal->findChild<QWidget *>(QStringLiteral("MorphLoaderSourceList"))->isEnabled());
         okButton(modal)->click();
     }}));
     EXPECT_EQ(e2eModifierCount(m_cup), 1);

@@ -11,7 +11,6 @@
 #include "sgcore/app/sgmessagesink.h"
 #include "sgcore/geometry/sgobject.h"
 #include "sgcore/morph/sgmorph.h"
-#include "sgcore/morph/sgmorphdeltas.h"
 #include "sgcore/properties/sgfloatproperty.h"
 #include "sgcore/scene/sgnode.h"
 #include "sgcore/scene/sgscene.h"
@@ -31,41 +30,6 @@ namespace {
 // busy with other tests the wait's end can come a few milliseconds late. A step that waited
 // twice for a lock the modeler holds takes 50 ms.
 constexpr qint64 kStepLimitMs = 40;
-
-// Times every poll step: the bridge's timer drives a timed call of its poll slot instead.
-class TimedPoll {
-public:
-    explicit TimedPoll(SgFacBridge &bridge) : m_bridge(bridge) {
-        QObject::disconnect(bridge.pollTimer(), &QTimer::timeout, &bridge,
-                            &SgFacBridge::checkSharedMap);
-        m_connection = QObject::connect(bridge.pollTimer(), &QTimer::timeout, [this] { step(); });
-    }
-    ~TimedPoll() { QObject::disconnect(m_connection); }
-    qint64 worstNs() const { return m_worstNs; }
-    int steps() const { return m_steps; }
-    // The slow steps of the moment being tested, "moment: n ms" each.
-    QStringList slowSteps() const { return m_slow; }
-    void setMoment(const QString &moment) { m_moment = moment; }
-
-private:
-    void step() {
-        QElapsedTimer clock;
-        clock.start();
-        m_bridge.checkSharedMap();
-        const qint64 ns = clock.nsecsElapsed();
-        ++m_steps;
-        m_worstNs = std::max(m_worstNs, ns);
-        if (ns > kStepLimitMs * 1000000)
-            m_slow << QStringLiteral("%1: %2 ms").arg(m_moment).arg(double(ns) / 1e6);
-    }
-
-    SgFacBridge &m_bridge;
-    QMetaObject::Connection m_connection;
-    QString m_moment;
-    QStringList m_slow;
-    qint64 m_worstNs = 0;
-    int m_steps = 0;
-};
 
 // One moment to kill the modeler at: its checkpoint; whether the host has imported the
 // returned geometry by then (the modeler is killed only once it has); how many nodes a
@@ -126,7 +90,7 @@ class ModelerKill : public ::testing::Test {
 protected:
     void SetUp() override {
         sgApp->getScene()->clear();
-        ASSERT_TRUE(sgTestLeftovers().isEmpty()) << sgTestLeftovers().join(' ').toStdString();
+        ASSERT_TRUE(e2eNothingLeft(0));
     }
     void TearDown() override { sgApp->getScene()->clear(); }
 
@@ -162,13 +126,23 @@ protected:
 TEST_F(ModelerKill, HostStaysResponsiveAndARestartedModelerWorks) {
     SgScene *scene = sgApp->getScene();
     E2eBridge bridge;
-    TimedPoll poll(bridge);
+    // Every poll step is timed; the slow ones are noted with their moment.
+    int steps = 0;
+    qint64 worstNs = 0;
+    QStringList slowSteps;
+    const char *point = "";
+    bridge.timePolls([&](qint64 ns) {
+        ++steps;
+        worstNs = std::max(worstNs, ns);
+        if (ns > kStepLimitMs * 1000000)
+            slowSteps << QStringLiteral("%1: %2 ms").arg(point).arg(double(ns) / 1e6);
+    });
     QElapsedTimer total;
     total.start();
     int round = 0;
     for (const Moment &moment : kMoments) {
         SCOPED_TRACE(moment.point);
-        poll.setMoment(QString::fromLatin1(moment.point));
+        point = moment.point;
         ++round;
         scene->addNode(sgTestProp(QStringLiteral("Cup%1").arg(round), {1, 2, 3}));
         SgNode *cup = scene->getNode(scene->getNodeCount() - 1);
@@ -205,12 +179,10 @@ TEST_F(ModelerKill, HostStaysResponsiveAndARestartedModelerWorks) {
         // A restarted modeler links and completes a round trip of a new node.
         scene->addNode(sgTestProp(QStringLiteral("Mug%1").arg(round), {4, 5, 6}));
         SgNode *mug = scene->getNode(scene->getNodeCount() - 1);
-        const int steps = poll.steps();
+        const int stepsBefore = steps;
         ModelerKiller restarted(send(bridge, mug, QByteArray(), moment.restartReceives));
-        ASSERT_TRUE(sgTestWaitUntil(
-            [&] { return !bridge.isActive() && bridge.pendingImports() == 0; }, 10000))
-            << log().toStdString();
-        EXPECT_GT(poll.steps(), steps);
+        ASSERT_TRUE(bridge.settles(10000)) << log().toStdString();
+        EXPECT_GT(steps, stepsBefore);
         ASSERT_NE(e2eMorphOn(mug), nullptr) << log().toStdString();
         e2eMorphOn(mug)->getValueChannel()->setValue(1.0f);
         EXPECT_NEAR(mug->getObject()->getCachedGeom()->getVertex(0).y, 5.0f + 5.0f, 1e-4);
@@ -219,14 +191,13 @@ TEST_F(ModelerKill, HostStaysResponsiveAndARestartedModelerWorks) {
         EXPECT_EQ(e2eModifierCount(cup), moment.imported || moment.restartReceives == 2 ? 1 : 0);
         EXPECT_EQ(bridge.sendList().count(), 0);
         EXPECT_FALSE(bridge.isExchangeBusy());
-        EXPECT_TRUE(sgTestWaitUntil([] { return sgTestLeftovers().isEmpty(); }, 2000))
-            << sgTestLeftovers().join(' ').toStdString();
+        EXPECT_TRUE(e2eNothingLeft());
         if (HasFailure())
             return; // the first broken moment says it; the rest would each wait out a modeler
     }
-    EXPECT_TRUE(poll.slowSteps().isEmpty()) << poll.slowSteps().join('\n').toStdString();
+    EXPECT_TRUE(slowSteps.isEmpty()) << slowSteps.join('\n').toStdString();
     std::printf("kill test: %d moments, %d poll steps, worst step %.2f ms, %lld ms in all\n", round,
-                poll.steps(), double(poll.worstNs()) / 1e6, total.elapsed());
+                steps, double(worstNs) / 1e6, total.elapsed());
 }
 
 TEST_F(ModelerKill, HostThatQuitsAfterAKilledModelerLeavesNothingBehind) {
@@ -246,15 +217,12 @@ TEST_F(ModelerKill, HostThatQuitsAfterAKilledModelerLeavesNothingBehind) {
         EXPECT_TRUE(bridge.isExchangeBusy());
         ASSERT_FALSE(sgTestLeftovers().isEmpty());
     }
-    EXPECT_TRUE(sgTestLeftovers().isEmpty()) << sgTestLeftovers().join(' ').toStdString();
+    EXPECT_TRUE(e2eNothingLeft(0));
 
     // A host started afresh in the same process links a new modeler and gets its node back.
     E2eBridge bridge;
     ModelerKiller modeler(send(bridge, cup, QByteArray(), 1));
-    ASSERT_TRUE(
-        sgTestWaitUntil([&] { return !bridge.isActive() && bridge.pendingImports() == 0; }, 10000))
-        << log().toStdString();
+    ASSERT_TRUE(bridge.settles(10000)) << log().toStdString();
     EXPECT_NE(e2eMorphOn(cup), nullptr) << log().toStdString();
-    EXPECT_TRUE(sgTestWaitUntil([] { return sgTestLeftovers().isEmpty(); }, 2000))
-        << sgTestLeftovers().join(' ').toStdString();
+    EXPECT_TRUE(e2eNothingLeft());
 }
