@@ -334,13 +334,6 @@ TEST_F(BridgeAction, ThePollCountsIdlePollsAndRetriesBeforeNotices) {
     bridge->checkSharedMap();
     EXPECT_FALSE(bridge->isExchangeBusy());
     EXPECT_FALSE(sgTestSegmentExists(kSgDataSegmentKey));
-
-    // The modeler quits: the poll stops and the link is dropped.
-    peer.post(SgModelerMessage::Quit);
-    bridge->pollTimer()->start();
-    bridge->checkSharedMap();
-    EXPECT_FALSE(bridge->isActive());
-    EXPECT_FALSE(bridge->pollTimer()->isActive());
 }
 
 TEST_F(BridgeAction, AHeldLockCostsOneWaitAndALostRecordEndsTheExchange) {
@@ -387,7 +380,7 @@ TEST_F(BridgeAction, AHeldLockCostsOneWaitAndALostRecordEndsTheExchange) {
     EXPECT_FALSE(bridge->isExchangeBusy());
     EXPECT_FALSE(sgTestSegmentExists(kSgDataSegmentKey));
 
-    // A modeler that quits ends a busy exchange and drops the queued messages.
+    // A modeler that quits ends a busy exchange, drops the queued messages and stops the poll.
     scene()->addNode(sgTestProp(QStringLiteral("Plate")));
     scene()->selectNode(scene()->findNodeByLabel(QStringLiteral("Plate")));
     bridge->executeAction();
@@ -396,8 +389,10 @@ TEST_F(BridgeAction, AHeldLockCostsOneWaitAndALostRecordEndsTheExchange) {
     ASSERT_TRUE(bridge->isExchangeBusy());
     EXPECT_TRUE(sgTestSegmentExists(kSgDataSegmentKey));
     peer.post(SgModelerMessage::Quit);
+    bridge->pollTimer()->start();
     bridge->checkSharedMap();
     EXPECT_FALSE(bridge->isActive());
+    EXPECT_FALSE(bridge->pollTimer()->isActive());
     EXPECT_FALSE(bridge->isExchangeBusy());
     EXPECT_TRUE(bridge->retryQueue().isEmpty());
     EXPECT_FALSE(sgTestSegmentExists(kSgDataSegmentKey));

@@ -53,18 +53,6 @@ public:
     }
 };
 
-// A figure of two bones, hip and then thigh, showing separate triangles.
-SgSkeleton *twoBoneFigure() {
-    auto *figure = new SgSkeleton(QStringLiteral("Body"));
-    auto *hip = sgTestNode<SgBone>(QStringLiteral("hip"),
-                                   sgTestPolygon({{0, 100, 3.25f}, {7, 100, 0}, {0, 112.5f, 0}}));
-    auto *thigh = sgTestNode<SgBone>(
-        QStringLiteral("thigh"), sgTestPolygon({{20, 100, 3.25f}, {27, 100, 0}, {20, 112.5f, 0}}));
-    figure->addBone(hip);
-    figure->addBone(thigh, hip);
-    return figure;
-}
-
 // Answers the "Changed Geometry" question with `button`.
 SgTestHandler changedGeometry(QMessageBox::StandardButton button) {
     return sgTestAs<QMessageBox>([button](QMessageBox *box) {
@@ -112,12 +100,6 @@ protected:
         skin->setDiffuseColor(QColor(10, 20, 30));
         return skin;
     }
-    // The "Target Importer" in its bridge mode takes the returns, in a window.
-    void useTargetImporter() {
-        sgApp->setInterface(&m_window);
-        SgAppSettings().setInt(QStringLiteral("FacetorBridgeTools"), 1);
-    }
-
     QMainWindow m_window;
     SgNode *m_cup = nullptr;
 };
@@ -125,7 +107,7 @@ protected:
 } // namespace
 
 TEST_F(ImportRoundTrip, AReturnThatCannotBeAMorphAsksWhetherToMakeAProp) {
-    SgSkeleton *figure = twoBoneFigure();
+    SgSkeleton *figure = sgTestFigure(QStringLiteral("Body"), 2, 1);
     scene()->addNode(figure);
     scene()->selectNode(figure);
     // Unchanged: no morph; "No" keeps the scene as it was, the control property included.
@@ -143,10 +125,10 @@ TEST_F(ImportRoundTrip, AReturnThatCannotBeAMorphAsksWhetherToMakeAProp) {
     selectedCup();
     ASSERT_TRUE(RoundTrip("extra=0,0,5").run({changedGeometry(QMessageBox::Yes)}));
     EXPECT_EQ(e2eModifierCount(m_cup), 0);
-    EXPECT_EQ(m_cup->getObject()->getCurrentShape()->getGeometry()->getVertexCount(), 3);
+    EXPECT_EQ(sgTestGeometry(m_cup)->getVertexCount(), 3);
     SgNode *prop = scene()->findNodeByLabel(QStringLiteral("Cup (1)"));
     ASSERT_NE(prop, nullptr);
-    const SgVertexMesh *mesh = prop->getObject()->getCurrentShape()->getGeometry();
+    const SgVertexMesh *mesh = sgTestGeometry(prop);
     ASSERT_EQ(mesh->getVertexCount(), 4);
     EXPECT_NEAR(mesh->getVertex(3).z, 50.0f, 1e-4);
     scene()->clear();
@@ -190,9 +172,9 @@ TEST_F(ImportRoundTrip, TheImportDialogsChooseMaterialsMorphOrProp) {
     EXPECT_EQ(scene()->getNodeCount(), 1);
     scene()->clear();
 
-    // The "Target Importer" in bridge mode: one in-memory source, no file buttons; cancelled,
-    // nothing changes.
-    useTargetImporter();
+    // With the application setting the "Target Importer" takes the returns, in bridge mode: one
+    // in-memory source, no file buttons; cancelled, nothing changes.
+    SgAppSettings().setInt(QStringLiteral("FacetorBridgeTools"), 1);
     skin = selectedCup();
     ASSERT_TRUE(RoundTrip("diffuse=0,0,1;move=0,1,0").run({[](QWidget *modal) {
         EXPECT_EQ(modal->windowTitle(), QStringLiteral("Target Importer"));

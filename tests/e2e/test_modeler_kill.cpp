@@ -76,14 +76,10 @@ const Moment kMoments[] = {
 };
 
 // Kills a modeler for good when it goes out of scope, whatever the test asserted before.
-class ModelerKiller {
-public:
-    explicit ModelerKiller(qint64 pid) : m_pid(pid) {}
-    ~ModelerKiller() { kill(); }
-    bool kill() { return sgTestKill(m_pid); }
-
-private:
-    qint64 m_pid;
+struct ModelerKiller {
+    qint64 pid;
+    ~ModelerKiller() { sgTestKill(pid); }
+    bool kill() const { return sgTestKill(pid); }
 };
 
 class ModelerKill : public ::testing::Test {
@@ -149,7 +145,7 @@ TEST_F(ModelerKill, HostStaysResponsiveAndARestartedModelerWorks) {
 
         // The modeler stops at the moment; the host carries on meanwhile.
         {
-            ModelerKiller modeler(send(bridge, cup, moment.point, 1));
+            ModelerKiller modeler{send(bridge, cup, moment.point, 1)};
             ASSERT_TRUE(sgTestWaitUntil(
                 [&] { return log().contains(QStringLiteral("paused %1\n").arg(moment.point)); },
                 5000))
@@ -180,7 +176,7 @@ TEST_F(ModelerKill, HostStaysResponsiveAndARestartedModelerWorks) {
         scene->addNode(sgTestProp(QStringLiteral("Mug%1").arg(round), {4, 5, 6}));
         SgNode *mug = scene->getNode(scene->getNodeCount() - 1);
         const int stepsBefore = steps;
-        ModelerKiller restarted(send(bridge, mug, QByteArray(), moment.restartReceives));
+        ModelerKiller restarted{send(bridge, mug, QByteArray(), moment.restartReceives)};
         ASSERT_TRUE(bridge.settles(10000)) << log().toStdString();
         EXPECT_GT(steps, stepsBefore);
         ASSERT_NE(e2eMorphOn(mug), nullptr) << log().toStdString();
@@ -208,7 +204,7 @@ TEST_F(ModelerKill, HostThatQuitsAfterAKilledModelerLeavesNothingBehind) {
     // the host quits before its poll has noticed.
     {
         E2eBridge bridge;
-        ModelerKiller modeler(send(bridge, cup, "node-locked", 1));
+        ModelerKiller modeler{send(bridge, cup, "node-locked", 1)};
         ASSERT_TRUE(sgTestWaitUntil(
             [&] { return log().contains(QStringLiteral("paused node-locked\n")); }, 5000))
             << log().toStdString();
@@ -221,7 +217,7 @@ TEST_F(ModelerKill, HostThatQuitsAfterAKilledModelerLeavesNothingBehind) {
 
     // A host started afresh in the same process links a new modeler and gets its node back.
     E2eBridge bridge;
-    ModelerKiller modeler(send(bridge, cup, QByteArray(), 1));
+    ModelerKiller modeler{send(bridge, cup, QByteArray(), 1)};
     ASSERT_TRUE(bridge.settles(10000)) << log().toStdString();
     EXPECT_NE(e2eMorphOn(cup), nullptr) << log().toStdString();
     EXPECT_TRUE(e2eNothingLeft());

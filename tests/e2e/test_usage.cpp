@@ -44,6 +44,7 @@
 #include <deque>
 #include <functional>
 #include <mutex>
+#include <random>
 #include <thread>
 #include <utility>
 #include <vector>
@@ -149,19 +150,14 @@ public:
             {"second host", 4, [this] { secondHost(); }},
             {"wait", 12, [this] { sgTestIdle(pick(100, 600)); }},
         };
-        int total = 0;
+        std::vector<int> weights;
         for (const Action &action : actions)
-            total += action.weight;
-        int roll = pick(0, total);
-        for (const Action &action : actions) {
-            if ((roll -= action.weight) >= 0)
-                continue;
-            m_step =
-                QStringLiteral("step %1 (%2)").arg(index).arg(QString::fromLatin1(action.name));
-            ++m_counts[action.name];
-            action.run();
-            break;
-        }
+            weights.push_back(action.weight);
+        const Action &action = actions.at(
+            std::discrete_distribution<size_t>(weights.begin(), weights.end())(m_random));
+        m_step = QStringLiteral("step %1 (%2)").arg(index).arg(QString::fromLatin1(action.name));
+        ++m_counts[action.name];
+        action.run();
         // The driver's own work is not the event loop standing still.
         m_beatClock.restart();
         sgTestIdle(pick(20, 150));
