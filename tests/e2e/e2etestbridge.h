@@ -21,7 +21,6 @@ class E2eBridge : public SgFacBridge {
 public:
     using SgFacBridge::closing;
     using SgFacBridge::executeAction;
-    using SgFacBridge::importReturnedShape;
 
     // Runs the event loop until the link has ended and every return is imported.
     bool settles(int timeoutMs) {

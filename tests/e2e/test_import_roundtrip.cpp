@@ -12,7 +12,6 @@
 #include "sgcore/app/sgmessagesink.h"
 #include "sgcore/geometry/sgobject.h"
 #include "sgcore/geometry/sgpolymesh.h"
-#include "sgcore/geometry/sgpolyshape.h"
 #include "sgcore/materials/sgdefaultmaterial.h"
 #include "sgcore/morph/sgmorph.h"
 #include "sgcore/morph/sgmorphdeltas.h"
@@ -207,17 +206,4 @@ TEST_F(ImportRoundTrip, TheImportDialogsChooseMaterialsMorphOrProp) {
     }}));
     EXPECT_EQ(e2eModifierCount(m_cup), 1);
     EXPECT_NE(scene()->findNodeByLabel(QStringLiteral("Cup (1)")), nullptr);
-    // A shape without geometry opens the dialog in file mode, which deals with it.
-    bool fileMode = false;
-    SgTestModalAnswer answer([&fileMode](QWidget *modal) {
-        fileMode =
-            modal->findChild<QPushButton *>(QStringLiteral("MorphLoaderBrowseBtn")) != nullptr &&
-            modal->findChild<QComboBox *>(QStringLiteral("FcBridgehAction")) == nullptr;
-        okButton(modal)->click(); // runs the empty list
-        okButton(modal)->click();
-    });
-    SgPolyShape shape(QStringLiteral("Cup"));
-    EXPECT_TRUE(E2eBridge().importReturnedShape(&shape, m_cup));
-    EXPECT_TRUE(fileMode);
-    EXPECT_EQ(e2eModifierCount(m_cup), 1);
 }

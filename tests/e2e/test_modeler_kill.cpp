@@ -31,49 +31,18 @@ namespace {
 // twice for a lock the modeler holds takes 50 ms.
 constexpr qint64 kStepLimitMs = 40;
 
-// One moment to kill the modeler at: its checkpoint; whether the host has imported the
-// returned geometry by then (the modeler is killed only once it has); how many nodes a
-// restarted modeler receives (the one sent before the kill, when the dead modeler never
-// acknowledged it, and the new one); whether the modeler's goodbye has reached the host.
-struct Moment {
-    const char *point;
-    bool imported;
-    int restartReceives;
-    bool goodbyeSeen;
-};
-
-// From start-up to goodbye, in the order the modeler passes them. "-locked" moments hold the
-// control segment's lock ("link", "take", "post-") or the data segment's lock ("node-locked",
-// "node-read-locked", "return-locked", "return-half-written").
-const Moment kMoments[] = {
-    {"unlinked", false, 2, false},
-    {"link-locked", false, 2, false},
-    {"linked", false, 2, false},
-    {"post-idle-locked", false, 2, false},
-    {"requested", false, 2, false},
-    {"take-locked", false, 2, false},
-    {"node-attached", false, 2, false},
-    {"node-locked", false, 2, false},
-    {"node-read-locked", false, 2, false},
-    {"node-read", false, 2, false},
-    {"node-detached", false, 2, false},
-    {"node-released", false, 2, false},
-    {"node-received", false, 2, false},
-    {"post-ack-locked", false, 2, false},
-    {"node-acknowledged", false, 1, false},
-    {"return-created", false, 1, false},
-    {"return-attached", false, 1, false},
-    {"return-locked", false, 1, false},
-    {"return-half-written", false, 1, false},
-    {"return-written", false, 1, false},
-    {"post-data-locked", false, 1, false},
-    {"return-announced", true, 1, false},
-    {"return-acknowledged", true, 1, false},
-    {"return-released", true, 1, false},
-    {"goodbye", true, 1, false},
-    {"post-quit-locked", true, 1, false},
-    {"goodbye-posted", true, 1, true},
-};
+// The moments to kill the modeler at, its checkpoints from start-up to goodbye in the order it
+// passes them. "-locked" moments hold the control segment's lock ("link", "take", "post-") or
+// the data segment's lock ("node-locked", "node-read-locked", "return-locked",
+// "return-half-written").
+const QStringList kMoments =
+    QStringLiteral("unlinked link-locked linked post-idle-locked requested take-locked "
+                   "node-attached node-locked node-read-locked node-read node-detached "
+                   "node-released node-received post-ack-locked node-acknowledged return-created "
+                   "return-attached return-locked return-half-written return-written "
+                   "post-data-locked return-announced return-acknowledged return-released goodbye "
+                   "post-quit-locked goodbye-posted")
+        .split(QLatin1Char(' '));
 
 // Kills a modeler for good when it goes out of scope, whatever the test asserted before.
 struct ModelerKiller {
@@ -126,7 +95,7 @@ TEST_F(ModelerKill, HostStaysResponsiveAndARestartedModelerWorks) {
     int steps = 0;
     qint64 worstNs = 0;
     QStringList slowSteps;
-    const char *point = "";
+    QString point;
     bridge.timePolls([&](qint64 ns) {
         ++steps;
         worstNs = std::max(worstNs, ns);
@@ -136,26 +105,31 @@ TEST_F(ModelerKill, HostStaysResponsiveAndARestartedModelerWorks) {
     QElapsedTimer total;
     total.start();
     int round = 0;
-    for (const Moment &moment : kMoments) {
-        SCOPED_TRACE(moment.point);
-        point = moment.point;
+    for (const QString &moment : kMoments) {
+        SCOPED_TRACE(moment.toStdString());
+        point = moment;
         ++round;
+        // Once the return is announced the host imports it (the modeler is killed only once it
+        // has); until the node is acknowledged a restarted modeler receives it again besides the
+        // new one; only the last moment's goodbye reaches the host.
+        const bool imported = round > kMoments.indexOf("return-announced");
+        const int restartReceives = round <= kMoments.indexOf("node-acknowledged") ? 2 : 1;
+        const bool goodbyeSeen = moment == kMoments.last();
         scene->addNode(sgTestProp(QStringLiteral("Cup%1").arg(round), {1, 2, 3}));
         SgNode *cup = scene->getNode(scene->getNodeCount() - 1);
 
         // The modeler stops at the moment; the host carries on meanwhile.
         {
-            ModelerKiller modeler{send(bridge, cup, moment.point, 1)};
+            ModelerKiller modeler{send(bridge, cup, moment.toLatin1(), 1)};
             ASSERT_TRUE(sgTestWaitUntil(
-                [&] { return log().contains(QStringLiteral("paused %1\n").arg(moment.point)); },
-                5000))
+                [&] { return log().contains(QStringLiteral("paused %1\n").arg(moment)); }, 5000))
                 << log().toStdString();
-            if (moment.imported) {
+            if (imported) {
                 ASSERT_TRUE(sgTestWaitUntil([&] { return e2eMorphOn(cup) != nullptr; }, 3000))
                     << log().toStdString();
             }
             // A lock the modeler holds is held across a few poll steps before it dies.
-            if (QByteArray(moment.point).contains("locked"))
+            if (moment.contains(QLatin1String("locked")))
                 sgTestIdle(120);
             const int nodes = scene->getNodeCount();
             ASSERT_TRUE(modeler.kill());
@@ -166,17 +140,17 @@ TEST_F(ModelerKill, HostStaysResponsiveAndARestartedModelerWorks) {
             EXPECT_FALSE(bridge.isActive());
             EXPECT_FALSE(bridge.pollTimer()->isActive());
             EXPECT_EQ(sgApp->getMessageSink()->logLines().last(),
-                      moment.goodbyeSeen ? QStringLiteral("Facetor has quit.")
-                                         : QStringLiteral("Facetor has quit unexpectedly."));
+                      goodbyeSeen ? QStringLiteral("Facetor has quit.")
+                                  : QStringLiteral("Facetor has quit unexpectedly."));
             EXPECT_EQ(scene->getNodeCount(), nodes);
-            EXPECT_EQ(e2eModifierCount(cup), moment.imported ? 1 : 0);
+            EXPECT_EQ(e2eModifierCount(cup), imported ? 1 : 0);
         }
 
         // A restarted modeler links and completes a round trip of a new node.
         scene->addNode(sgTestProp(QStringLiteral("Mug%1").arg(round), {4, 5, 6}));
         SgNode *mug = scene->getNode(scene->getNodeCount() - 1);
         const int stepsBefore = steps;
-        ModelerKiller restarted{send(bridge, mug, QByteArray(), moment.restartReceives)};
+        ModelerKiller restarted{send(bridge, mug, QByteArray(), restartReceives)};
         ASSERT_TRUE(bridge.settles(10000)) << log().toStdString();
         EXPECT_GT(steps, stepsBefore);
         ASSERT_NE(e2eMorphOn(mug), nullptr) << log().toStdString();
@@ -184,7 +158,7 @@ TEST_F(ModelerKill, HostStaysResponsiveAndARestartedModelerWorks) {
         EXPECT_NEAR(mug->getObject()->getCachedGeom()->getVertex(0).y, 5.0f + 5.0f, 1e-4);
         // The node of the broken exchange went to the restarted modeler when the dead one
         // never acknowledged it, and came back once at most.
-        EXPECT_EQ(e2eModifierCount(cup), moment.imported || moment.restartReceives == 2 ? 1 : 0);
+        EXPECT_EQ(e2eModifierCount(cup), imported || restartReceives == 2 ? 1 : 0);
         EXPECT_EQ(bridge.sendList().count(), 0);
         EXPECT_FALSE(bridge.isExchangeBusy());
         EXPECT_TRUE(e2eNothingLeft());
