@@ -1,6 +1,7 @@
 // The application window with the real plug-in: it opens offscreen, the plug-in's action sits
 // in its category's menu and tool bar and its class reaches script engines, the tree drives the
-// scene's selection, the property panel sets values, and a screenshot is kept as a test artefact.
+// scene's selection, the property panel sets values, the preferences are kept, and a screenshot
+// is kept as a test artefact.
 
 #include "app/sgappwindow.h"
 #include "app/sglogpane.h"
@@ -85,7 +86,7 @@ SgFloatProperty *addMorph(SgSkeleton *figure) {
 
 } // namespace
 
-TEST(AppWindow, ShowsThePluginActionTheSceneAndItsProperties) {
+TEST(AppWindow, ShowsThePluginActionTheSceneItsPropertiesAndThePreferences) {
     SgPluginHost plugins;
     ASSERT_EQ(plugins.loadFolder(QStringLiteral(FACBRIDGE_PLUGIN_DIR)), 1)
         << sgApp->getMessageSink()->logLines().join('\n').toStdString();
@@ -182,6 +183,28 @@ TEST(AppWindow, ShowsThePluginActionTheSceneAndItsProperties) {
     EXPECT_TRUE(window.grab().save(shot)) << shot.toStdString();
     EXPECT_EQ(sgCutTexts(&window), QStringList());
     scene->clear();
+
+    // The preferences hold the modeler's path and the road returns take.
+    SgTestModalAnswer answer(sgTestAs<SgPreferencesDlg>([](SgPreferencesDlg *dialog) {
+        EXPECT_EQ(sgCutTexts(dialog), QStringList());
+        dialog->installPathEdit()->setText(QStringLiteral("/opt/facetor"));
+        dialog->bridgeToolsBox()->setChecked(true);
+        dialog->accept();
+    }));
+    actionNamed(window, "SgPreferencesAction")->trigger();
+    SgAppSettings settings;
+    EXPECT_EQ(settings.getString(QStringLiteral("FacetorInstallPath")),
+              QStringLiteral("/opt/facetor"));
+    EXPECT_EQ(settings.getInt(QStringLiteral("FacetorBridgeTools")), 1);
+    // Shown again as stored; "Cancel" keeps them.
+    SgPreferencesDlg again(&window);
+    EXPECT_EQ(again.installPathEdit()->text(), QStringLiteral("/opt/facetor"));
+    EXPECT_TRUE(again.bridgeToolsBox()->isChecked());
+    again.bridgeToolsBox()->setChecked(false);
+    again.reject();
+    EXPECT_EQ(settings.getInt(QStringLiteral("FacetorBridgeTools")), 1);
+    settings.remove(QStringLiteral("FacetorBridgeTools"));
+    settings.remove(QStringLiteral("FacetorInstallPath"));
 }
 
 TEST(AppWindow, SavesReopensAndNeverLosesChangesSilently) {
@@ -269,30 +292,6 @@ TEST(AppWindow, SavesReopensAndNeverLosesChangesSilently) {
             ->getValue(),
         -0.5f);
     scene->clear();
-}
-
-TEST(AppWindow, PreferencesHoldTheModelerPathAndTheImportRoad) {
-    SgAppWindow window;
-    SgTestModalAnswer answer(sgTestAs<SgPreferencesDlg>([](SgPreferencesDlg *dialog) {
-        EXPECT_EQ(sgCutTexts(dialog), QStringList());
-        dialog->installPathEdit()->setText(QStringLiteral("/opt/facetor"));
-        dialog->bridgeToolsBox()->setChecked(true);
-        dialog->accept();
-    }));
-    actionNamed(window, "SgPreferencesAction")->trigger();
-    SgAppSettings settings;
-    EXPECT_EQ(settings.getString(QStringLiteral("FacetorInstallPath")),
-              QStringLiteral("/opt/facetor"));
-    EXPECT_EQ(settings.getInt(QStringLiteral("FacetorBridgeTools")), 1);
-    // Shown again as stored; "Cancel" keeps them.
-    SgPreferencesDlg again(&window);
-    EXPECT_EQ(again.installPathEdit()->text(), QStringLiteral("/opt/facetor"));
-    EXPECT_TRUE(again.bridgeToolsBox()->isChecked());
-    again.bridgeToolsBox()->setChecked(false);
-    again.reject();
-    EXPECT_EQ(settings.getInt(QStringLiteral("FacetorBridgeTools")), 1);
-    settings.remove(QStringLiteral("FacetorBridgeTools"));
-    settings.remove(QStringLiteral("FacetorInstallPath"));
 }
 
 TEST(AppWindow, DeleteRemovesSelectedPropsAndFiguresButNoLoneBone) {

@@ -3,6 +3,7 @@
 // through a second view of the control segment, or by a stand-in program that only sleeps.
 
 #include "bridge/sgfacbridge.h"
+#include "tests/support/sgtestmain.h"
 #include "tests/support/sgtestmodal.h"
 #include "tests/support/sgtestprocess.h"
 #include "tests/support/sgtestscene.h"
@@ -82,12 +83,10 @@ class StandInModeler {
 public:
     StandInModeler() {
         static const QTemporaryDir folder;
-        QFile program(folder.filePath(QStringLiteral("Facetor")));
-        if (!program.exists()) {
-            program.open(QIODevice::WriteOnly);
-            program.write("#!/bin/sh\nexec sleep 10 </dev/null >/dev/null 2>&1\n");
-            program.close();
-            program.setPermissions(QFile::ReadOwner | QFile::WriteOwner | QFile::ExeOwner);
+        const QString program = folder.filePath(QStringLiteral("Facetor"));
+        if (!QFile::exists(program)) {
+            sgTestWriteFile(program, "#!/bin/sh\nexec sleep 10 </dev/null >/dev/null 2>&1\n");
+            QFile::setPermissions(program, QFile::ReadOwner | QFile::WriteOwner | QFile::ExeOwner);
         }
         qputenv("FACETOR_INSTALL_PATH", folder.path().toUtf8());
     }
@@ -454,9 +453,8 @@ TEST_F(BridgeAction, ReturnsAreAcknowledgedFirstThenImportedOrRefused) {
     SgNode *prop = scene()->findNodeByLabel(QStringLiteral("Gizmo"));
     ASSERT_NE(prop, nullptr);
     // Host units are ten times the modeler's; the origin is the centre of the bounding box.
-    EXPECT_FLOAT_EQ(prop->getOrigin().x, 10.0f);
-    EXPECT_FLOAT_EQ(prop->getOrigin().y, 20.0f);
-    EXPECT_EQ(prop->getObject()->getCurrentShape()->getGeometry()->getVertexCount(), 3);
+    EXPECT_EQ(prop->getOrigin(), SgVec3(10, 20, 0));
+    EXPECT_EQ(sgTestGeometry(prop)->getVertexCount(), 3);
 
     // A label outside 8 bits travels as "Kiste?A" and comes back to its node as a morph.
     returnShape("Kiste?A", {0, 0, 0, 1, 0.5f, 0, 0, 1, 0});

@@ -202,11 +202,10 @@ TEST(ModelerRelease, AReturnReleasedInFlightComesAgain) {
     };
 
     QProcess modeler;
-    modeler.setProgram(QStringLiteral(FACETOR_BIN_DIR "/Facetor"));
-    modeler.setArguments({QStringLiteral("-sgl"), QStringLiteral("--return"), returned,
-                          QStringLiteral("--workspace"), dir.filePath(QStringLiteral("ws")),
-                          QStringLiteral("--log"), dir.filePath(QStringLiteral("log"))});
-    modeler.start();
+    modeler.start(QStringLiteral(FACETOR_BIN_DIR "/Facetor"),
+                  {QStringLiteral("-sgl"), QStringLiteral("--return"), returned,
+                   QStringLiteral("--workspace"), dir.filePath(QStringLiteral("ws")),
+                   QStringLiteral("--log"), dir.filePath(QStringLiteral("log"))});
     ASSERT_TRUE(modeler.waitForStarted());
 
     // Idle notices until the return is announced (the selection is empty).
