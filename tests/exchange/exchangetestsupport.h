@@ -8,7 +8,6 @@
 #include <QStringList>
 
 #include <cstdint>
-#include <cstring>
 #include <vector>
 
 class SgNode;
@@ -36,16 +35,5 @@ public:
 // Measures and writes the record of `node`; `measured` receives the measured size.
 QByteArray writeNode(SgNode *node, const QString &trailer = QString(),
                      std::int32_t *measured = nullptr);
-
-inline std::int32_t i32At(const QByteArray &bytes, qsizetype offset) {
-    std::int32_t value;
-    std::memcpy(&value, bytes.constData() + offset, 4);
-    return value;
-}
-inline float f32At(const QByteArray &bytes, qsizetype offset) {
-    float value;
-    std::memcpy(&value, bytes.constData() + offset, 4);
-    return value;
-}
 
 } // namespace exchangetest

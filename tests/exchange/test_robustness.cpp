@@ -54,25 +54,6 @@ std::unique_ptr<SgPolyShape> readExact(const QByteArray &bytes) {
     return std::unique_ptr<SgPolyShape>(reader.readShape(trailer));
 }
 
-// Whatever was read stays within itself: indices in range, materials for every facet.
-void expectSound(const SgPolyShape &shape) {
-    const SgPolyMesh *mesh = shape.getPolyMesh();
-    ASSERT_TRUE(mesh);
-    QString why;
-    EXPECT_TRUE(mesh->validate(&why)) << why.toStdString();
-    const int materials = shape.getMaterialCount();
-    ASSERT_GE(materials, 1);
-    for (const auto *kind :
-         {&mesh->triangleMaterials(), &mesh->quadMaterials(), &mesh->polygonMaterials()})
-        for (const std::uint8_t m : *kind)
-            EXPECT_LT(m, materials);
-    const int uvs = mesh->getUVCount();
-    for (const auto *kind :
-         {&mesh->triangleCorners(), &mesh->quadCorners(), &mesh->polygonCorners()})
-        for (const SgFaceCorner &c : *kind)
-            EXPECT_TRUE(c.uv == -1 || (c.uv >= 0 && c.uv < uvs));
-}
-
 void putInt(QByteArray &bytes, qsizetype at, std::int32_t value) {
     std::memcpy(bytes.data() + at, &value, 4);
 }
@@ -82,9 +63,7 @@ void putInt(QByteArray &bytes, qsizetype at, std::int32_t value) {
 TEST_F(ExchangeRobustnessTest, EveryPrefixIsRejectedCleanly) {
     const QByteArray record = validRecord();
     ASSERT_GT(record.size(), 100);
-    auto whole = readExact(record);
-    ASSERT_TRUE(whole);
-    expectSound(*whole);
+    ASSERT_TRUE(readExact(record));
     for (qsizetype n = 0; n < record.size(); ++n) {
         clearLog();
         EXPECT_FALSE(readExact(record.left(n))) << "prefix of " << n << " bytes";
@@ -167,7 +146,6 @@ TEST_F(ExchangeRobustnessTest, IndicesOutsideTheReturnedListsAndNonFiniteStrengt
         putInt(record, at, value);
     auto shape = readExact(record);
     ASSERT_TRUE(shape) << logLines().join('\n').toStdString();
-    expectSound(*shape);
     const SgPolyMesh *back = shape->getPolyMesh();
     ASSERT_EQ(back->getTriangleCount(), 1);
     EXPECT_EQ(back->getTriangleMaterial(0), 0);

@@ -8,6 +8,7 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <memory>
 
 namespace {
@@ -17,12 +18,9 @@ namespace {
 std::vector<SgVec3> extract(const SgPolyMesh &mesh, const QString &group) {
     std::vector<SgVec3> out;
     const int g = mesh.findFaceGroup(group);
-    if (g < 0) {
-        return out;
-    }
-    for (int32_t v : mesh.getFaceGroupVertices(g)) {
-        out.push_back(mesh.getVertex(v));
-    }
+    if (g >= 0)
+        for (int32_t v : mesh.getFaceGroupVertices(g))
+            out.push_back(mesh.getVertex(v));
     return out;
 }
 
@@ -102,14 +100,9 @@ TEST(HostWelder, MovingOneSeamVertexChangesExactlyThatVertexInEachBoneSharingIt)
     SgFigureWelder welder(figure.get(), false, true, true, true);
     const SgPolyMesh *welded = welder.getGeometry();
     // The seam between bone 0 and bone 1 at (1, 1, 0).
-    int seam = -1;
-    for (int i = 0; i < welded->getVertexCount(); ++i) {
-        if (welded->getVertex(i) == SgVec3(1, 1, 0)) {
-            EXPECT_EQ(seam, -1) << "seam vertices are welded into one";
-            seam = i;
-        }
-    }
-    ASSERT_GE(seam, 0);
+    const std::vector<SgVec3> &all = welded->vertices();
+    ASSERT_EQ(std::count(all.begin(), all.end(), SgVec3(1, 1, 0)), 1) << "welded into one";
+    const int seam = int(std::find(all.begin(), all.end(), SgVec3(1, 1, 0)) - all.begin());
     EXPECT_EQ(welder.getWeldCounts()[size_t(seam)], 2);
 
     std::unique_ptr<SgVertexMesh> edited(welded->clone());
@@ -123,11 +116,8 @@ TEST(HostWelder, MovingOneSeamVertexChangesExactlyThatVertexInEachBoneSharingIt)
         const std::vector<SgVec3> got = extract(*result, bones[b]->getName());
         ASSERT_EQ(got.size(), own.size());
         for (size_t i = 0; i < own.size(); ++i) {
-            if (int(i) == changedIndex[b]) {
-                EXPECT_EQ(got[i], SgVec3(1, 1, 0.5f));
-            } else {
-                EXPECT_EQ(got[i], own[i]) << "bone " << b << " vertex " << i;
-            }
+            EXPECT_EQ(got[i], int(i) == changedIndex[b] ? SgVec3(1, 1, 0.5f) : own[i])
+                << "bone " << b << " vertex " << i;
         }
     }
 
@@ -197,40 +187,4 @@ TEST(HostWelder, OrderedBonesFollowTheFigureHierarchy) {
     EXPECT_EQ(w.getBones(), (SgBoneList{ab[1], ab[0]}));
     EXPECT_EQ(w.getGeometry()->getFaceGroupName(0), QStringLiteral("bone1"));
     EXPECT_EQ(w.getGeometry()->getVertexCount(), 4 + 4 - 2);
-}
-
-// The face-group vertex lists that un-welding relies on: all groups at once (marked over each
-// group's span, or sorted when the group is sparse) give what each group gives alone.
-TEST(HostWelder, AllFaceGroupVerticesMatchEachGroupAlone) {
-    SgPolyMesh mesh;
-    mesh.beginEdit(true);
-    mesh.setVertexArray(2000);
-    const int dense = mesh.addFaceGroup(QStringLiteral("dense"));
-    const int sparse = mesh.addFaceGroup(QStringLiteral("sparse"));
-    const int shared = mesh.addFaceGroup(QStringLiteral("shared"));
-    mesh.addFaceGroup(QStringLiteral("empty"));
-    auto face = [&](int group, std::initializer_list<int> corners) {
-        mesh.setActiveFaceGroup(group);
-        mesh.startFace();
-        for (const int v : corners)
-            mesh.addFaceEdge(v);
-        mesh.finishFace();
-    };
-    for (int v = 10; v + 3 < 60; v += 2)
-        face(dense, {v + 3, v, v + 1, v + 2});
-    face(sparse, {1999, 0, 1000});
-    face(sparse, {5, 1999, 7, 1500, 3});
-    face(shared, {12, 11, 10});
-    face(-1, {100, 101, 102});
-    face(shared, {13, 1998, 12, 14});
-    mesh.finishEdit();
-
-    const std::vector<std::vector<int32_t>> all = mesh.getAllFaceGroupVertices();
-    ASSERT_EQ(all.size(), 4u);
-    for (int g = 0; g < 4; ++g)
-        EXPECT_EQ(all[size_t(g)], mesh.getFaceGroupVertices(g)) << g;
-    EXPECT_EQ(all[size_t(sparse)], (std::vector<int32_t>{0, 3, 5, 7, 1000, 1500, 1999}));
-    EXPECT_EQ(all[size_t(shared)], (std::vector<int32_t>{10, 11, 12, 13, 14, 1998}));
-    EXPECT_EQ(all[size_t(dense)].size(), 50u);
-    EXPECT_TRUE(all[3].empty());
 }

@@ -122,12 +122,8 @@ std::string run(const std::string &line) {
         memory.unlock();
         return answer(true);
     }
-    if (command == "exists")
-        return answer(memory.exists());
     if (command == "count")
         return answer(true, std::to_string(memory.attachCount()));
-    if (command == "size")
-        return answer(true, std::to_string(memory.size()));
     if (command == "write" || command == "read") {
         in >> a >> b;
         if (!memory.data() || a < 0 || a + 4 > memory.size())

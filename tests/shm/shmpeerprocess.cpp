@@ -82,20 +82,9 @@ bool ShmPeerProcess::writeLine(const std::string &line) {
            written == text.size();
 }
 
-bool ShmPeerProcess::readLine(std::string *line, int) {
-    for (;;) {
-        const auto end = m_buffer.find('\n');
-        if (end != std::string::npos) {
-            *line = m_buffer.substr(0, end);
-            m_buffer.erase(0, end + 1);
-            return true;
-        }
-        char chunk[256];
-        DWORD got = 0;
-        if (!ReadFile(m_fromPeer, chunk, sizeof chunk, &got, nullptr) || got == 0)
-            return false;
-        m_buffer.append(chunk, got);
-    }
+long ShmPeerProcess::readChunk(char *chunk, int size, int) {
+    DWORD got = 0;
+    return ReadFile(m_fromPeer, chunk, static_cast<DWORD>(size), &got, nullptr) ? long(got) : -1;
 }
 
 void ShmPeerProcess::kill() {
@@ -152,39 +141,17 @@ ShmPeerProcess::ShmPeerProcess() {
 }
 
 bool ShmPeerProcess::writeLine(const std::string &line) {
-    const std::string text = line + "\n";
-    size_t done = 0;
-    while (done < text.size()) {
-        const ssize_t n = write(m_toPeer, text.data() + done, text.size() - done);
-        if (n < 0 && errno == EINTR)
-            continue;
-        if (n <= 0)
-            return false;
-        done += static_cast<size_t>(n);
-    }
-    return true;
+    const std::string text = line + "\n"; // shorter than a pipe's atomic write: whole or not at all
+    return write(m_toPeer, text.data(), text.size()) == static_cast<ssize_t>(text.size());
 }
 
-bool ShmPeerProcess::readLine(std::string *line, int timeoutMs) {
-    for (;;) {
-        const auto end = m_buffer.find('\n');
-        if (end != std::string::npos) {
-            *line = m_buffer.substr(0, end);
-            m_buffer.erase(0, end + 1);
-            return true;
-        }
-        pollfd ready = {m_fromPeer, POLLIN, 0};
-        const int polled = poll(&ready, 1, timeoutMs);
-        if (polled < 0 && errno == EINTR)
-            continue;
-        if (polled <= 0)
-            return false;
-        char chunk[256];
-        const ssize_t got = read(m_fromPeer, chunk, sizeof chunk);
-        if (got <= 0)
-            return false;
-        m_buffer.append(chunk, static_cast<size_t>(got));
-    }
+long ShmPeerProcess::readChunk(char *chunk, int size, int timeoutMs) {
+    pollfd ready = {m_fromPeer, POLLIN, 0};
+    int polled = 0;
+    do
+        polled = poll(&ready, 1, timeoutMs);
+    while (polled < 0 && errno == EINTR);
+    return polled > 0 ? long(read(m_fromPeer, chunk, static_cast<size_t>(size))) : -1;
 }
 
 void ShmPeerProcess::kill() {
@@ -211,6 +178,22 @@ void ShmPeerProcess::quit() {
 
 ShmPeerProcess::~ShmPeerProcess() {
     kill();
+}
+
+bool ShmPeerProcess::readLine(std::string *line, int timeoutMs) {
+    for (;;) {
+        const auto end = m_buffer.find('\n');
+        if (end != std::string::npos) {
+            *line = m_buffer.substr(0, end);
+            m_buffer.erase(0, end + 1);
+            return true;
+        }
+        char chunk[256];
+        const long got = readChunk(chunk, sizeof chunk, timeoutMs);
+        if (got <= 0)
+            return false;
+        m_buffer.append(chunk, static_cast<size_t>(got));
+    }
 }
 
 std::vector<long long> ShmPeerProcess::call(const std::string &command, int timeoutMs) {

@@ -35,6 +35,8 @@ public:
 private:
     bool writeLine(const std::string &line);
     bool readLine(std::string *line, int timeoutMs);
+    // Reads what the peer has sent, waiting up to `timeoutMs` (POSIX); -1 or 0 when nothing came.
+    long readChunk(char *chunk, int size, int timeoutMs);
 
     bool m_running = false;
     std::string m_buffer;

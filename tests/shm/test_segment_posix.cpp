@@ -4,13 +4,12 @@
 #include "exchange/shm/sgshmplatform.h"
 #include "shmpeerprocess.h"
 #include "shmtestsupport.h"
+#include "tests/support/sgtestprocess.h"
 
 #include <gtest/gtest.h>
 
 #include <chrono>
-#include <cstdio>
 #include <cstring>
-#include <dirent.h>
 #include <fcntl.h>
 #include <memory>
 #include <sched.h>
@@ -27,17 +26,8 @@ using Clock = std::chrono::steady_clock;
 namespace {
 
 // The entries of /dev/shm that belong to the segment of `key` (data, "-ref" and "-lock").
-std::vector<std::string> objectsOf(const std::string &key) {
-    const std::string prefix = SgSharedMemory(key).dataName() + "-";
-    std::vector<std::string> found;
-    if (DIR *dir = opendir("/dev/shm")) {
-        while (const dirent *entry = readdir(dir)) {
-            if (std::strncmp(entry->d_name, prefix.c_str(), prefix.size()) == 0)
-                found.emplace_back(entry->d_name);
-        }
-        closedir(dir);
-    }
-    return found;
+QStringList objectsOf(const std::string &key) {
+    return sgTestSegmentFiles(key.c_str());
 }
 
 } // namespace
@@ -57,7 +47,7 @@ TEST(SgSharedMemoryPosix, KilledHoldersLeaveNothingOnceTheSurvivorRemoves) {
         EXPECT_TRUE(memory.exists());
         EXPECT_TRUE(memory.detach());
         EXPECT_TRUE(memory.remove(SgSharedMemory::kRemoveLocked));
-        EXPECT_TRUE(objectsOf(key).empty());
+        EXPECT_TRUE(objectsOf(key).isEmpty());
         EXPECT_FALSE(memory.exists());
     }
 
@@ -70,7 +60,7 @@ TEST(SgSharedMemoryPosix, KilledHoldersLeaveNothingOnceTheSurvivorRemoves) {
     ASSERT_TRUE(peer.ok("attach 1"));
     ASSERT_TRUE(peer.ok("lock"));
     peer.kill();
-    EXPECT_FALSE(objectsOf(lone).empty());
+    EXPECT_FALSE(objectsOf(lone).isEmpty());
     SgTestSegment memory(lone);
     EXPECT_FALSE(memory.exists());
     ASSERT_TRUE(memory.create(16));
@@ -79,24 +69,24 @@ TEST(SgSharedMemoryPosix, KilledHoldersLeaveNothingOnceTheSurvivorRemoves) {
     EXPECT_TRUE(memory.tryLock(0));
     memory.unlock();
     EXPECT_TRUE(memory.remove(SgSharedMemory::kRemoveLocked));
-    EXPECT_TRUE(objectsOf(lone).empty());
+    EXPECT_TRUE(objectsOf(lone).isEmpty());
 }
 
 TEST(SgSharedMemoryPosix, ObjectsArePrivateAndForeignOnesAreNotTrusted) {
     const std::string key = uniqueKey("mode");
     SgTestSegment memory(key);
     EXPECT_FALSE(memory.lock()); // a lock on a missing segment creates nothing
-    EXPECT_TRUE(objectsOf(key).empty());
+    EXPECT_TRUE(objectsOf(key).isEmpty());
     ASSERT_TRUE(memory.create(16));
     ASSERT_TRUE(memory.lock()) << kSgTestStuckLock;
-    const std::vector<std::string> objects = objectsOf(key);
-    EXPECT_EQ(objects.size(), 3u);
-    for (const std::string &name : objects) {
+    const QStringList objects = objectsOf(key);
+    EXPECT_EQ(objects.size(), 3);
+    for (const QString &name : objects) {
+        const std::string path = "/dev/shm/" + name.toStdString();
         struct stat info = {};
-        ASSERT_EQ(stat(("/dev/shm/" + name).c_str(), &info), 0) << name;
-        EXPECT_EQ(info.st_mode & 0777, 0600u) << name;
-        EXPECT_EQ(info.st_uid, geteuid()) << name;
-        EXPECT_NE(name.find("-u" + std::to_string(geteuid())), std::string::npos) << name;
+        ASSERT_EQ(stat(path.c_str(), &info), 0) << path;
+        EXPECT_EQ(info.st_mode & 0777, 0600u) << path;
+        EXPECT_EQ(info.st_uid, geteuid()) << path;
     }
     memory.unlock();
     EXPECT_TRUE(memory.remove(SgSharedMemory::kRemoveLocked));
@@ -116,7 +106,7 @@ TEST(SgSharedMemoryPosix, ObjectsArePrivateAndForeignOnesAreNotTrusted) {
     EXPECT_EQ(info.st_size, 0);
     close(fd);
     shm_unlink(name.c_str());
-    EXPECT_TRUE(objectsOf(exposed).empty());
+    EXPECT_TRUE(objectsOf(exposed).isEmpty());
 
     // A live data object whose reference record has gone is not taken over.
     const std::string orphan = uniqueKey("orphan");
@@ -186,7 +176,6 @@ TEST(SgSharedMemoryPosix, ManyProcessesChurningOneKeyLoseNoUpdate) {
         EXPECT_EQ(result[3], 0); // failures on the anchored key
         EXPECT_GT(result[4], 0); // cycles on the loose key
         total += result[2];
-        std::printf("peer: %lld increments, %lld loose cycles\n", result[2], result[4]);
     }
     EXPECT_EQ(readWord(memory, 0), static_cast<std::uint32_t>(total));
     EXPECT_EQ(memory.attachCount(), 1);
@@ -194,8 +183,8 @@ TEST(SgSharedMemoryPosix, ManyProcessesChurningOneKeyLoseNoUpdate) {
         peer->quit();
     EXPECT_TRUE(memory.detach());
     EXPECT_TRUE(memory.remove(SgSharedMemory::kRemoveLocked));
-    EXPECT_TRUE(objectsOf(anchored).empty());
-    EXPECT_TRUE(objectsOf(loose).empty());
+    EXPECT_TRUE(objectsOf(anchored).isEmpty());
+    EXPECT_TRUE(objectsOf(loose).isEmpty());
 }
 
 TEST(SgSharedMemoryPosix, BigSegmentsFillWholeAndTooLittleRoomFailsTheCreate) {
@@ -218,7 +207,7 @@ TEST(SgSharedMemoryPosix, BigSegmentsFillWholeAndTooLittleRoomFailsTheCreate) {
             EXPECT_TRUE(writer.detach());
             EXPECT_TRUE(writer.remove(SgSharedMemory::kRemoveUnlocked));
         }
-        EXPECT_TRUE(objectsOf(key).empty());
+        EXPECT_TRUE(objectsOf(key).isEmpty());
     }
 
     // Where /dev/shm has too little room the create fails and leaves nothing, instead of a
@@ -234,7 +223,7 @@ TEST(SgSharedMemoryPosix, BigSegmentsFillWholeAndTooLittleRoomFailsTheCreate) {
         SgSharedMemory tooBig(key);
         const bool refused = !tooBig.create(4 << 20) &&
                              tooBig.status() == SgSharedMemory::StatusFailed &&
-                             objectsOf(key).empty();
+                             objectsOf(key).isEmpty();
         SgSharedMemory fits(key);
         const bool created = fits.create(256 << 10) && fits.remove(SgSharedMemory::kRemoveUnlocked);
         _exit(refused && created ? 0 : 1);
