@@ -26,11 +26,6 @@ using namespace exchangetest;
 
 namespace {
 
-class ExchangeReaderTest : public ::testing::Test {
-protected:
-    void SetUp() override { clearLog(); }
-};
-
 std::unique_ptr<SgPolyShape> read(const QByteArray &record, QString *trailer = nullptr) {
     QString text;
     SgExchangeReader reader(record.constData(), size_t(record.size()));
@@ -70,7 +65,7 @@ std::vector<Facet> facetsByMaterial(const SgPolyMesh &mesh) {
 
 } // namespace
 
-TEST_F(ExchangeReaderTest, ReturnedRecordBecomesAShape) {
+TEST(ExchangeReaderTest, ReturnedRecordBecomesAShape) {
     SgPolyMesh *mesh = sgTestMesh({{1, 2, 3}, {0, 0, 0}, {1, 0, 0}, {0, 1, 0}, {1, 1, 0}},
                                   {{0.5f, 0.25f}, {1, 1}});
     sgTestAddFacet(*mesh, 1, {{0, 1}, {1, 0}, {2, -1}});
@@ -126,7 +121,8 @@ TEST_F(ExchangeReaderTest, ReturnedRecordBecomesAShape) {
     EXPECT_FALSE(materialAt(*shape, 1)->getColorMap());
 }
 
-TEST_F(ExchangeReaderTest, EmptyBlocksAndUnknownFacetTypes) {
+TEST(ExchangeReaderTest, EmptyBlocksAndUnknownFacetTypes) {
+    clearLog();
     // name "E", V = 3, U = 0, M = 0, F = 4: 'X' (no corners), 'T' in material 1 of 1 (read as
     // 0), a 'P' of 2 corners, a 'P' of 5 corners in material 1; trailer.
     const QByteArray record = QByteArray::fromHex(
@@ -173,7 +169,7 @@ TEST_F(ExchangeReaderTest, EmptyBlocksAndUnknownFacetTypes) {
     EXPECT_TRUE(logLines().isEmpty());
 }
 
-TEST_F(ExchangeReaderTest, FigureRoundTripKeepsVerticesUVsAndFacetOrder) {
+TEST(ExchangeReaderTest, FigureRoundTripKeepsVerticesUVsAndFacetOrder) {
     SgAppSettings().setInt("FacetorBridgeTools", 1); // weld the base geometry
     auto figure = std::make_unique<SgSkeleton>("Body");
     figure->setLabel("Body");

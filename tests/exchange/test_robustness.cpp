@@ -23,11 +23,6 @@ using namespace exchangetest;
 
 namespace {
 
-class ExchangeRobustnessTest : public ::testing::Test {
-protected:
-    void SetUp() override { clearLog(); }
-};
-
 // A record with every kind of field: UVs, two materials with images, 'T', 'Q' and 'P'.
 QByteArray validRecord() {
     std::vector<SgVec3> points;
@@ -60,7 +55,7 @@ void putInt(QByteArray &bytes, qsizetype at, std::int32_t value) {
 
 } // namespace
 
-TEST_F(ExchangeRobustnessTest, EveryPrefixIsRejectedCleanly) {
+TEST(ExchangeRobustnessTest, EveryPrefixIsRejectedCleanly) {
     const QByteArray record = validRecord();
     ASSERT_GT(record.size(), 100);
     ASSERT_TRUE(readExact(record));
@@ -74,7 +69,7 @@ TEST_F(ExchangeRobustnessTest, EveryPrefixIsRejectedCleanly) {
     EXPECT_EQ(trailer, "kept");
 }
 
-TEST_F(ExchangeRobustnessTest, BadCountsAndIndicesAreRejected) {
+TEST(ExchangeRobustnessTest, BadCountsAndIndicesAreRejected) {
     const QByteArray record = validRecord();
     const qsizetype v = 4 + 6;                                 // vertex count
     const qsizetype u = v + 4 + 6 * 12;                        // UV count
@@ -121,7 +116,7 @@ TEST_F(ExchangeRobustnessTest, BadCountsAndIndicesAreRejected) {
     }
 }
 
-TEST_F(ExchangeRobustnessTest, IndicesOutsideTheReturnedListsAndNonFiniteStrengthsAreKept) {
+TEST(ExchangeRobustnessTest, IndicesOutsideTheReturnedListsAndNonFiniteStrengthsAreKept) {
     // A modeler that returns fewer materials or UVs than its facets name keeps the edit: the
     // facet falls back to material 0, the corner to no UV. Strengths that are not numbers are
     // dropped.

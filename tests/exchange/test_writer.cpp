@@ -36,11 +36,6 @@ void mapBump(SgDefaultMaterial &material, SgTexture *texture) {
     material.getBumpControl()->setMapped(true);
 }
 
-class ExchangeWriterTest : public ::testing::Test {
-protected:
-    void SetUp() override { clearLog(); }
-};
-
 // A prop node with one polygon shape; the node owns everything.
 std::unique_ptr<SgNode> prop(const QString &label, SgPolyMesh *mesh,
                              const std::vector<SgMaterial *> &materials) {
@@ -83,7 +78,7 @@ QString writeImage(const QString &path, QColor color) {
 
 } // namespace
 
-TEST_F(ExchangeWriterTest, WorkedRecordByteForByte) {
+TEST(ExchangeWriterTest, WorkedRecordByteForByte) {
     SgPolyMesh *mesh = sgTestMesh({{0, 0, 0}, {10, 0, 0}, {0, 10, 0}});
     sgTestAddFacet(*mesh, 0, {{0, 0, 0}, {1, 0, 0}, {2, 0, 0}});
     auto node = prop("A", mesh, {new BareMaterial("M")});
@@ -128,7 +123,7 @@ TEST_F(ExchangeWriterTest, WorkedRecordByteForByte) {
     EXPECT_EQ(r.toHex(), expected.toHex());
 }
 
-TEST_F(ExchangeWriterTest, FacetKindsUVsTrailerAndTheMeasure) {
+TEST(ExchangeWriterTest, FacetKindsUVsTrailerAndTheMeasure) {
     // Vertices in modeler units, no UVs, a trailer.
     SgPolyMesh *triangles = sgTestMesh({{10, 20, 30}, {0, 0, 0}, {1, 1, 1}, {2, 2, 2}});
     sgTestAddFacet(*triangles, 0, {{0}, {1}, {2}});
@@ -167,7 +162,7 @@ TEST_F(ExchangeWriterTest, FacetKindsUVsTrailerAndTheMeasure) {
     EXPECT_LE(w.size(), measured);
 }
 
-TEST_F(ExchangeWriterTest, FacetsGoInMaterialOrderAndUnknownMaterialsAreLeftOut) {
+TEST(ExchangeWriterTest, FacetsGoInMaterialOrderAndUnknownMaterialsAreLeftOut) {
     SgPolyMesh *mesh = sgTestMesh({{0, 0, 0}, {1, 0, 0}, {0, 1, 0}, {1, 1, 0}, {2, 2, 0}});
     sgTestAddFacet(*mesh, 1, {{0}, {1}, {2}});           // triangle of material 1 first
     sgTestAddFacet(*mesh, 0, {{0}, {1}, {3}, {2}});      // quad of material 0
@@ -178,7 +173,7 @@ TEST_F(ExchangeWriterTest, FacetsGoInMaterialOrderAndUnknownMaterialsAreLeftOut)
     EXPECT_EQ(facetsOf(decode(node.get())), (QStringList{"T0:3/3", "Q0:0/4", "T1:0/3", "P1:0/5"}));
 }
 
-TEST_F(ExchangeWriterTest, MaterialEntryRules) {
+TEST(ExchangeWriterTest, MaterialEntryRules) {
     auto *material = new SgDefaultMaterial("skin");
     material->setDiffuseColor(QColor(255, 128, 0));
     material->setSpecularColor(QColor(0, 0, 255));
@@ -211,7 +206,7 @@ TEST_F(ExchangeWriterTest, MaterialEntryRules) {
         EXPECT_EQ(value, 0.0f);
 }
 
-TEST_F(ExchangeWriterTest, ImagesAreCopiedAsJpegOncePerImageFileUnderSafeUniqueNames) {
+TEST(ExchangeWriterTest, ImagesAreCopiedAsJpegOncePerImageFileUnderSafeUniqueNames) {
     const QString source = writeImage(tempPath() + "/images/a/wood.png", Qt::red);
     const QString other = writeImage(tempPath() + "/images/b/wood.png", Qt::blue);
     SgTexture *wood = sgApp->getImageMgr()->getImage(source);
@@ -277,7 +272,7 @@ TEST_F(ExchangeWriterTest, ImagesAreCopiedAsJpegOncePerImageFileUnderSafeUniqueN
     EXPECT_EQ(SgMaterialBlockWriter::exportTextureAsJpeg(&missing), QString());
 }
 
-TEST_F(ExchangeWriterTest, LongImagePathsStayInsideTheMeasuredSize) {
+TEST(ExchangeWriterTest, LongImagePathsStayInsideTheMeasuredSize) {
     QString deep = tempPath() + "/images";
     while (deep.size() < 1400)
         deep += "/" + QString(60, QLatin1Char('d'));
@@ -297,7 +292,7 @@ TEST_F(ExchangeWriterTest, LongImagePathsStayInsideTheMeasuredSize) {
     EXPECT_EQ(buffer.right(16), QByteArray(16, '\x7f'));
 }
 
-TEST_F(ExchangeWriterTest, EmptyNodesAndShapesWithoutMaterialsOrUVs) {
+TEST(ExchangeWriterTest, EmptyNodesAndShapesWithoutMaterialsOrUVs) {
     // Nothing to send measures zero and writes nothing.
     SgNode bare("empty");
     SgExchangeWriter writer(&bare, QString());
@@ -316,7 +311,7 @@ TEST_F(ExchangeWriterTest, EmptyNodesAndShapesWithoutMaterialsOrUVs) {
     EXPECT_TRUE(decode(node.get()).facets.empty());
 }
 
-TEST_F(ExchangeWriterTest, SubdivisionPatchesAreWrittenAsQuads) {
+TEST(ExchangeWriterTest, SubdivisionPatchesAreWrittenAsQuads) {
     auto *subd = new SgSubDMesh;
     SgVec3 *v = subd->setVertexCount(6);
     for (int i = 0; i < 6; ++i)
@@ -341,7 +336,7 @@ TEST_F(ExchangeWriterTest, SubdivisionPatchesAreWrittenAsQuads) {
     EXPECT_EQ(n.corners[4].third, -1);
 }
 
-TEST_F(ExchangeWriterTest, ADestinationTooSmallIsNeverOverrun) {
+TEST(ExchangeWriterTest, ADestinationTooSmallIsNeverOverrun) {
     SgPolyMesh *mesh = sgTestMesh({{0, 0, 0}, {10, 0, 0}, {0, 10, 0}});
     sgTestAddFacet(*mesh, 0, {{0}, {1}, {2}});
     auto node = prop("A", mesh, {new BareMaterial("a-long-material-name")});

@@ -1,28 +1,10 @@
-#include "sgcore/properties/sgcontroller.h"
+#include "sgcore/morph/sgerclink.h"
 #include "sgcore/properties/sgfloatproperty.h"
 #include "sgcore/properties/sgintproperty.h"
 #include "sgcore/scene/sgnode.h"
 #include "tests/support/sgtestmain.h"
 
 #include <gtest/gtest.h>
-
-namespace {
-
-// Adds the value of another property times a scale.
-class AddLinked : public SgController {
-public:
-    AddLinked(SgNumericProperty *source, float scale) : m_source(source), m_scale(scale) {}
-    float evaluate(float value, const SgNumericProperty &) const override {
-        return value + m_scale * m_source->getValue();
-    }
-    SgNumericProperty *getLinkProperty() const override { return m_source; }
-
-private:
-    SgNumericProperty *m_source;
-    float m_scale;
-};
-
-} // namespace
 
 TEST(HostProperties, NamesAreUniquePerElementAndOwnershipIsTracked) {
     SgNode node(QStringLiteral("n"));
@@ -57,8 +39,8 @@ TEST(HostProperties, ValuesPassThroughControllersAndClampOnReading) {
     EXPECT_EQ(channel.getRawValue(), 5.0f);
 
     channel.setValue(0.0f);
-    auto *first = new AddLinked(&control, 0.5f);
-    auto *second = new AddLinked(&control, 0.25f);
+    auto *first = new SgERCLink(SgERCLink::DeltaAdd, &control, 0.5f, 0.0f);
+    auto *second = new SgERCLink(SgERCLink::DeltaAdd, &control, 0.25f, 0.0f);
     EXPECT_EQ(channel.insertController(first, -1), 0);
     EXPECT_EQ(channel.insertController(second, 0), 0);
     EXPECT_EQ(channel.insertController(first), SgResult::Failed);
@@ -71,7 +53,7 @@ TEST(HostProperties, ValuesPassThroughControllersAndClampOnReading) {
     EXPECT_EQ(channel.getControllerCount(), 1);
 
     // A link cycle reads the raw value instead of recursing.
-    control.insertController(new AddLinked(&channel, 1.0f));
+    control.insertController(new SgERCLink(SgERCLink::DeltaAdd, &channel, 1.0f, 0.0f));
     control.setValue(0.5f);
     EXPECT_FLOAT_EQ(control.getValue(), 0.5f + 0.5f * 0.5f);
     control.removeAllControllers();

@@ -3,16 +3,10 @@
 
 #include <gtest/gtest.h>
 
-namespace {
-
-const QString kExamples = QStringLiteral(SG_EXAMPLES_DIR);
-
-} // namespace
-
 TEST(HostSceneFile, RejectsBadFilesWholeWithPlace) {
     SgScene scene;
     SgSceneFile file;
-    const QString base = kExamples + QStringLiteral("/scenes");
+    const QString base = QStringLiteral(SG_EXAMPLES_DIR "/scenes");
     struct Case {
         const char *json;
         const char *words;

@@ -1,6 +1,8 @@
-#include "sgcore/geometry/sgmodifier.h"
 #include "sgcore/geometry/sgpolymesh.h"
 #include "sgcore/materials/sgmaterial.h"
+#include "sgcore/morph/sgmorph.h"
+#include "sgcore/morph/sgmorphdeltas.h"
+#include "sgcore/properties/sgfloatproperty.h"
 #include "sgcore/scene/sgbone.h"
 #include "sgcore/scene/sgfigurewelder.h"
 #include "sgcore/scene/sgskeleton.h"
@@ -28,22 +30,6 @@ std::unique_ptr<SgPolyMesh> unweld(const SgFigureWelder &w, const SgVertexMesh &
     SgVertexMesh *out = w.unWeld(&edited);
     return std::unique_ptr<SgPolyMesh>(dynamic_cast<SgPolyMesh *>(out));
 }
-
-// A morph-like modifier that lifts vertex 0 by `amount`.
-class LiftFirstVertex : public SgModifier {
-public:
-    explicit LiftFirstVertex(float amount) : SgModifier(QStringLiteral("lift")), m_amount(amount) {}
-    void apply(SgVertexMesh *mesh, SgNode *) const override {
-        mesh->setVertex(0, mesh->getVertex(0) + SgVec3(0, 0, m_amount));
-    }
-    void applyInverse(SgVertexMesh *mesh, SgNode *) const override {
-        mesh->setVertex(0, mesh->getVertex(0) - SgVec3(0, 0, m_amount));
-    }
-    bool isMorphModifier() const override { return true; }
-
-private:
-    float m_amount;
-};
 
 } // namespace
 
@@ -155,7 +141,12 @@ TEST(HostWelder, FlagsSelectBonesSeamsAndMorphedGeometry) {
     bones[1]->setHidden(false);
 
     // Morphed geometry: the weld shows the morph, unwelding takes it out again.
-    bones[0]->getObject()->addModifier(new LiftFirstVertex(2.0f));
+    auto *lift = new SgMorphDeltas;
+    lift->setVertCount(sgTestGeometry(bones[0])->getVertexCount());
+    lift->addDelta(0, SgVec3(0, 0, 2), true);
+    auto *morph = new SgMorph(QStringLiteral("lift"), lift);
+    morph->getValueChannel()->setValue(1.0f);
+    bones[0]->getObject()->addModifier(morph);
     SgFigureWelder morphed(figure.get(), false, true, true, true);
     EXPECT_EQ(morphed.getGeometry()->getVertex(0), SgVec3(0, 0, 2));
     result = unweld(morphed, *morphed.getGeometry());

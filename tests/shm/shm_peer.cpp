@@ -9,6 +9,7 @@
 #include <memory>
 #include <sstream>
 #include <string>
+#include <thread>
 
 namespace {
 
@@ -90,6 +91,11 @@ std::string run(const std::string &line) {
         segment = std::make_unique<SgSharedMemory>(key);
         segment->setWaitLimit(kWaitLimitMs);
         return answer(true);
+    }
+    if (command == "sleep") {
+        in >> a;
+        std::this_thread::sleep_for(std::chrono::milliseconds(a));
+        return "1 0";
     }
     if (command == "churn") {
         std::string anchored;

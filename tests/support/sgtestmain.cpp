@@ -1,8 +1,6 @@
 #include "tests/support/sgtestmain.h"
 
-#include "sgcore/app/sgapp.h"
 #include "sgcore/app/sgappsettings.h"
-#include "sgcore/scene/sgscene.h"
 
 #include <gtest/gtest.h>
 
@@ -21,7 +19,6 @@
 #include <chrono>
 #include <cstdio>
 #include <cstdlib>
-#include <memory>
 #include <mutex>
 #include <string>
 #include <thread>
