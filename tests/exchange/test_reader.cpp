@@ -26,15 +26,6 @@ using namespace exchangetest;
 
 namespace {
 
-std::unique_ptr<SgPolyShape> read(const QByteArray &record, QString *trailer = nullptr) {
-    QString text;
-    SgExchangeReader reader(record.constData(), size_t(record.size()));
-    std::unique_ptr<SgPolyShape> shape(reader.readShape(text));
-    if (trailer)
-        *trailer = text;
-    return shape;
-}
-
 SgDefaultMaterial *materialAt(const SgShape &shape, int index) {
     return dynamic_cast<SgDefaultMaterial *>(shape.getMaterial(index));
 }
@@ -88,7 +79,7 @@ TEST(ExchangeReaderTest, ReturnedRecordBecomesAShape) {
     ASSERT_FALSE(record.isEmpty());
 
     QString trailer;
-    auto shape = read(record, &trailer);
+    auto shape = readRecord(record, &trailer);
     ASSERT_TRUE(shape);
     EXPECT_EQ(shape->getName(), "Prop");
     EXPECT_EQ(trailer, "tail");
@@ -154,7 +145,7 @@ TEST(ExchangeReaderTest, EmptyBlocksAndUnknownFacetTypes) {
         "000000000000000000000000"
         "010000000000000000000000"
         "00000000");
-    auto shape = read(record);
+    auto shape = readRecord(record);
     ASSERT_TRUE(shape);
     const SgPolyMesh *mesh = shape->getPolyMesh();
     EXPECT_EQ(mesh->getVertex(0), SgVec3(10, 20, 30));
@@ -198,7 +189,7 @@ TEST(ExchangeReaderTest, FigureRoundTripKeepsVerticesUVsAndFacetOrder) {
     // The modeler reads the record and sends its geometry back unchanged.
     SgExchangeNode node;
     ASSERT_TRUE(SgExchangeNodeReader(sent.constData(), size_t(sent.size())).read(node));
-    auto shape = read(SgFacetorReturn::encode(node));
+    auto shape = readRecord(SgFacetorReturn::encode(node));
     ASSERT_TRUE(shape);
     EXPECT_EQ(shape->getName(), "Body");
 

@@ -40,15 +40,6 @@ QByteArray validRecord() {
     return SgReturnRecordWriter("robust", *mesh, {a, b}, "t").toByteArray();
 }
 
-// Reads `bytes` from a heap block of exactly their size, so that a read past it is caught.
-std::unique_ptr<SgPolyShape> readExact(const QByteArray &bytes) {
-    const std::unique_ptr<char[]> block(new char[size_t(bytes.size())]);
-    std::memcpy(block.get(), bytes.constData(), size_t(bytes.size()));
-    QString trailer;
-    SgExchangeReader reader(block.get(), size_t(bytes.size()));
-    return std::unique_ptr<SgPolyShape>(reader.readShape(trailer));
-}
-
 void putInt(QByteArray &bytes, qsizetype at, std::int32_t value) {
     std::memcpy(bytes.data() + at, &value, 4);
 }
@@ -58,10 +49,10 @@ void putInt(QByteArray &bytes, qsizetype at, std::int32_t value) {
 TEST(ExchangeRobustnessTest, EveryPrefixIsRejectedCleanly) {
     const QByteArray record = validRecord();
     ASSERT_GT(record.size(), 100);
-    ASSERT_TRUE(readExact(record));
+    ASSERT_TRUE(readRecord(record));
     for (qsizetype n = 0; n < record.size(); ++n) {
         clearLog();
-        EXPECT_FALSE(readExact(record.left(n))) << "prefix of " << n << " bytes";
+        EXPECT_FALSE(readRecord(record.left(n))) << "prefix of " << n << " bytes";
         EXPECT_EQ(logLines(), QStringList{"Error reading memory map"}) << n;
     }
     QString trailer = "kept";
@@ -111,7 +102,7 @@ TEST(ExchangeRobustnessTest, BadCountsAndIndicesAreRejected) {
         QByteArray bad = record;
         putInt(bad, c.at, c.value);
         clearLog();
-        EXPECT_FALSE(readExact(bad)) << "at " << c.at << " value " << c.value;
+        EXPECT_FALSE(readRecord(bad)) << "at " << c.at << " value " << c.value;
         EXPECT_EQ(logLines(), QStringList{"Error reading memory map"});
     }
 }
@@ -139,7 +130,7 @@ TEST(ExchangeRobustnessTest, IndicesOutsideTheReturnedListsAndNonFiniteStrengths
                                     {triangle + 33, 0x7fffffff},
                                     {polygon + 13, 1}})
         putInt(record, at, value);
-    auto shape = readExact(record);
+    auto shape = readRecord(record);
     ASSERT_TRUE(shape) << logLines().join('\n').toStdString();
     const SgPolyMesh *back = shape->getPolyMesh();
     ASSERT_EQ(back->getTriangleCount(), 1);

@@ -65,16 +65,14 @@ TEST(HostObjReader, KeepsVertexOrderPolygonsGroupsAndMaterials) {
     // Faces before any usemtl use "default"; names are indexed in order of first use.
     EXPECT_EQ(r.getMaterialNames(), (QStringList{QStringLiteral("default"), QStringLiteral("Skin"),
                                                  QStringLiteral("Nails")}));
-    EXPECT_EQ(m->getTriangleMaterial(0), 0);
-    EXPECT_EQ(m->getQuadMaterial(0), 1);
-    EXPECT_EQ(m->getPolygonMaterial(0), 2);
-    EXPECT_EQ(m->getTriangleMaterial(1), 1);
+    EXPECT_EQ(m->triangleMaterials(), (std::vector<uint8_t>{0, 1}));
+    EXPECT_EQ(m->quadMaterials(), std::vector<uint8_t>{1});
+    EXPECT_EQ(m->polygonMaterials(), std::vector<uint8_t>{2});
 
     ASSERT_EQ(m->getFaceGroupCount(), 1);
     EXPECT_EQ(m->getFaceGroupName(0), QStringLiteral("arm"));
-    EXPECT_EQ(m->getTriangleGroup(0), -1);
-    EXPECT_EQ(m->getQuadGroup(0), 0);
-    EXPECT_EQ(m->getTriangleGroup(1), -1);
+    EXPECT_EQ(m->triangleGroups(), (std::vector<int32_t>{-1, -1}));
+    EXPECT_EQ(m->quadGroups(), std::vector<int32_t>{0});
     EXPECT_EQ(m->getFaceGroupVertices(0), (std::vector<int32_t>{0, 1, 2, 3, 4}));
     QString why;
     EXPECT_TRUE(m->validate(&why)) << why.toStdString();
