@@ -29,22 +29,6 @@ QLineEdit *openEditor(SgMorphSourceList &list) {
     return nullptr;
 }
 
-bool editorOpen(SgMorphSourceList &list) {
-    return openEditor(list) != nullptr;
-}
-
-// Types `text` into the in-place editor of column 1 of `row` and presses Enter.
-void editInPlace(SgMorphSourceList &list, QTreeWidgetItem *row, const QString &text) {
-    ASSERT_FALSE(editorOpen(list));
-    static_cast<SgMorphSourceItem *>(row)->showEditor(QPoint(), 1);
-    QLineEdit *editor = openEditor(list);
-    ASSERT_NE(editor, nullptr);
-    editor->setText(text);
-    QTest::keyClick(editor, Qt::Key_Return);
-    // The editor hands its text over from the event loop.
-    QCoreApplication::processEvents();
-}
-
 class SourceItems : public ::testing::Test {
 protected:
     QWidget window;
@@ -61,6 +45,21 @@ protected:
         ASSERT_TRUE(QTest::qWaitForWindowActive(&window));
         head = new SgMorphFileItem(&list, QStringLiteral("/data/morphs/head.obj"));
         list.expandAll();
+    }
+    // Types `text` into the in-place editor of column 1 of `row` and presses Enter, or with
+    // `enter` false moves the focus elsewhere.
+    void editInPlace(QTreeWidgetItem *row, const QString &text, bool enter = true) {
+        ASSERT_EQ(openEditor(list), nullptr);
+        static_cast<SgMorphSourceItem *>(row)->showEditor(QPoint(), 1);
+        QLineEdit *editor = openEditor(list);
+        ASSERT_NE(editor, nullptr);
+        editor->setText(text);
+        if (enter)
+            QTest::keyClick(editor, Qt::Key_Return);
+        else
+            elsewhere.setFocus();
+        // The editor hands its text over from the event loop.
+        QCoreApplication::processEvents();
     }
 };
 
@@ -182,50 +181,44 @@ TEST_F(SourceItems, UnknownAndOutOfRangeTextsFallBackToDefaults) {
 TEST_F(SourceItems, InPlaceEditsFollowTheMorphNameAndRevertBadNumbers) {
     auto *label = findRow(head, "Label:");
     boolRow(head, "Use Secondary Label:")->setValue(true);
-    editInPlace(list, findRow(head, "Name:"), "smile");
+    editInPlace(findRow(head, "Name:"), "smile");
     EXPECT_EQ(head->loader().morphName(), "smile");
     EXPECT_EQ(label->text(1), "smile");
     EXPECT_EQ(findRow(head, "Property:")->text(1), "smile");
 
     // Leaving the label editor on the shown name keeps it following the name.
-    editInPlace(list, label, "smile");
+    editInPlace(label, "smile");
     EXPECT_EQ(head->loader().customLabel(), "");
-    editInPlace(list, findRow(head, "Name:"), "grin");
+    editInPlace(findRow(head, "Name:"), "grin");
     EXPECT_EQ(label->text(1), "grin");
 
-    editInPlace(list, label, "Big Grin");
+    editInPlace(label, "Big Grin");
     EXPECT_EQ(head->loader().customLabel(), "Big Grin");
-    editInPlace(list, findRow(head, "Name:"), "grin2");
+    editInPlace(findRow(head, "Name:"), "grin2");
     EXPECT_EQ(label->text(1), "Big Grin");
-    editInPlace(list, label, "");
+    editInPlace(label, "");
     EXPECT_EQ(head->loader().customLabel(), "");
     EXPECT_EQ(label->text(1), "grin2");
 
     auto *value = findRow(head, "Value:");
     boolRow(head, "Use Custom Value:")->setValue(true);
-    editInPlace(list, value, "2.5");
+    editInPlace(value, "2.5");
     EXPECT_FLOAT_EQ(head->loader().customValue(), 2.5f);
-    editInPlace(list, value, "abc");
+    editInPlace(value, "abc");
     EXPECT_EQ(value->text(1), "2.5");
     EXPECT_FLOAT_EQ(head->loader().customValue(), 2.5f);
 
     // The edit is also taken over when the editor loses focus.
-    ASSERT_FALSE(editorOpen(list));
-    static_cast<SgMorphSourceItem *>(value)->showEditor(QPoint(), 1);
-    QLineEdit *editor = openEditor(list);
-    ASSERT_NE(editor, nullptr);
-    editor->setText("0.5");
-    elsewhere.setFocus();
-    QCoreApplication::processEvents();
+    editInPlace(value, "0.5", false);
     EXPECT_FLOAT_EQ(head->loader().customValue(), 0.5f);
-    EXPECT_FALSE(editorOpen(list));
+    EXPECT_EQ(openEditor(list), nullptr);
 
     // Column 0 is never edited, and "Label:" only while "Use Secondary Label:" is yes.
     static_cast<SgMorphSourceItem *>(findRow(head, "Name:"))->showEditor(QPoint(), 0);
-    EXPECT_FALSE(editorOpen(list));
+    EXPECT_EQ(openEditor(list), nullptr);
     boolRow(head, "Use Secondary Label:")->setValue(false);
     label->showEditor(QPoint(), 1);
-    EXPECT_FALSE(editorOpen(list));
+    EXPECT_EQ(openEditor(list), nullptr);
 
     // A press on the current in-place row opens its editor; the first press only makes it
     // current.
@@ -233,24 +226,18 @@ TEST_F(SourceItems, InPlaceEditsFollowTheMorphNameAndRevertBadNumbers) {
     list.setCurrentItem(head);
     const QPoint at(list.columnViewportPosition(1) + 5, list.visualItemRect(name).center().y());
     QTest::mouseClick(list.viewport(), Qt::LeftButton, {}, at);
-    EXPECT_FALSE(editorOpen(list));
+    EXPECT_EQ(openEditor(list), nullptr);
     QTest::mouseClick(list.viewport(), Qt::LeftButton, {}, at);
-    EXPECT_TRUE(editorOpen(list));
+    EXPECT_NE(openEditor(list), nullptr);
 }
 
-// A file row starts on plain geometry with the export rows off; the in-memory row of a
-// returned mesh starts on a welded export with reverse deformations, expanded.
-TEST_F(SourceItems, FileAndMeshRowsStartWithTheirPresets) {
-    EXPECT_EQ(head->loader().morphName(), "head");
-    EXPECT_FALSE(head->loader().scenaraExported() || head->loader().reverseModifiers());
-    for (const char *label : {"Ignored Invisible Nodes:", "Used Bone Welds:", "Value:", "Pose:"})
-        EXPECT_FALSE(findRow(head, label)->isEnabled()) << label;
-    EXPECT_FALSE(findRow(head, "Pose:")->dropEnabled());
-
+// The in-memory row of a returned mesh starts on a welded export with reverse deformations,
+// expanded, so that a returned figure maps onto its bones.
+TEST_F(SourceItems, TheMeshRowStartsOnAWeldedExport) {
     auto *item = list.addMesh(nullptr, nullptr);
-    EXPECT_EQ(item->loader().morphName(), "FacMorph");
-    EXPECT_TRUE(item->isExpanded());
     const SgMorphLoader &loader = item->loader();
+    EXPECT_EQ(loader.morphName(), "FacMorph");
+    EXPECT_TRUE(item->isExpanded());
     EXPECT_TRUE(loader.scenaraExported() && loader.weldedGeometry() &&
                 loader.removedUnusedVertices() && loader.reverseModifiers());
     EXPECT_FALSE(loader.ignoredInvisibleNodes());

@@ -113,7 +113,6 @@ TEST_F(CreatePropertyDialog, AfterJointFollowsMorphAndTheTitleComesFirst) {
     auto single = std::make_unique<Dlg>(nullptr, "single", true, Dlg::FloatType, false, true);
     EXPECT_EQ(single->windowTitle(), "Create Float Property");
     single->show();
-    EXPECT_EQ(single->windowTitle(), "Create Float Property");
     EXPECT_FALSE(child<QWidget>(*single, "SgPropTypeBox")->isVisible());
 }
 
@@ -405,8 +404,6 @@ public:
           m_value(dialog.findChild<SgEnumSlider *>("SgEnumAttrib")),
           m_default(dialog.findChild<SgEnumSlider *>("SgDefaultEnumAttrib")) {}
 
-    QTreeWidget *list() const { return m_list; }
-
     void doubleClick(int row, int column) {
         const QModelIndex index = m_list->model()->index(row, column);
         m_list->scrollTo(index);
@@ -506,10 +503,13 @@ TEST_F(CreatePropertyDialog, EnumEditorKeepsRowsAndSlidersInStep) {
     editor.expect({"0:b", "1:A", "2:C"}, __LINE__);
     EXPECT_EQ(editor.currentLabel(), "b");
 
-    // After a removal the rows below are renumbered, so later edits reach the right items.
+    // After a removal the rows below are renumbered, so later edits reach the right items, and
+    // the sliders' current item moves down with its index.
+    editor.defaultSlider()->setCurrentIndex(2);
     editor.select(0);
     editor.press("SgDeleteEnumDownButton");
     editor.expect({"0:A", "1:C"}, __LINE__);
+    EXPECT_EQ(editor.defaultSlider()->currentIndex(), 1);
     ASSERT_TRUE(editor.type(1, "Z"));
     editor.expect({"0:A", "1:Z"}, __LINE__);
     ASSERT_TRUE(editor.type(2, "D"));
