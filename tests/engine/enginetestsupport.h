@@ -15,9 +15,19 @@
 #include <gtest/gtest.h>
 
 #include <deque>
+#include <memory>
 #include <optional>
 
 namespace enginetest {
+
+// Meshes start with no reference: `hold` takes one for the holder's life, as an owner does.
+struct Unref {
+    void operator()(SgRefCountedItem *item) const { item->unref(); }
+};
+template <typename Mesh> std::unique_ptr<Mesh, Unref> hold(Mesh *mesh) {
+    mesh->ref();
+    return std::unique_ptr<Mesh, Unref>(mesh);
+}
 
 // Answers the loader's name questions without dialogs: each takes the next of `names` (nullopt
 // cancels; none left cancels too) and records the name it was asked about. Pose questions are

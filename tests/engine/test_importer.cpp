@@ -3,7 +3,6 @@
 #include "sgcore/app/sgimporter.h"
 #include "sgcore/app/sgimportmgr.h"
 #include "sgcore/importer/sgfileiosettings.h"
-#include "sgcore/importer/sggeometryimporter.h"
 #include "sgcore/morph/sgmorph.h"
 #include "sgcore/morph/sgmorphdeltas.h"
 #include "sharedsource/engine/sgmorphloader.h"
@@ -32,46 +31,6 @@ protected:
         return sgTestWriteFile(dir.filePath(name), text);
     }
 };
-
-TEST_F(GeometryImport, ObjImporterTakesOptionsAsTextOverItsDefaults) {
-    const QString path = writeFile("target.obj", "v 1 2 3\nv 4 5 6\nv 7 8 9\ng top\nf 3 1 2\n");
-    SgImporter *found = sgApp->getImportMgr()->findImporter(path);
-    auto *importer = dynamic_cast<SgGeometryImporter *>(found);
-    ASSERT_TRUE(importer);
-    EXPECT_EQ(sgApp->getImportMgr()->findImporter(dir.filePath("x.OBJ")), found);
-
-    // The chosen options travel as text over the defaults, as the loader hands them on; the
-    // lateral axis keeps its default X.
-    SgFileIOSettings chosen, options;
-    chosen.setValue("VertAxis", "Z");
-    chosen.setValue("DepthAxis", "Y");
-    chosen.setValue("InvertDepthAxis", true);
-    chosen.setValue("Scale", 2.0);
-    ASSERT_TRUE(importer->getDefaultOptions(options, 0));
-    ASSERT_TRUE(options.fromString(chosen.toString()));
-    const QString before = options.toString();
-    for (const char *bad : {"{", "[1,2]"})
-        EXPECT_FALSE(options.fromString(bad)) << bad;
-    EXPECT_EQ(options.toString(), before);
-
-    SgShape *shape = nullptr;
-    ASSERT_EQ(importer->importGeometry(path, shape, options), 0);
-    std::unique_ptr<SgShape> owned(shape);
-    const auto *mesh = dynamic_cast<const SgPolyMesh *>(shape->getGeometry());
-    ASSERT_TRUE(mesh);
-    EXPECT_EQ(shape->getName(), QString("target"));
-    ASSERT_EQ(mesh->getVertexCount(), 3);
-    EXPECT_EQ(mesh->getVertex(0), SgVec3(2, 6, -4));
-    EXPECT_EQ(mesh->getVertex(2), SgVec3(14, 18, -16));
-    EXPECT_EQ(mesh->findFaceGroup("top"), 0);
-
-    options.setValue("LatAxis", "Z"); // Z named twice
-    EXPECT_NE(importer->importGeometry(path, shape, options), 0);
-    EXPECT_EQ(shape, nullptr);
-    options.setValue("LatAxis", "X");
-    options.setValue("Scale", 0.0);
-    EXPECT_NE(importer->importGeometry(path, shape, options), 0);
-}
 
 TEST_F(GeometryImport, FileLoadsMakeMorphsOrReportWhyNot) {
     auto *node = sgTestNode("Head", sgTestRowMesh(12));

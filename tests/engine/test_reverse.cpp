@@ -51,8 +51,7 @@ TEST_F(ReverseDeformations, LoadedSculptOfAPoseIsReproducedWhenPosedAgain) {
         Arm arm;
         arm.pose();
         // Sculpt the posed lower bone: two vertices pushed out.
-        std::unique_ptr<SgPolyMesh> sculpt(
-            sgTestCopyVertices(*arm.lower->getObject()->getCachedGeom()));
+        const auto sculpt = hold(sgTestCopyVertices(*arm.lower->getObject()->getCachedGeom()));
         sculpt->setVertex(2, sculpt->getVertex(2) + SgVec3(0.3f, -0.2f, 0.1f));
         sculpt->setVertex(6, sculpt->getVertex(6) + SgVec3(0.0f, 0.0f, 0.5f));
 
@@ -62,7 +61,6 @@ TEST_F(ReverseDeformations, LoadedSculptOfAPoseIsReproducedWhenPosedAgain) {
         loader.setReverseModifiers(true);
         loader.setApplyAfterJoint(afterJoint);
         SgMorphLoadLog log;
-        sculpt->ref();
         loader.createMorphForNode(sculpt.get(), arm.lower, log);
         ASSERT_FALSE(log.hasProblems());
 
@@ -75,7 +73,6 @@ TEST_F(ReverseDeformations, LoadedSculptOfAPoseIsReproducedWhenPosedAgain) {
         const SgVertexMesh *shown = arm.lower->getObject()->getCachedGeom();
         for (int i = 0; i < sculpt->getVertexCount(); ++i)
             EXPECT_LT(distance(shown->getVertex(i), sculpt->getVertex(i)), 1e-4f) << i;
-        sculpt.release()->unref();
     }
 }
 

@@ -47,20 +47,8 @@ SgTestHandler saveOptions(bool saveObjects, bool relative) {
 
 const QByteArray TriangleObj = "v 0 0 0\nv 1 0 0\nv 0 1 0\nf 1 2 3\n";
 
-// The setting row with `key` below `row` (depth first), or null.
-SgMorphSourceItem *findKey(QTreeWidgetItem *row, const QString &key) {
-    for (int i = 0; i < row->childCount(); ++i) {
-        auto *child = static_cast<SgMorphSourceItem *>(row->child(i));
-        if (child->settingKey() == key)
-            return child;
-        if (SgMorphSourceItem *found = findKey(child, key))
-            return found;
-    }
-    return nullptr;
-}
-
 QString value(QTreeWidgetItem *source, const QString &key) {
-    SgMorphSourceItem *row = findKey(source, key);
+    SgMorphSourceItem *row = findRow(source, key);
     return row ? row->valueText() : QStringLiteral("<missing>");
 }
 
@@ -241,7 +229,7 @@ TEST_F(MorphLoaderDlgTest, ObjectValuesLoadAsTheRowsRead) {
     SgMorphLoaderDlg dialog(nullptr, true, nullptr, nullptr);
     dialog.sourceList()->addFile(path("head.obj"));
     SgMorphFileItem *source = topSource(dialog);
-    findKey(source, "UpdateOverrideExisting")->setValueText("Deltas Only");
+    findRow(source, "UpdateOverrideExisting")->setValueText("Deltas Only");
     sgTestWriteFile(
         path("head.obj.scx"),
         "<VarnTargetImporter Version=\"1\"><FileType Type=\"Object\">"
@@ -284,7 +272,7 @@ TEST_F(MorphLoaderDlgTest, SaveThenLoadReproducesEveryRowAndTheControlProperty) 
                                             {"ApplyAfterJointBinding", "True"},
                                             {"UpdateOverrideExisting", "Deltas and ERC Links"},
                                             {"CleanUp", "False"}})
-            findKey(source, key)->setValueText(text);
+            findRow(source, key)->setValueText(text);
         // Attributes that must come back exactly: markup in the label, extreme floats.
         auto *property = new SgFloatProperty("smile");
         property->setLabel("Smile <Control> & \"more\"");

@@ -1,41 +1,9 @@
 #include "sgcore/properties/sgfloatproperty.h"
 #include "sgcore/settings/sgpropertysettings.h"
-#include "sgcore/widgets/sgfloatslider.h"
-#include "sgcore/widgets/sgintslider.h"
 #include "tests/support/sgtestmain.h"
 
 #include <QDomDocument>
-#include <QLineEdit>
-#include <QSlider>
 #include <gtest/gtest.h>
-
-TEST(HostWidgets, SlidersKeepExactValuesAndTakeTypedNumbersOnlyWhenEditable) {
-    SgFloatSlider slider(nullptr, "f");
-    const auto type = [](auto &on, const char *text) {
-        on.textField()->setText(text);
-        emit on.textField()->editingFinished();
-    };
-    slider.setValue(0.1f);
-    // Leaving the field with the shown text must not round the stored value.
-    emit slider.textField()->editingFinished();
-    EXPECT_EQ(slider.getValue(), 0.1f);
-    slider.setValue(5.0f); // outside the slider's span: kept as it is
-    EXPECT_EQ(slider.getValue(), 5.0f);
-    type(slider, "2.5");
-    type(slider, "abc");
-    EXPECT_EQ(slider.getValue(), 2.5f);
-    EXPECT_EQ(slider.textField()->text(), "2.5");
-    slider.setTextEditable(false);
-    type(slider, "7");
-    EXPECT_EQ(slider.getValue(), 2.5f);
-
-    SgIntSlider ints(nullptr, "i");
-    type(ints, "-7");
-    type(ints, "1.5");
-    EXPECT_EQ(ints.getValue(), -7);
-    ints.slider()->setValue(ints.slider()->maximum());
-    EXPECT_EQ(ints.getValue(), 10);
-}
 
 // The exact round trip of a property's attributes through a configuration file is checked by
 // the loader's save-then-load test; here a partial or damaged set, as a file edited by hand.
