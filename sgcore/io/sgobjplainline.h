@@ -350,19 +350,19 @@ inline const char *faceInWords(const char *p, const char *limit, SgFaceCorner *c
 } // namespace detail
 
 // "v": `p` just after the keyword.
-inline bool vertex(const char *p, float out[3], const char *&next) {
+[[gnu::always_inline]] inline bool vertex(const char *p, float out[3], const char *&next) {
     return detail::numbersInWindow(p, out, 3, next);
 }
 
 // "vt": `p` just after the keyword.
-inline bool uv(const char *p, float out[2], const char *&next) {
+[[gnu::always_inline]] inline bool uv(const char *p, float out[2], const char *&next) {
     return detail::numbersInWindow(p, out, 2, next);
 }
 
 // "f": `p` just after the keyword; `corners` has room for 255. Sets the corner count (3 or
 // more on success) and the line's largest indices.
-inline bool face(const char *p, const char *limit, SgFaceCorner *corners, int &count,
-                 FaceIndexMax &max, const char *&next) {
+[[gnu::always_inline]] inline bool face(const char *p, const char *limit, SgFaceCorner *corners,
+                                        int &count, FaceIndexMax &max, const char *&next) {
     max = FaceIndexMax();
     if (detail::faceInWindow(p, corners, count, max, next))
         return true;

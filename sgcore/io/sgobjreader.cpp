@@ -176,7 +176,7 @@ private:
     template <typename T> const char *readNumberRun(std::vector<T> &items) {
         constexpr bool vertices = std::is_same_v<T, SgVec3>;
         SgBatchAppender<T> out(items);
-        const auto readLine = [&](const char *p, const char *&next) {
+        const auto readLine = [&](const char *p, const char *&next) __attribute__((always_inline)) {
             float v[3];
             if (!(vertices ? SgObjPlainLine::vertex(p, v, next) : SgObjPlainLine::uv(p, v, next))) {
                 return false;
@@ -218,30 +218,31 @@ private:
                                 m_mesh->triangleGroups(), material, m_group);
         FacetBatch<4> quads(m_mesh->quadCorners(), m_mesh->quadMaterials(), m_mesh->quadGroups(),
                             material, m_group);
-        return readRun("f ", [&](const char *p, const char *&next) {
-            int n = 0;
-            SgObjPlainLine::FaceIndexMax max;
-            SgFaceCorner *corners = triangles.next();
-            if (!SgObjPlainLine::face(p, m_fastEnd, corners, n, max, next)) {
-                return false;
-            }
-            noteReference(max.vertex, m_maxVertexRef, m_maxVertexLine);
-            noteReference(max.uv, m_maxUVRef, m_maxUVLine);
-            noteReference(max.normal, m_maxNormalRef, m_maxNormalLine);
-            if (!m_facetsReserved) {
-                reserveFacets(size_t(n), size_t(next - p + 1));
-            }
-            if (n == 3) {
-                triangles.commit();
-            } else if (n == 4) {
-                std::copy(corners, corners + 4, quads.next());
-                quads.commit();
-            } else {
-                std::copy(corners, corners + n, m_corners.data());
-                addFace(size_t(n));
-            }
-            return true;
-        });
+        return readRun(
+            "f ", [&](const char *p, const char *&next) __attribute__((always_inline)) {
+                int n = 0;
+                SgObjPlainLine::FaceIndexMax max;
+                SgFaceCorner *corners = triangles.next();
+                if (!SgObjPlainLine::face(p, m_fastEnd, corners, n, max, next)) {
+                    return false;
+                }
+                noteReference(max.vertex, m_maxVertexRef, m_maxVertexLine);
+                noteReference(max.uv, m_maxUVRef, m_maxUVLine);
+                noteReference(max.normal, m_maxNormalRef, m_maxNormalLine);
+                if (!m_facetsReserved) {
+                    reserveFacets(size_t(n), size_t(next - p + 1));
+                }
+                if (n == 3) {
+                    triangles.commit();
+                } else if (n == 4) {
+                    std::copy(corners, corners + 4, quads.next());
+                    quads.commit();
+                } else {
+                    std::copy(corners, corners + n, m_corners.data());
+                    addFace(size_t(n));
+                }
+                return true;
+            });
     }
 
     // Facets of `corners` corners in one material and group: their corners gathered in a
