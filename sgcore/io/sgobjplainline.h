@@ -122,6 +122,7 @@ template <char Mark, char Mark2 = Mark>
     const __m128i space = _mm_set1_epi8(' '), tab = _mm_set1_epi8('\t');
     const __m128i cr = _mm_set1_epi8('\r'), newline = _mm_set1_epi8('\n');
     const __m128i mark = _mm_set1_epi8(Mark), mark2 = _mm_set1_epi8(Mark2);
+#pragma GCC unroll 4
     for (int i = 0; i < 64; i += 16) {
         const __m128i v = _mm_loadu_si128(reinterpret_cast<const __m128i *>(p + i));
         const __m128i d = _mm_sub_epi8(v, zero);
@@ -172,6 +173,17 @@ template <char Mark, char Mark2 = Mark>
     return (std::uint64_t(1) << length) - 1;
 }
 
+// The bytes below `count` (0 to 8) of a word.
+constexpr std::uint64_t kLowBytes[9] = {0,
+                                        0xFF,
+                                        0xFFFF,
+                                        0xFFFFFF,
+                                        0xFFFFFFFF,
+                                        0xFFFFFFFFFF,
+                                        0xFFFFFFFFFFFF,
+                                        0xFFFFFFFFFFFFFF,
+                                        ~std::uint64_t(0)};
+
 // Reads `count` blank-separated short numbers of a line of up to 64 bytes from the masks.
 [[gnu::always_inline]] inline bool numbersInWindow(const char *p, float *out, int count,
                                                    const char *&next) {
@@ -196,14 +208,14 @@ template <char Mark, char Mark2 = Mark>
         const int fractionDigits = point ? runLength(m.digit, at) : 0;
         at += fractionDigits;
         const int allDigits = integerDigits + fractionDigits;
-        if (!bitAt(stops, at) || allDigits == 0 || allDigits > 8 || fractionDigits > 7)
+        if (!bitAt(stops, at) | (unsigned(allDigits - 1) > 7u) | (fractionDigits > 7))
             return false;
         // The digits on both sides of the point as one word: the integer digits from the
         // word at the first digit, the rest from the word one byte further on.
         std::uint64_t before = 0, after = 0;
         std::memcpy(&before, digits, 8);
         std::memcpy(&after, digits + 1, 8);
-        const std::uint64_t low = integerDigits ? ~std::uint64_t(0) >> (64 - 8 * integerDigits) : 0;
+        const std::uint64_t low = kLowBytes[integerDigits];
         const std::uint64_t word = point ? (before & low) | (after & ~low) : before;
         const std::uint32_t mantissa = wordValue(word, allDigits);
         if (!toFloat(negative, mantissa, fractionDigits, out[k]))
