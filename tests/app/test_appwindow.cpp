@@ -1,6 +1,6 @@
 // The application window with the real plug-in: it opens offscreen, the plug-in's action sits
-// in its category's menu and tool bar, the tree drives the scene's selection, the property
-// panel sets values, and a screenshot is kept as a test artefact.
+// in its category's menu and tool bar and its class reaches script engines, the tree drives the
+// scene's selection, the property panel sets values, and a screenshot is kept as a test artefact.
 
 #include "app/sgappwindow.h"
 #include "app/sglogpane.h"
@@ -12,6 +12,7 @@
 
 #include "sgcore/app/sgapp.h"
 #include "sgcore/app/sgappsettings.h"
+#include "sgcore/app/sghelpmgr.h"
 #include "sgcore/app/sgmessagesink.h"
 #include "sgcore/geometry/sgobject.h"
 #include "sgcore/geometry/sgshape.h"
@@ -37,12 +38,15 @@
 #include <QDoubleSpinBox>
 #include <QFile>
 #include <QFileInfo>
+#include <QJSEngine>
 #include <QLineEdit>
 #include <QMenu>
 #include <QMenuBar>
 #include <QMessageBox>
 #include <QPushButton>
 #include <QToolBar>
+
+#include <memory>
 
 #include <gtest/gtest.h>
 
@@ -87,20 +91,30 @@ TEST(AppWindow, ShowsThePluginActionTheSceneAndItsProperties) {
         << sgApp->getMessageSink()->logLines().join('\n').toStdString();
     ASSERT_EQ(plugins.actions().size(), 1);
     SgAction *bridge = plugins.actions().first();
+    EXPECT_TRUE(sgApp->getHelpMgr()->isRegistered(bridge));
+    // The poll slot is reachable through the meta-object, as the host's timers reach slots.
+    EXPECT_TRUE(QMetaObject::invokeMethod(bridge, "checkSharedMap"));
+    // Each script engine gets a constructor of bridges that C++ keeps.
+    for (int i = 0; i < 2; ++i) {
+        QJSEngine engine;
+        plugins.registerClasses(&engine);
+        std::unique_ptr<QObject> made(engine.evaluate("new SgFacBridge()").toQObject());
+        ASSERT_NE(made, nullptr);
+        EXPECT_TRUE(made->inherits("SgFacBridge"));
+        EXPECT_EQ(QJSEngine::objectOwnership(made.get()), QJSEngine::CppOwnership);
+    }
 
     SgAppWindow window;
     EXPECT_EQ(sgApp->getInterface(), &window);
     window.addPluginAction(bridge);
     window.show();
-    QApplication::processEvents();
-    EXPECT_EQ(window.size(), QSize(1180, 680));
 
     // Menu path "&Scripts/Plug-ins", then the category "Facetor Bridge".
-    QMenu *scripts = submenu(window.menuBar()->actions(), QStringLiteral("&Scripts"));
-    ASSERT_NE(scripts, nullptr);
-    QMenu *plugIns = submenu(scripts->actions(), QStringLiteral("Plug-ins"));
-    ASSERT_NE(plugIns, nullptr);
-    QMenu *category = submenu(plugIns->actions(), QStringLiteral("Facetor Bridge"));
+    QMenu *category = submenu(window.menuBar()->actions(), QStringLiteral("&Scripts"));
+    for (const char *title : {"Plug-ins", "Facetor Bridge"}) {
+        ASSERT_NE(category, nullptr) << title;
+        category = submenu(category->actions(), QString::fromLatin1(title));
+    }
     ASSERT_NE(category, nullptr);
     EXPECT_TRUE(category->actions().contains(bridge));
     auto *bar = window.findChild<QToolBar *>(QStringLiteral("SgToolBar_Facetor Bridge"));
@@ -114,7 +128,6 @@ TEST(AppWindow, ShowsThePluginActionTheSceneAndItsProperties) {
     ASSERT_NE(figure, nullptr);
     QTreeWidgetItem *item = window.sceneTree()->itemOf(figure);
     ASSERT_NE(item, nullptr);
-    EXPECT_EQ(item->childCount(), 1); // hip, with chest and head below it
     window.sceneTree()->setCurrentItem(item);
     EXPECT_EQ(scene->getPrimarySelection(), figure);
     EXPECT_EQ(scene->getSelectedNodes().size(), 1);
@@ -136,6 +149,20 @@ TEST(AppWindow, ShowsThePluginActionTheSceneAndItsProperties) {
     spin->setValue(7.0); // clamped by the spin box's range
     EXPECT_FLOAT_EQ(slider->getValue(), 1.0f);
 
+    // "&Tools" opens the "Target Importer" for the selection, in file mode.
+    QAction *importer = actionNamed(window, "SgTargetImporterAction");
+    EXPECT_TRUE(submenu(window.menuBar()->actions(), QStringLiteral("&Tools"))
+                    ->actions()
+                    .contains(importer));
+    bool fileMode = false;
+    sgTestAnswering({[&](QWidget *dialog) {
+                        fileMode = dialog->findChild<QPushButton *>(
+                                       QStringLiteral("MorphLoaderBrowseBtn")) != nullptr;
+                        qobject_cast<QDialog *>(dialog)->reject();
+                    }},
+                    [&] { importer->trigger(); });
+    EXPECT_TRUE(fileMode);
+
     // The host log reaches the log pane.
     sgApp->log(QStringLiteral("window smoke test"));
     EXPECT_TRUE(window.logPane()->toPlainText().contains(QStringLiteral("window smoke test")));
@@ -153,32 +180,7 @@ TEST(AppWindow, ShowsThePluginActionTheSceneAndItsProperties) {
     QDir().mkpath(artifacts);
     const QString shot = QDir(artifacts).filePath(QStringLiteral("scenara-main-window.png"));
     EXPECT_TRUE(window.grab().save(shot)) << shot.toStdString();
-    const QStringList cut = sgCutTexts(&window);
-    EXPECT_TRUE(cut.isEmpty()) << cut.join('\n').toStdString();
-    scene->clear();
-}
-
-TEST(AppWindow, ToolsMenuOpensTheTargetImporterInFileMode) {
-    SgAppWindow window;
-    SgScene *scene = sgApp->getScene();
-    auto *figure = new SgSkeleton(QStringLiteral("Blobby"));
-    scene->addNode(figure);
-    scene->selectNode(figure);
-
-    QMenu *tools = submenu(window.menuBar()->actions(), QStringLiteral("&Tools"));
-    ASSERT_NE(tools, nullptr);
-    QAction *importer = actionNamed(window, "SgTargetImporterAction");
-    ASSERT_NE(importer, nullptr);
-    EXPECT_TRUE(tools->actions().contains(importer));
-    bool fileMode = false;
-    SgTestModalAnswer answer([&](QWidget *dialog) {
-        fileMode =
-            dialog->findChild<QPushButton *>(QStringLiteral("MorphLoaderBrowseBtn")) != nullptr;
-        qobject_cast<QDialog *>(dialog)->reject();
-    });
-    importer->trigger();
-    EXPECT_EQ(answer.answered(), 1) << "the dialog never opened";
-    EXPECT_TRUE(fileMode);
+    EXPECT_EQ(sgCutTexts(&window), QStringList());
     scene->clear();
 }
 
@@ -209,8 +211,7 @@ TEST(AppWindow, SavesReopensAndNeverLosesChangesSilently) {
     QString question;
     EXPECT_FALSE(sgTestAnswering({sgTestAs<QMessageBox>([&question](QMessageBox *box) {
                                      question = box->text();
-                                     const QStringList cut = sgCutTexts(box);
-                                     EXPECT_TRUE(cut.isEmpty()) << cut.join('\n').toStdString();
+                                     EXPECT_EQ(sgCutTexts(box), QStringList());
                                      box->button(QMessageBox::Cancel)->click();
                                  })},
                                  [&] { return window.close(); }));
@@ -235,13 +236,11 @@ TEST(AppWindow, SavesReopensAndNeverLosesChangesSilently) {
     EXPECT_EQ(scene->findNodeByLabel(QStringLiteral("Blobby")), figure) << "cancelled: kept";
 
     // A file that does not load leaves the scene as it was.
-    QFile bad(sgTestPath(QStringLiteral("session/bad.json")));
-    ASSERT_TRUE(bad.open(QIODevice::WriteOnly));
-    bad.write(
+    const QString bad = sgTestWriteFile(
+        sgTestPath(QStringLiteral("session/bad.json")),
         R"({"scenara": 1, "nodes": [{"kind": "prop", "name": "X", "geometry": "none.obj"}]})");
-    bad.close();
     const int nodes = scene->getNodeCount();
-    EXPECT_FALSE(window.openScene(bad.fileName(), true));
+    EXPECT_FALSE(window.openScene(bad, true));
     EXPECT_EQ(scene->getNodeCount(), nodes);
     EXPECT_EQ(scene->findNodeByLabel(QStringLiteral("Blobby")), figure);
     EXPECT_EQ(window.scenePath(), QFileInfo(saved).absoluteFilePath());
@@ -252,24 +251,18 @@ TEST(AppWindow, SavesReopensAndNeverLosesChangesSilently) {
     auto *reopened = static_cast<SgFloatProperty *>(figure->findProperty(QStringLiteral("Grow")));
     ASSERT_NE(reopened, nullptr);
     EXPECT_EQ(reopened->getValue(), 1.0f);
-    SgObject *hip = figure->getAllBones().front()->getObject();
-    EXPECT_EQ(hip->getCachedGeom()->getVertex(0).y,
-              hip->getCurrentShape()->getGeometry()->getVertex(0).y + 50.0f);
 
     // Export writes the MTL beside the OBJ.
     scene->selectNode(scene->findNodeByLabel(QStringLiteral("Box")));
     ASSERT_TRUE(window.exportSelection(sgTestPath(QStringLiteral("session/box.obj")), true));
-    QFile mtl(sgTestPath(QStringLiteral("session/box.mtl")));
-    ASSERT_TRUE(mtl.open(QIODevice::ReadOnly));
-    EXPECT_TRUE(mtl.readAll().contains("newmtl "));
+    EXPECT_TRUE(sgTestReadFile(sgTestPath(QStringLiteral("session/box.mtl"))).contains("newmtl "));
 
     // Changed again, closing with "Save" saves to the current file and closes.
     window.propertyPanel()->setValue(reopened, -0.5);
     EXPECT_TRUE(
         sgTestAnswering({sgTestPressButton(QMessageBox::Save)}, [&] { return window.close(); }));
     SgScene check;
-    SgSceneFile file;
-    ASSERT_TRUE(file.load(saved, &check));
+    ASSERT_TRUE(SgSceneFile().load(saved, &check));
     EXPECT_EQ(
         static_cast<SgFloatProperty *>(
             check.findNodeByLabel(QStringLiteral("Blobby"))->findProperty(QStringLiteral("Grow")))
@@ -281,8 +274,7 @@ TEST(AppWindow, SavesReopensAndNeverLosesChangesSilently) {
 TEST(AppWindow, PreferencesHoldTheModelerPathAndTheImportRoad) {
     SgAppWindow window;
     SgTestModalAnswer answer(sgTestAs<SgPreferencesDlg>([](SgPreferencesDlg *dialog) {
-        const QStringList cut = sgCutTexts(dialog);
-        EXPECT_TRUE(cut.isEmpty()) << cut.join('\n').toStdString();
+        EXPECT_EQ(sgCutTexts(dialog), QStringList());
         dialog->installPathEdit()->setText(QStringLiteral("/opt/facetor"));
         dialog->bridgeToolsBox()->setChecked(true);
         dialog->accept();
@@ -318,10 +310,8 @@ TEST(AppWindow, DeleteRemovesSelectedPropsAndFiguresButNoLoneBone) {
     scene->selectNode(box, true);
     ASSERT_EQ(window.propertyPanel()->node(), box);
     QString question;
-    QAction *remove = actionNamed(window, "SgDeleteAction");
-    ASSERT_NE(remove, nullptr);
     sgTestAnswering({sgTestPressButton(QMessageBox::Yes, nullptr, &question)},
-                    [&] { remove->trigger(); });
+                    [&] { actionNamed(window, "SgDeleteAction")->trigger(); });
     EXPECT_EQ(question, QStringLiteral("Delete Box?"));
     EXPECT_EQ(scene->findNodeByLabel(QStringLiteral("Box")), nullptr);
     EXPECT_EQ(window.sceneTree()->itemOf(box), nullptr);

@@ -18,27 +18,8 @@
 
 namespace {
 
-QComboBox *actionCombo(SgBridgeMorphDlg &dlg) {
-    return dlg.findChild<QComboBox *>(QStringLiteral("FcBridgehAction"));
-}
-QComboBox *groupCombo(SgBridgeMorphDlg &dlg) {
-    return dlg.findChild<QComboBox *>(QStringLiteral("FcBridgeMorphGroup"));
-}
-QLineEdit *nameEdit(SgBridgeMorphDlg &dlg) {
-    return dlg.findChild<QLineEdit *>(QStringLiteral("FcBridgeMorphName"));
-}
-QCheckBox *overrideBox(SgBridgeMorphDlg &dlg) {
-    return dlg.findChild<QCheckBox *>(QStringLiteral("FcOverrideExistingCheck"));
-}
-
-void clickOk(QWidget *modal) {
-    auto *buttons = modal->findChild<QDialogButtonBox *>();
-    QTest::mouseClick(buttons->button(QDialogButtonBox::Ok), Qt::LeftButton);
-}
-
 // Picks the action at `index` with the keyboard, as a user would on a closed combo.
-void pickAction(SgBridgeMorphDlg &dlg, int index) {
-    QComboBox *combo = actionCombo(dlg);
+void pickAction(QComboBox *combo, int index) {
     combo->setFocus();
     while (combo->currentIndex() < index)
         QTest::keyClick(combo, Qt::Key_Down);
@@ -48,82 +29,56 @@ void pickAction(SgBridgeMorphDlg &dlg, int index) {
 
 } // namespace
 
-TEST(BridgeMorphDlg, AcceptingAtOnceGivesTheDefaultsAndCancellingTakesNothing) {
-    SgNode body(QStringLiteral("Body"));
-    SgBridgeMorphDlg dlg(body.getLabel(), nullptr, &body);
-    // A node without property groups offers only the bridge's own group.
-    EXPECT_EQ(groupCombo(dlg)->count(), 1);
-    {
-        SgTestModalAnswer answer(clickOk);
-        ASSERT_EQ(dlg.exec(), QDialog::Accepted);
-    }
-    EXPECT_EQ(dlg.getActionText(), QStringLiteral("Create Morph"));
-    EXPECT_EQ(dlg.getMorphName(), QStringLiteral("My Morph"));
-    EXPECT_EQ(dlg.getGroupPath(), QStringLiteral("Morphs/FacetorBridge"));
-    EXPECT_FALSE(dlg.getOverride());
-
-    SgBridgeMorphDlg cancelled(QStringLiteral("Hat"), nullptr, nullptr);
-    SgTestModalAnswer answer([](QWidget *modal) {
-        QTest::mouseClick(modal->findChild<QDialogButtonBox *>()->button(QDialogButtonBox::Cancel),
-                          Qt::LeftButton);
-    });
-    EXPECT_EQ(cancelled.exec(), QDialog::Rejected);
-    EXPECT_TRUE(cancelled.getMorphName().isEmpty());
-    EXPECT_TRUE(cancelled.getGroupPath().isEmpty());
-}
-
-TEST(BridgeMorphDlg, OnlyMorphActionsEnableTheMorphSettings) {
-    SgBridgeMorphDlg dlg(QStringLiteral("Hat"), nullptr, nullptr);
-    dlg.show();
-    // At its default size every text of the dialog is whole.
-    EXPECT_EQ(sgCutTexts(&dlg), QStringList());
-    const auto morphControlsEnabled = [&] {
-        return groupCombo(dlg)->isEnabled() + nameEdit(dlg)->isEnabled() +
-               overrideBox(dlg)->isEnabled();
-    };
-    EXPECT_EQ(morphControlsEnabled(), 3);
-    const int expected[] = {3, 0, 3, 0};
-    for (int index : {1, 2, 3, 0, 3, 2}) {
-        pickAction(dlg, index);
-        EXPECT_EQ(morphControlsEnabled(), expected[index]) << index;
-        EXPECT_EQ(dlg.getActionText(), actionCombo(dlg)->itemText(index));
-    }
-
-    // A blank morph name cannot be taken for a morph action; the other actions need none.
-    QPushButton *ok = dlg.buttonBox()->button(QDialogButtonBox::Ok);
-    nameEdit(dlg)->setText("  ");
-    EXPECT_FALSE(ok->isEnabled());
-    QTest::keyClick(&dlg, Qt::Key_Return);
-    EXPECT_TRUE(dlg.isVisible());
-    pickAction(dlg, 3);
-    EXPECT_TRUE(ok->isEnabled());
-    pickAction(dlg, 0);
-    EXPECT_FALSE(ok->isEnabled());
-    QTest::keyClicks(nameEdit(dlg), "x");
-    EXPECT_TRUE(ok->isEnabled());
-}
-
-TEST(BridgeMorphDlg, TypedValuesComeBackWithForwardSlashes) {
+TEST(BridgeMorphDlg, OnlyMorphActionsTakeMorphSettingsWhichComeBackWithForwardSlashes) {
     SgNode body(QStringLiteral("Body"));
     auto *smile = new SgFloatProperty(QStringLiteral("Smile"));
     smile->setPath(QStringLiteral("Morphs/Face"));
     ASSERT_EQ(body.addProperty(smile), 0);
     SgBridgeMorphDlg dlg(body.getLabel(), nullptr, &body);
-    // The node's groups follow the bridge's own, which stays current.
-    EXPECT_EQ(groupCombo(dlg)->count(), 3);
-    EXPECT_EQ(groupCombo(dlg)->itemText(2), QStringLiteral("Morphs/Face"));
-    EXPECT_EQ(groupCombo(dlg)->currentIndex(), 0);
+    auto *action = dlg.findChild<QComboBox *>(QStringLiteral("FcBridgehAction"));
+    auto *group = dlg.findChild<QComboBox *>(QStringLiteral("FcBridgeMorphGroup"));
+    auto *name = dlg.findChild<QLineEdit *>(QStringLiteral("FcBridgeMorphName"));
+    auto *overrides = dlg.findChild<QCheckBox *>(QStringLiteral("FcOverrideExistingCheck"));
+    // The node's groups follow the bridge's own, which stays current; a new morph starts as
+    // "Create Morph" and overrides nothing.
+    EXPECT_EQ(group->count(), 3);
+    EXPECT_EQ(group->itemText(2), QStringLiteral("Morphs/Face"));
+    EXPECT_EQ(group->currentIndex(), 0);
+    EXPECT_EQ(dlg.getActionText(), QStringLiteral("Create Morph"));
+    EXPECT_FALSE(dlg.getOverride());
 
-    SgTestModalAnswer answer([&](QWidget *modal) {
-        pickAction(dlg, 2);
-        groupCombo(dlg)->lineEdit()->selectAll();
-        QTest::keyClicks(groupCombo(dlg)->lineEdit(), QStringLiteral("Morphs\\Mine\\Deep"));
-        nameEdit(dlg)->selectAll();
-        QTest::keyClicks(nameEdit(dlg), QStringLiteral("Grin"));
-        QTest::mouseClick(overrideBox(dlg), Qt::LeftButton);
-        clickOk(modal);
+    SgTestModalAnswer answer([&](QWidget *) {
+        // At its default size every text of the dialog is whole.
+        EXPECT_EQ(sgCutTexts(&dlg), QStringList());
+        const auto morphControlsEnabled = [&] {
+            return group->isEnabled() + name->isEnabled() + overrides->isEnabled();
+        };
+        const int expected[] = {3, 0, 3, 0};
+        for (int index : {0, 1, 2, 3, 0, 3}) {
+            pickAction(action, index);
+            EXPECT_EQ(morphControlsEnabled(), expected[index]) << index;
+            EXPECT_EQ(dlg.getActionText(), action->itemText(index));
+        }
+        // A blank morph name cannot be taken for a morph action; the other actions need none.
+        QPushButton *ok = dlg.buttonBox()->button(QDialogButtonBox::Ok);
+        name->setText("  ");
+        pickAction(action, 0);
+        EXPECT_FALSE(ok->isEnabled());
+        QTest::keyClick(&dlg, Qt::Key_Return);
+        EXPECT_TRUE(dlg.isVisible());
+        pickAction(action, 3);
+        EXPECT_TRUE(ok->isEnabled());
+
+        pickAction(action, 2);
+        group->lineEdit()->selectAll();
+        QTest::keyClicks(group->lineEdit(), QStringLiteral("Morphs\\Mine\\Deep"));
+        name->selectAll();
+        QTest::keyClicks(name, QStringLiteral("Grin"));
+        QTest::mouseClick(overrides, Qt::LeftButton);
+        QTest::mouseClick(ok, Qt::LeftButton);
     });
     ASSERT_EQ(dlg.exec(), QDialog::Accepted);
+    EXPECT_EQ(answer.answered(), 1);
     EXPECT_EQ(dlg.getGroupPath(), QStringLiteral("Morphs/Mine/Deep"));
     EXPECT_EQ(dlg.getMorphName(), QStringLiteral("Grin"));
     EXPECT_TRUE(dlg.getOverride());

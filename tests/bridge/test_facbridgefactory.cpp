@@ -14,7 +14,6 @@ TEST(FacBridgeFactory, RegistersTheTypeOnceAndConvertsOnlyBridges) {
     SgFacBridgeFactory factory(SgGUID::fromString("6b1f3c2e-8d4a-4e57-9a0c-5f2e7d914b36"), &plugin);
     EXPECT_EQ(SgFacBridgeFactory::instance(), &factory);
     EXPECT_EQ(plugin.getClassFactories(), QList<SgClassFactory *>{&factory});
-    EXPECT_EQ(SgClassFactory::s_ownership, QJSEngine::CppOwnership);
 
     QJSEngine first;
     QJSEngine second;
@@ -35,6 +34,9 @@ TEST(FacBridgeFactory, RegistersTheTypeOnceAndConvertsOnlyBridges) {
     EXPECT_EQ(qjsvalue_cast<SgFacBridge *>(foreign), nullptr);
     EXPECT_EQ(SgFacBridgeFactory::fromScriptValue(first.evaluate("42")), nullptr);
 
+    // Called without `new`, the constructor makes a bridge as well.
+    std::unique_ptr<QObject> plain(second.evaluate("SgFacBridge()").toQObject());
+    EXPECT_NE(qobject_cast<SgFacBridge *>(plain.get()), nullptr);
     // The second creation entry creates a bridge too; the factory keeps no list of them.
     std::unique_ptr<QObject> byId(factory.createInstanceById());
     EXPECT_NE(qobject_cast<SgFacBridge *>(byId.get()), nullptr);

@@ -11,7 +11,6 @@
 #include "sgcore/app/sgmessagesink.h"
 #include "sgcore/geometry/sgobject.h"
 #include "sgcore/morph/sgmorph.h"
-#include "sgcore/morph/sgmorphdeltas.h"
 #include "sgcore/properties/sgfloatproperty.h"
 #include "sgcore/scene/sgnode.h"
 #include "sgcore/scene/sgscene.h"
@@ -32,101 +31,31 @@ namespace {
 // twice for a lock the modeler holds takes 50 ms.
 constexpr qint64 kStepLimitMs = 40;
 
-// Times every poll step: the bridge's timer drives a timed call of its poll slot instead.
-class TimedPoll {
-public:
-    explicit TimedPoll(SgFacBridge &bridge) : m_bridge(bridge) {
-        QObject::disconnect(bridge.pollTimer(), &QTimer::timeout, &bridge,
-                            &SgFacBridge::checkSharedMap);
-        m_connection = QObject::connect(bridge.pollTimer(), &QTimer::timeout, [this] { step(); });
-    }
-    ~TimedPoll() { QObject::disconnect(m_connection); }
-    qint64 worstNs() const { return m_worstNs; }
-    int steps() const { return m_steps; }
-    // The slow steps of the moment being tested, "moment: n ms" each.
-    QStringList slowSteps() const { return m_slow; }
-    void setMoment(const QString &moment) { m_moment = moment; }
-
-private:
-    void step() {
-        QElapsedTimer clock;
-        clock.start();
-        m_bridge.checkSharedMap();
-        const qint64 ns = clock.nsecsElapsed();
-        ++m_steps;
-        m_worstNs = std::max(m_worstNs, ns);
-        if (ns > kStepLimitMs * 1000000)
-            m_slow << QStringLiteral("%1: %2 ms").arg(m_moment).arg(double(ns) / 1e6);
-    }
-
-    SgFacBridge &m_bridge;
-    QMetaObject::Connection m_connection;
-    QString m_moment;
-    QStringList m_slow;
-    qint64 m_worstNs = 0;
-    int m_steps = 0;
-};
-
-// One moment to kill the modeler at: its checkpoint; whether the host has imported the
-// returned geometry by then (the modeler is killed only once it has); how many nodes a
-// restarted modeler receives (the one sent before the kill, when the dead modeler never
-// acknowledged it, and the new one); whether the modeler's goodbye has reached the host.
-struct Moment {
-    const char *point;
-    bool imported;
-    int restartReceives;
-    bool goodbyeSeen;
-};
-
-// From start-up to goodbye, in the order the modeler passes them. "-locked" moments hold the
-// control segment's lock ("link", "take", "post-") or the data segment's lock ("node-locked",
-// "node-read-locked", "return-locked", "return-half-written").
-const Moment kMoments[] = {
-    {"unlinked", false, 2, false},
-    {"link-locked", false, 2, false},
-    {"linked", false, 2, false},
-    {"post-idle-locked", false, 2, false},
-    {"requested", false, 2, false},
-    {"take-locked", false, 2, false},
-    {"node-attached", false, 2, false},
-    {"node-locked", false, 2, false},
-    {"node-read-locked", false, 2, false},
-    {"node-read", false, 2, false},
-    {"node-detached", false, 2, false},
-    {"node-released", false, 2, false},
-    {"node-received", false, 2, false},
-    {"post-ack-locked", false, 2, false},
-    {"node-acknowledged", false, 1, false},
-    {"return-created", false, 1, false},
-    {"return-attached", false, 1, false},
-    {"return-locked", false, 1, false},
-    {"return-half-written", false, 1, false},
-    {"return-written", false, 1, false},
-    {"post-data-locked", false, 1, false},
-    {"return-announced", true, 1, false},
-    {"return-acknowledged", true, 1, false},
-    {"return-released", true, 1, false},
-    {"goodbye", true, 1, false},
-    {"post-quit-locked", true, 1, false},
-    {"goodbye-posted", true, 1, true},
-};
+// The moments to kill the modeler at, its checkpoints from start-up to goodbye in the order it
+// passes them. "-locked" moments hold the control segment's lock ("link", "take", "post-") or
+// the data segment's lock ("node-locked", "node-read-locked", "return-locked",
+// "return-half-written").
+const QStringList kMoments =
+    QStringLiteral("unlinked link-locked linked post-idle-locked requested take-locked "
+                   "node-attached node-locked node-read-locked node-read node-detached "
+                   "node-released node-received post-ack-locked node-acknowledged return-created "
+                   "return-attached return-locked return-half-written return-written "
+                   "post-data-locked return-announced return-acknowledged return-released goodbye "
+                   "post-quit-locked goodbye-posted")
+        .split(QLatin1Char(' '));
 
 // Kills a modeler for good when it goes out of scope, whatever the test asserted before.
-class ModelerKiller {
-public:
-    explicit ModelerKiller(qint64 pid) : m_pid(pid) {}
-    ~ModelerKiller() { kill(); }
-    bool kill() { return sgTestKill(m_pid); }
-
-private:
-    qint64 m_pid;
+struct ModelerKiller {
+    qint64 pid;
+    ~ModelerKiller() { sgTestKill(pid); }
+    bool kill() const { return sgTestKill(pid); }
 };
 
 class ModelerKill : public ::testing::Test {
 protected:
     void SetUp() override {
         sgApp->getScene()->clear();
-        ASSERT_TRUE(sgTestLeftovers().isEmpty()) << sgTestLeftovers().join(' ').toStdString();
+        ASSERT_TRUE(e2eNothingLeft(0));
     }
     void TearDown() override { sgApp->getScene()->clear(); }
 
@@ -162,30 +91,45 @@ protected:
 TEST_F(ModelerKill, HostStaysResponsiveAndARestartedModelerWorks) {
     SgScene *scene = sgApp->getScene();
     E2eBridge bridge;
-    TimedPoll poll(bridge);
+    // Every poll step is timed; the slow ones are noted with their moment.
+    int steps = 0;
+    qint64 worstNs = 0;
+    QStringList slowSteps;
+    QString point;
+    bridge.timePolls([&](qint64 ns) {
+        ++steps;
+        worstNs = std::max(worstNs, ns);
+        if (ns > kStepLimitMs * 1000000)
+            slowSteps << QStringLiteral("%1: %2 ms").arg(point).arg(double(ns) / 1e6);
+    });
     QElapsedTimer total;
     total.start();
     int round = 0;
-    for (const Moment &moment : kMoments) {
-        SCOPED_TRACE(moment.point);
-        poll.setMoment(QString::fromLatin1(moment.point));
+    for (const QString &moment : kMoments) {
+        SCOPED_TRACE(moment.toStdString());
+        point = moment;
         ++round;
+        // Once the return is announced the host imports it (the modeler is killed only once it
+        // has); until the node is acknowledged a restarted modeler receives it again besides the
+        // new one; only the last moment's goodbye reaches the host.
+        const bool imported = round > kMoments.indexOf("return-announced");
+        const int restartReceives = round <= kMoments.indexOf("node-acknowledged") ? 2 : 1;
+        const bool goodbyeSeen = moment == kMoments.last();
         scene->addNode(sgTestProp(QStringLiteral("Cup%1").arg(round), {1, 2, 3}));
         SgNode *cup = scene->getNode(scene->getNodeCount() - 1);
 
         // The modeler stops at the moment; the host carries on meanwhile.
         {
-            ModelerKiller modeler(send(bridge, cup, moment.point, 1));
+            ModelerKiller modeler{send(bridge, cup, moment.toLatin1(), 1)};
             ASSERT_TRUE(sgTestWaitUntil(
-                [&] { return log().contains(QStringLiteral("paused %1\n").arg(moment.point)); },
-                5000))
+                [&] { return log().contains(QStringLiteral("paused %1\n").arg(moment)); }, 5000))
                 << log().toStdString();
-            if (moment.imported) {
+            if (imported) {
                 ASSERT_TRUE(sgTestWaitUntil([&] { return e2eMorphOn(cup) != nullptr; }, 3000))
                     << log().toStdString();
             }
             // A lock the modeler holds is held across a few poll steps before it dies.
-            if (QByteArray(moment.point).contains("locked"))
+            if (moment.contains(QLatin1String("locked")))
                 sgTestIdle(120);
             const int nodes = scene->getNodeCount();
             ASSERT_TRUE(modeler.kill());
@@ -196,37 +140,34 @@ TEST_F(ModelerKill, HostStaysResponsiveAndARestartedModelerWorks) {
             EXPECT_FALSE(bridge.isActive());
             EXPECT_FALSE(bridge.pollTimer()->isActive());
             EXPECT_EQ(sgApp->getMessageSink()->logLines().last(),
-                      moment.goodbyeSeen ? QStringLiteral("Facetor has quit.")
-                                         : QStringLiteral("Facetor has quit unexpectedly."));
+                      goodbyeSeen ? QStringLiteral("Facetor has quit.")
+                                  : QStringLiteral("Facetor has quit unexpectedly."));
             EXPECT_EQ(scene->getNodeCount(), nodes);
-            EXPECT_EQ(e2eModifierCount(cup), moment.imported ? 1 : 0);
+            EXPECT_EQ(e2eModifierCount(cup), imported ? 1 : 0);
         }
 
         // A restarted modeler links and completes a round trip of a new node.
         scene->addNode(sgTestProp(QStringLiteral("Mug%1").arg(round), {4, 5, 6}));
         SgNode *mug = scene->getNode(scene->getNodeCount() - 1);
-        const int steps = poll.steps();
-        ModelerKiller restarted(send(bridge, mug, QByteArray(), moment.restartReceives));
-        ASSERT_TRUE(sgTestWaitUntil(
-            [&] { return !bridge.isActive() && bridge.pendingImports() == 0; }, 10000))
-            << log().toStdString();
-        EXPECT_GT(poll.steps(), steps);
+        const int stepsBefore = steps;
+        ModelerKiller restarted{send(bridge, mug, QByteArray(), restartReceives)};
+        ASSERT_TRUE(bridge.settles(10000)) << log().toStdString();
+        EXPECT_GT(steps, stepsBefore);
         ASSERT_NE(e2eMorphOn(mug), nullptr) << log().toStdString();
         e2eMorphOn(mug)->getValueChannel()->setValue(1.0f);
         EXPECT_NEAR(mug->getObject()->getCachedGeom()->getVertex(0).y, 5.0f + 5.0f, 1e-4);
         // The node of the broken exchange went to the restarted modeler when the dead one
         // never acknowledged it, and came back once at most.
-        EXPECT_EQ(e2eModifierCount(cup), moment.imported || moment.restartReceives == 2 ? 1 : 0);
+        EXPECT_EQ(e2eModifierCount(cup), imported || restartReceives == 2 ? 1 : 0);
         EXPECT_EQ(bridge.sendList().count(), 0);
         EXPECT_FALSE(bridge.isExchangeBusy());
-        EXPECT_TRUE(sgTestWaitUntil([] { return sgTestLeftovers().isEmpty(); }, 2000))
-            << sgTestLeftovers().join(' ').toStdString();
+        EXPECT_TRUE(e2eNothingLeft());
         if (HasFailure())
             return; // the first broken moment says it; the rest would each wait out a modeler
     }
-    EXPECT_TRUE(poll.slowSteps().isEmpty()) << poll.slowSteps().join('\n').toStdString();
+    EXPECT_TRUE(slowSteps.isEmpty()) << slowSteps.join('\n').toStdString();
     std::printf("kill test: %d moments, %d poll steps, worst step %.2f ms, %lld ms in all\n", round,
-                poll.steps(), double(poll.worstNs()) / 1e6, total.elapsed());
+                steps, double(worstNs) / 1e6, total.elapsed());
 }
 
 TEST_F(ModelerKill, HostThatQuitsAfterAKilledModelerLeavesNothingBehind) {
@@ -237,7 +178,7 @@ TEST_F(ModelerKill, HostThatQuitsAfterAKilledModelerLeavesNothingBehind) {
     // the host quits before its poll has noticed.
     {
         E2eBridge bridge;
-        ModelerKiller modeler(send(bridge, cup, "node-locked", 1));
+        ModelerKiller modeler{send(bridge, cup, "node-locked", 1)};
         ASSERT_TRUE(sgTestWaitUntil(
             [&] { return log().contains(QStringLiteral("paused node-locked\n")); }, 5000))
             << log().toStdString();
@@ -246,15 +187,12 @@ TEST_F(ModelerKill, HostThatQuitsAfterAKilledModelerLeavesNothingBehind) {
         EXPECT_TRUE(bridge.isExchangeBusy());
         ASSERT_FALSE(sgTestLeftovers().isEmpty());
     }
-    EXPECT_TRUE(sgTestLeftovers().isEmpty()) << sgTestLeftovers().join(' ').toStdString();
+    EXPECT_TRUE(e2eNothingLeft(0));
 
     // A host started afresh in the same process links a new modeler and gets its node back.
     E2eBridge bridge;
-    ModelerKiller modeler(send(bridge, cup, QByteArray(), 1));
-    ASSERT_TRUE(
-        sgTestWaitUntil([&] { return !bridge.isActive() && bridge.pendingImports() == 0; }, 10000))
-        << log().toStdString();
+    ModelerKiller modeler{send(bridge, cup, QByteArray(), 1)};
+    ASSERT_TRUE(bridge.settles(10000)) << log().toStdString();
     EXPECT_NE(e2eMorphOn(cup), nullptr) << log().toStdString();
-    EXPECT_TRUE(sgTestWaitUntil([] { return sgTestLeftovers().isEmpty(); }, 2000))
-        << sgTestLeftovers().join(' ').toStdString();
+    EXPECT_TRUE(e2eNothingLeft());
 }

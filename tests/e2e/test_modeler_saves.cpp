@@ -1,9 +1,11 @@
 // The reference modeler watching its workspace while an editor saves: every way of saving gives
 // the host exactly one return of the complete file; a file still incomplete when it settles is
-// reported and not sent. The modeler is set up through its settings file. A return that the
-// host asks the modeler to release (code 4) comes again instead of being lost.
+// reported and not sent. The modeler is set up through its settings file, which its environment
+// overrides. A return that the host asks the modeler to release (code 4) comes again instead of
+// being lost.
 
 #include "tests/e2e/e2etestbridge.h"
+#include "tests/support/sgtestmain.h"
 #include "tests/support/sgtestprocess.h"
 #include "tests/support/sgtestscene.h"
 #include "tests/support/sgtestsegment.h"
@@ -33,11 +35,6 @@ namespace {
 
 constexpr int kSettleMs = 300;
 
-QByteArray readAll(const QString &path) {
-    QFile file(path);
-    return file.open(QIODevice::ReadOnly) ? file.readAll() : QByteArray();
-}
-
 // The text with the first vertex line moved by `dx` along x (the modeler's units).
 QByteArray withFirstVertexMoved(const QByteArray &obj, float dx) {
     const qsizetype start = obj.indexOf("\nv ") + 1;
@@ -51,30 +48,30 @@ int morphsMade() {
     return int(sgApp->getMessageSink()->logLines().filter(QStringLiteral("Created morph")).size());
 }
 
-// Everything the modeler needs, in its settings file under a private configuration folder;
-// nothing through its environment but that folder.
+// Everything the modeler needs, in its settings file under a private configuration folder.
+// The environment names that folder, and a workspace of its own, which wins over the file's.
 class SettingsRun {
 public:
-    explicit SettingsRun(const QString &extra = QString()) {
-        QDir(m_dir.path()).mkpath(QStringLiteral("config/Facetor"));
-        QFile ini(m_dir.filePath(QStringLiteral("config/Facetor/Facetor.ini")));
-        ini.open(QIODevice::WriteOnly);
-        ini.write(QStringLiteral("[General]\nworkspace=%1\nwatch=true\nsettleTime=%2\n"
-                                 "log=%3\nhostTimeout=10000\n%4")
-                      .arg(workspace())
-                      .arg(kSettleMs)
-                      .arg(logPath(), extra)
-                      .toUtf8());
+    SettingsRun() {
+        sgTestWriteFile(m_dir.filePath(QStringLiteral("config/Facetor/Facetor.ini")),
+                        QStringLiteral("[General]\nworkspace=%1\nwatch=true\nsettleTime=%2\n"
+                                       "log=%3\nhostTimeout=10000\n")
+                            .arg(fileWorkspace())
+                            .arg(kSettleMs)
+                            .arg(logPath())
+                            .toUtf8());
         qputenv("XDG_CONFIG_HOME", m_dir.filePath(QStringLiteral("config")).toUtf8());
         qputenv("FACETOR_INSTALL_PATH", FACETOR_BIN_DIR);
+        qputenv("FACETOR_WORKSPACE", workspace().toUtf8());
     }
     ~SettingsRun() {
-        qunsetenv("XDG_CONFIG_HOME");
-        qunsetenv("FACETOR_INSTALL_PATH");
+        for (const char *name : {"XDG_CONFIG_HOME", "FACETOR_INSTALL_PATH", "FACETOR_WORKSPACE"})
+            qunsetenv(name);
     }
     QString workspace() const { return m_dir.filePath(QStringLiteral("workspace")); }
+    QString fileWorkspace() const { return m_dir.filePath(QStringLiteral("file-workspace")); }
     QString logPath() const { return m_dir.filePath(QStringLiteral("facetor.log")); }
-    QString log() const { return QString::fromUtf8(readAll(logPath())); }
+    QString log() const { return QString::fromUtf8(sgTestReadFile(logPath())); }
 
 private:
     QTemporaryDir m_dir;
@@ -104,8 +101,9 @@ TEST_F(ModelerSaves, EverySaveStyleGivesExactlyOneCompleteReturn) {
         << run.log().toStdString();
     ASSERT_TRUE(sgTestWaitUntil(
         [&] { return run.log().contains(QStringLiteral("selection arrived")); }, 10000));
-    const QByteArray original = readAll(obj);
+    const QByteArray original = sgTestReadFile(obj);
     ASSERT_GT(original.size(), 6000);
+    EXPECT_FALSE(QFile::exists(run.fileWorkspace()));
 
     // Each style moves the first vertex one step further; the host makes one morph per return,
     // whose one delta is that step (ten host units per modeler unit).
@@ -125,11 +123,8 @@ TEST_F(ModelerSaves, EverySaveStyleGivesExactlyOneCompleteReturn) {
         EXPECT_NEAR(morph->getDeltas()->getDelta(0).x, 10 * step, 1e-3f) << style;
         object->removeModifier(morph); // the next return makes "MyMorph" anew
     };
-    expectOneReturn("in place, one write", 1.0f, [&](const QByteArray &text) {
-        QFile file(obj);
-        ASSERT_TRUE(file.open(QIODevice::WriteOnly | QIODevice::Truncate));
-        file.write(text);
-    });
+    const auto writeInPlace = [&](const QByteArray &text) { sgTestWriteFile(obj, text); };
+    expectOneReturn("in place, one write", 1.0f, writeInPlace);
     expectOneReturn("in place, chunks with pauses", 2.0f, [&](const QByteArray &text) {
         QFile file(obj);
         ASSERT_TRUE(file.open(QIODevice::WriteOnly | QIODevice::Truncate));
@@ -155,86 +150,48 @@ TEST_F(ModelerSaves, EverySaveStyleGivesExactlyOneCompleteReturn) {
     // A file that stops changing half written is reported, not sent; finished, it is sent once.
     const int before = morphsMade();
     const QByteArray text = withFirstVertexMoved(original, 4.0f);
-    {
-        QFile file(obj);
-        ASSERT_TRUE(file.open(QIODevice::WriteOnly | QIODevice::Truncate));
-        file.write(text.left(text.indexOf("\nf ") + 1)); // every vertex, no face yet
-    }
+    writeInPlace(text.left(text.indexOf("\nf ") + 1)); // every vertex, no face yet
     EXPECT_TRUE(
         sgTestWaitUntil([&] { return run.log().contains(QStringLiteral("not returned")); }, 5000))
         << run.log().toStdString();
     EXPECT_EQ(morphsMade(), before);
-    expectOneReturn("finished after a stall", 4.0f, [&](const QByteArray &finished) {
-        QFile file(obj);
-        ASSERT_TRUE(file.open(QIODevice::WriteOnly | QIODevice::Truncate));
-        file.write(finished);
-    });
+    expectOneReturn("finished after a stall", 4.0f, writeInPlace);
     bridge.closing();
-    ASSERT_TRUE(
-        sgTestWaitUntil([&] { return !bridge.isActive() && bridge.pendingImports() == 0; }, 10000));
+    ASSERT_TRUE(bridge.settles(10000));
     EXPECT_TRUE(sgTestWaitUntil(
         [&] { return run.log().contains(QStringLiteral("quit: the host closed the link")); }, 5000))
         << run.log().toStdString();
-}
-
-TEST_F(ModelerSaves, TheSettingsFileSetsUpALaunchedModelerAndTheEnvironmentOverridesIt) {
-    SgScene *scene = sgApp->getScene();
-    scene->addNode(sgTestProp(QStringLiteral("Cup"), {10, 20, 30}));
-    scene->selectNode(scene->findNodeByLabel(QStringLiteral("Cup")));
-    SettingsRun run(QStringLiteral("edit=move=1,0,0\nwatch=false\n"));
-    QTemporaryDir other;
-    qputenv("FACETOR_WORKSPACE", other.path().toUtf8());
-    qputenv("FACETOR_QUIT_WHEN_DONE", "1");
-    qputenv("FACETOR_EXPECT", "1");
-    {
-        E2eBridge bridge;
-        bridge.executeAction();
-        EXPECT_TRUE(sgTestWaitUntil(
-            [&] { return !bridge.isActive() && bridge.pendingImports() == 0; }, 20000))
-            << run.log().toStdString();
-    }
-    qunsetenv("FACETOR_WORKSPACE");
-    qunsetenv("FACETOR_QUIT_WHEN_DONE");
-    qunsetenv("FACETOR_EXPECT");
-    // The log file and the scripted edit came from the settings file, the workspace from the
-    // environment; the modeler says why it quit.
-    EXPECT_TRUE(QFile::exists(QDir(other.path()).filePath(QStringLiteral("Cup.obj"))));
-    EXPECT_FALSE(QFile::exists(run.workspace()));
-    EXPECT_EQ(morphsMade(), 1) << run.log().toStdString();
-    EXPECT_TRUE(run.log().contains(QStringLiteral("quit: done"))) << run.log().toStdString();
 }
 
 // The test plays the host by hand: it takes the modeler's return announcement (code 1) and
 // answers with code 4, as a host that needs the data segment for a node of its own does.
 TEST(ModelerRelease, AReturnReleasedInFlightComesAgain) {
     QTemporaryDir dir;
-    const QString returned = dir.filePath(QStringLiteral("shape.obj"));
-    QFile shape(returned);
-    ASSERT_TRUE(shape.open(QIODevice::WriteOnly));
-    shape.write("o Shape\nv 0 0 0\nv 1 0 0\nv 0 1 0\nf 1 2 3\n");
-    shape.close();
+    const QString returned = sgTestWriteFile(dir.filePath(QStringLiteral("shape.obj")),
+                                             "o Shape\nv 0 0 0\nv 1 0 0\nv 0 1 0\nf 1 2 3\n");
 
     SgTestSegment control(kSgControlSegmentKey);
     ASSERT_TRUE(control.create(sizeof(SgControlRecord)));
     ASSERT_TRUE(control.attach(SgSharedMemory::kReadWrite));
     const SgControlRecord fresh = SgControlRecord::fresh();
     std::memcpy(control.data(), &fresh, sizeof fresh);
-    auto take = [&](SgModelerMessage &code) {
-        if (!control.tryLock(25))
-            return false;
-        auto *record = reinterpret_cast<SgControlRecord *>(control.data());
-        const bool waiting = record->toHostFlag == 0;
-        if (waiting) {
-            code = SgModelerMessage(record->toHostCode);
-            record->toHostFlag = 1;
+    auto *record = reinterpret_cast<SgControlRecord *>(control.data());
+    // The modeler's waiting message (NoMessage when none waits), taken under the lock.
+    auto take = [&] {
+        auto code = SgModelerMessage::NoMessage;
+        if (control.tryLock(25)) {
+            if (record->toHostFlag == 0) {
+                code = SgModelerMessage(record->toHostCode);
+                record->toHostFlag = 1;
+            }
+            control.unlock();
         }
-        control.unlock();
-        return waiting;
+        return code;
     };
+    // Posts `code` once the modeler has taken the host's last message.
     auto post = [&](SgHostMessage code) {
         if (!control.tryLock(25))
             return false;
-        auto *record = reinterpret_cast<SgControlRecord *>(control.data());
         const bool free = record->toModelerFlag == 1;
         if (free) {
             record->toModelerCode = sgCodeByte(code);
@@ -258,8 +215,7 @@ TEST(ModelerRelease, AReturnReleasedInFlightComesAgain) {
     QElapsedTimer clock;
     clock.start();
     while (vertices == 0 && clock.elapsed() < 15000) {
-        auto code = SgModelerMessage::NoMessage;
-        if (take(code) && code == SgModelerMessage::GeometryWritten) {
+        if (take() == SgModelerMessage::GeometryWritten) {
             if (++announcements == 1) {
                 // The first announcement is answered by asking the modeler to let go.
                 while (!post(SgHostMessage::SegmentBusy))
@@ -282,12 +238,14 @@ TEST(ModelerRelease, AReturnReleasedInFlightComesAgain) {
         post(SgHostMessage::Idle);
         QThread::msleep(20);
     }
-    EXPECT_EQ(announcements, 2) << readAll(dir.filePath(QStringLiteral("log"))).toStdString();
+    EXPECT_EQ(announcements, 2)
+        << sgTestReadFile(dir.filePath(QStringLiteral("log"))).toStdString();
     EXPECT_EQ(vertices, 3);
     // A signal ends it too, and its log says which.
     modeler.terminate();
     EXPECT_TRUE(modeler.waitForFinished(5000));
-    EXPECT_TRUE(readAll(dir.filePath(QStringLiteral("log"))).contains("quit: signal SIGTERM"));
+    EXPECT_TRUE(
+        sgTestReadFile(dir.filePath(QStringLiteral("log"))).contains("quit: signal SIGTERM"));
     control.detach();
     control.remove(SgSharedMemory::kRemoveUnlocked);
 }

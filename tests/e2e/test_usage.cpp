@@ -14,10 +14,7 @@
 #include "tests/e2e/e2etestbridge.h"
 #include "tests/support/sgtestprocess.h"
 #include "tests/support/sgtestscene.h"
-#include "tests/support/sgtestsegment.h"
 
-#include "exchange/shm/sgcontrolrecord.h"
-#include "exchange/shm/sgsharedmemory.h"
 #include "sgcore/app/sgmessagesink.h"
 #include "sgcore/geometry/sgobject.h"
 #include "sgcore/morph/sgmorph.h"
@@ -30,7 +27,6 @@
 #include <QComboBox>
 #include <QDialog>
 #include <QElapsedTimer>
-#include <QFile>
 #include <QHash>
 #include <QInputDialog>
 #include <QMap>
@@ -39,7 +35,6 @@
 #include <QRandomGenerator>
 #include <QRegularExpression>
 #include <QSet>
-#include <QTemporaryDir>
 #include <QTimer>
 
 #include <atomic>
@@ -49,6 +44,7 @@
 #include <deque>
 #include <functional>
 #include <mutex>
+#include <random>
 #include <thread>
 #include <utility>
 #include <vector>
@@ -116,19 +112,15 @@ const QString kOutside8Bit = QString::fromUtf8("Kiste\u2013A");
 // seen so far.
 class Sitting : public QObject {
 public:
-    explicit Sitting(quint32 seed) : m_random(seed) {
-        qputenv("FACETOR_INSTALL_PATH", FACETOR_BIN_DIR);
-        qputenv("FACETOR_WORKSPACE", m_dir.filePath("workspace").toUtf8());
-        qputenv("FACETOR_LOG", logPath().toUtf8());
-        qputenv("FACETOR_EDIT", "move=0,0.1,0");
-        qputenv("FACETOR_HOST_TIMEOUT", QByteArray::number(kModelerHostTimeoutMs));
-        qputenv("FACETOR_LINK_TIMEOUT", "5000");
+    explicit Sitting(quint32 seed)
+        : m_modeler(FACETOR_BIN_DIR,
+                    {{"FACETOR_EDIT", "move=0,0.1,0"},
+                     {"FACETOR_HOST_TIMEOUT", QByteArray::number(kModelerHostTimeoutMs)},
+                     {"FACETOR_LINK_TIMEOUT", "5000"}}),
+          m_random(seed) {
         reload();
         m_window.show();
-        // Every poll step is timed: the bridge's timer drives a timed call of its poll slot.
-        QObject::disconnect(m_bridge.pollTimer(), &QTimer::timeout, &m_bridge,
-                            &SgFacBridge::checkSharedMap);
-        connect(m_bridge.pollTimer(), &QTimer::timeout, this, &Sitting::timedPoll);
+        m_bridge.timePolls([this](qint64 ns) { timedPoll(ns); });
         connect(&m_heartbeat, &QTimer::timeout, this, &Sitting::beat);
         connect(&m_answerer, &QTimer::timeout, this, &Sitting::answer);
         connect(sgApp->getScene(), &SgScene::nodeRemoved, this, &Sitting::nodeRemoved);
@@ -136,17 +128,7 @@ public:
         m_answerer.start(10);
         m_beatClock.start();
     }
-    ~Sitting() override {
-        for (const char *name : {"FACETOR_INSTALL_PATH", "FACETOR_WORKSPACE", "FACETOR_LOG",
-                                 "FACETOR_EDIT", "FACETOR_HOST_TIMEOUT", "FACETOR_LINK_TIMEOUT"})
-            qunsetenv(name);
-    }
-
-    QString logPath() const { return m_dir.filePath("facetor.log"); }
-    QString modelerLog() const {
-        QFile file(logPath());
-        return file.open(QIODevice::ReadOnly) ? QString::fromUtf8(file.readAll()) : QString();
-    }
+    QString modelerLog() const { return m_modeler.log(); }
     E2eBridge &bridge() { return m_bridge; }
     QStringList &faults() { return m_faults; }
 
@@ -168,19 +150,14 @@ public:
             {"second host", 4, [this] { secondHost(); }},
             {"wait", 12, [this] { sgTestIdle(pick(100, 600)); }},
         };
-        int total = 0;
+        std::vector<int> weights;
         for (const Action &action : actions)
-            total += action.weight;
-        int roll = pick(0, total);
-        for (const Action &action : actions) {
-            if ((roll -= action.weight) >= 0)
-                continue;
-            m_step =
-                QStringLiteral("step %1 (%2)").arg(index).arg(QString::fromLatin1(action.name));
-            ++m_counts[action.name];
-            action.run();
-            break;
-        }
+            weights.push_back(action.weight);
+        const Action &action = actions.at(
+            std::discrete_distribution<size_t>(weights.begin(), weights.end())(m_random));
+        m_step = QStringLiteral("step %1 (%2)").arg(index).arg(QString::fromLatin1(action.name));
+        ++m_counts[action.name];
+        action.run();
         // The driver's own work is not the event loop standing still.
         m_beatClock.restart();
         sgTestIdle(pick(20, 150));
@@ -254,11 +231,8 @@ private:
         return stallMs - machine;
     }
 
-    void timedPoll() {
-        QElapsedTimer clock;
-        clock.start();
-        m_bridge.checkSharedMap();
-        const qint64 ns = clock.nsecsElapsed();
+    // Every poll step is timed.
+    void timedPoll(qint64 ns) {
         m_worstPollNs = std::max(m_worstPollNs, ns);
         if (ns > kBlockLimitMs * 1000000 && ownStall(ns / 1000000) > kBlockLimitMs)
             fault(QStringLiteral("a poll step took %1 ms").arg(double(ns) / 1e6));
@@ -451,7 +425,7 @@ private:
 
     StallWitness m_witness;
     qint64 m_worstMachineStallMs = 0;
-    QTemporaryDir m_dir;
+    SgTestModeler m_modeler;
     QRandomGenerator m_random;
     SgAppWindow m_window;
     E2eBridge m_bridge;
@@ -497,14 +471,7 @@ TEST(UsageTest, ASittingKeepsTheLinkWholeAndTheSceneSound) {
     SCOPED_TRACE(seed);
     sgApp->getScene()->clear();
     sgApp->getMessageSink()->clear();
-    // Names that a crashed earlier run left without a holder go when they are opened afresh.
-    for (const char *key : {kSgControlSegmentKey, kSgDataSegmentKey, kSgHostLinkKey}) {
-        SgTestSegment stale(key);
-        if (stale.create(8) && stale.lock())
-            stale.unlock();
-        stale.remove(SgSharedMemory::kRemoveUnlocked);
-    }
-    ASSERT_TRUE(sgTestLeftovers().isEmpty()) << sgTestLeftovers().join(' ').toStdString();
+    ASSERT_TRUE(e2eNothingLeft(0));
     QElapsedTimer clock;
     clock.start();
     QString figures;
@@ -518,8 +485,7 @@ TEST(UsageTest, ASittingKeepsTheLinkWholeAndTheSceneSound) {
                                                 << sitting.modelerLog().right(4000).toStdString();
     }
     sgApp->getScene()->clear();
-    EXPECT_TRUE(sgTestWaitUntil([] { return sgTestLeftovers().isEmpty(); }, 3000))
-        << sgTestLeftovers().join(' ').toStdString();
+    EXPECT_TRUE(e2eNothingLeft(3000));
     std::printf("usage test: seed %u, %d steps in %lld ms; %s\n", seed, steps, clock.elapsed(),
                 qPrintable(figures));
 }
