@@ -15,16 +15,25 @@
 #include <gtest/gtest.h>
 
 #include <deque>
+#include <memory>
 #include <optional>
 
 namespace enginetest {
 
-// Answers the loader's questions without dialogs: each name question takes the next of `names`
-// (nullopt cancels; none left cancels too) and records the name it was asked about; each pose
-// question takes the next of `poses` (none left: false).
+// Meshes start with no reference: `hold` takes one for the holder's life, as an owner does.
+struct Unref {
+    void operator()(SgRefCountedItem *item) const { item->unref(); }
+};
+template <typename Mesh> std::unique_ptr<Mesh, Unref> hold(Mesh *mesh) {
+    mesh->ref();
+    return std::unique_ptr<Mesh, Unref>(mesh);
+}
+
+// Answers the loader's name questions without dialogs: each takes the next of `names` (nullopt
+// cancels; none left cancels too) and records the name it was asked about. Pose questions are
+// answered by the host's box (test_reverse).
 struct ScriptedQuestions : SgMorphLoaderQuestions {
     std::deque<std::optional<QString>> names;
-    std::deque<bool> poses;
     QStringList askedAbout;
 
     bool askNewMorphName(const QString &name, QString &newName) override {
@@ -37,13 +46,7 @@ struct ScriptedQuestions : SgMorphLoaderQuestions {
         names.pop_front();
         return true;
     }
-    bool continueWithoutPose(const QString &poseFile, const QString &) override {
-        askedAbout << poseFile;
-        const bool answer = !poses.empty() && poses.front();
-        if (!poses.empty())
-            poses.pop_front();
-        return answer;
-    }
+    bool continueWithoutPose(const QString &, const QString &) override { return false; }
 };
 
 // The per-test application state: the scene emptied and the message sink cleared.

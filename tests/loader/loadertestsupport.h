@@ -17,13 +17,14 @@ inline QStringList rowPaths(const QTreeWidget &list) {
     return paths;
 }
 
-// The setting row labelled `label` below `top` (depth first), or null.
-inline SgMorphSourceItem *findRow(QTreeWidgetItem *top, const QString &label) {
+// The setting row labelled `name`, or with the setting key `name`, below `top` (depth first), or
+// null.
+inline SgMorphSourceItem *findRow(QTreeWidgetItem *top, const QString &name) {
     for (int i = 0; i < top->childCount(); ++i) {
-        QTreeWidgetItem *child = top->child(i);
-        if (child->text(0) == label)
-            return static_cast<SgMorphSourceItem *>(child);
-        if (SgMorphSourceItem *found = findRow(child, label))
+        auto *row = dynamic_cast<SgMorphSourceItem *>(top->child(i));
+        if (row && (row->text(0) == name || row->settingKey() == name))
+            return row;
+        if (SgMorphSourceItem *found = findRow(top->child(i), name))
             return found;
     }
     return nullptr;

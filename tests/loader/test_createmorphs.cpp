@@ -19,7 +19,6 @@
 #include "sharedsource/loaderui/sgmorphsourceboolitem.h"
 #include "tests/support/sgtestscene.h"
 
-#include <QAbstractButton>
 #include <QMessageBox>
 #include <QTemporaryDir>
 
@@ -124,18 +123,11 @@ TEST_F(FigureScene, ModeOneRunsSourcesTopDownOnTheSelectionAndSkipsOnAFailedPose
     third->loader().setPoseFile(dir.filePath("missing.sgs"));
     scene->selectNode(neck);
 
-    QString title;
     {
-        SgTestModalAnswer answer([&](QWidget *w) {
-            auto *box = qobject_cast<QMessageBox *>(w);
-            ASSERT_NE(box, nullptr);
-            title = box->windowTitle();
-            box->button(QMessageBox::No)->click();
-        });
+        SgTestModalAnswer answer(sgTestPressButton(QMessageBox::No));
         list.createMorphs(options, 1, log);
-        EXPECT_TRUE(answer.answered());
+        EXPECT_EQ(answer.titles(), QStringList{"Pose File Error"});
     }
-    EXPECT_EQ(title, "Pose File Error");
     const QString html = log.toHtml();
     EXPECT_FALSE(html.contains("Loading morph third..."));
     EXPECT_LT(html.indexOf("Loading morph second..."), html.indexOf("Loading morph first..."));
@@ -183,37 +175,13 @@ TEST_F(FigureScene, TheInMemorySourceTargetsItsOwnFiguresBones) {
     EXPECT_EQ(lastProgress().total, 0);
 }
 
-TEST_F(FigureScene, NodeRowStartsOnTheSelectedFigureAndFindsBonesByName) {
-    scene->selectNode(head);
-    auto *file = new SgMorphFileItem(&list, "/m/a.obj");
-    SgMorphLoader &loader = file->loader();
-    SgMorphSourceItem *node = findRow(file, "Node:");
-    ASSERT_NE(node, nullptr);
-    EXPECT_EQ(loader.controlNode(), figure);
-    EXPECT_EQ(node->valueText(), "Figure");
-
-    node->setValueText("head");
-    EXPECT_EQ(loader.controlNode(), head);
-    node->setValueText("tail"); // no such bone: the figure itself
-    EXPECT_EQ(loader.controlNode(), figure);
-    node->setValueText("");
-    EXPECT_EQ(node->text(1), "- none -");
-    EXPECT_EQ(loader.controlNode(), figure);
-
-    // Without a selected figure a stored name finds nothing and changes nothing.
-    scene->clearSelection();
-    node->setValueText("head");
-    EXPECT_EQ(loader.controlNode(), figure);
-    auto *other = new SgMorphFileItem(&list, "/m/b.obj");
-    EXPECT_EQ(other->loader().controlNode(), nullptr);
-}
-
-// The group, property and node rows open the property UI's chooser menus.
-TEST_F(FigureScene, GroupPropertyAndNodeRowsChooseFromTheirMenus) {
+// The node row starts on the figure of the selection and finds bones by name; the group,
+// property and node rows open the property UI's chooser menus.
+TEST_F(FigureScene, NodeGroupAndPropertyRowsFollowTheSceneAndTheirMenus) {
     auto *smile = new SgFloatProperty("Smile");
     smile->setPath("Morphs/Face");
     ASSERT_EQ(figure->addProperty(smile), 0);
-    scene->selectNode(figure);
+    scene->selectNode(head);
     auto *file = new SgMorphFileItem(&list, "/m/a.obj");
     SgMorphLoader &loader = file->loader();
     list.show();
@@ -222,6 +190,16 @@ TEST_F(FigureScene, GroupPropertyAndNodeRowsChooseFromTheirMenus) {
     const auto choose = [&](const QString &label, const QString &entry) {
         return editWithPopup(list, row(label), entry);
     };
+    SgMorphSourceItem *node = row("Node:");
+    EXPECT_EQ(loader.controlNode(), figure);
+    EXPECT_EQ(node->valueText(), "Figure");
+    node->setValueText("head");
+    EXPECT_EQ(loader.controlNode(), head);
+    node->setValueText("tail"); // no such bone: the figure itself
+    EXPECT_EQ(loader.controlNode(), figure);
+    node->setValueText("");
+    EXPECT_EQ(node->text(1), "- none -");
+    EXPECT_EQ(loader.controlNode(), figure);
 
     EXPECT_EQ(choose("Property Group:", "Morphs/Face"),
               QStringList({"Create...", "-", "Morphs", "Morphs/Face"}));
@@ -236,12 +214,20 @@ TEST_F(FigureScene, GroupPropertyAndNodeRowsChooseFromTheirMenus) {
 
     EXPECT_EQ(choose("Node:", "box"), QStringList({"Figure", "neck", "head", "box"}));
     EXPECT_EQ(loader.controlNode(), prop);
-    EXPECT_EQ(row("Node:")->text(1), "box");
+    EXPECT_EQ(node->text(1), "box");
+
+    // Without a selected figure a stored name finds nothing and changes nothing.
+    scene->clearSelection();
+    node->setValueText("head");
+    EXPECT_EQ(loader.controlNode(), prop);
+    auto *other = new SgMorphFileItem(&list, "/m/b.obj");
+    EXPECT_EQ(other->loader().controlNode(), nullptr);
 
     // With the control off, the node and property rows open nothing.
-    static_cast<SgMorphSourceBoolItem *>(row("Create Control Property:"))->setValue(false);
+    static_cast<SgMorphSourceBoolItem *>(findRow(file, "Create Control Property:"))
+        ->setValue(false);
     SgTestModalAnswer none(sgTestChooseMenu({"Figure"}), 300);
-    list.showContextMenu(row("Node:"), list.viewport()->mapToGlobal(QPoint(5, 5)), 1);
+    list.showContextMenu(node, list.viewport()->mapToGlobal(QPoint(5, 5)), 1);
     EXPECT_FALSE(none.answered());
     EXPECT_EQ(loader.controlNode(), prop);
 }

@@ -47,20 +47,8 @@ SgTestHandler saveOptions(bool saveObjects, bool relative) {
 
 const QByteArray TriangleObj = "v 0 0 0\nv 1 0 0\nv 0 1 0\nf 1 2 3\n";
 
-// The setting row with `key` below `row` (depth first), or null.
-SgMorphSourceItem *findKey(QTreeWidgetItem *row, const QString &key) {
-    for (int i = 0; i < row->childCount(); ++i) {
-        auto *child = static_cast<SgMorphSourceItem *>(row->child(i));
-        if (child->settingKey() == key)
-            return child;
-        if (SgMorphSourceItem *found = findKey(child, key))
-            return found;
-    }
-    return nullptr;
-}
-
 QString value(QTreeWidgetItem *source, const QString &key) {
-    SgMorphSourceItem *row = findKey(source, key);
+    SgMorphSourceItem *row = findRow(source, key);
     return row ? row->valueText() : QStringLiteral("<missing>");
 }
 
@@ -142,11 +130,12 @@ TEST_F(MorphLoaderDlgTest, ObjectFileOfDefaultsIsByteExact) {
 }
 
 TEST_F(MorphLoaderDlgTest, ProjectPathsRelativeAbsoluteAndNetwork) {
-    sgTestWriteFile(path("proj/a.obj"), TriangleObj);
-    sgTestWriteFile(path("proj-other/b.obj"), TriangleObj);
+    for (const char *name : {"proj/a.obj", "proj/c.obj", "proj-other/b.obj"})
+        sgTestWriteFile(path(name), TriangleObj);
     {
         SgMorphLoaderDlg dialog(nullptr, true, nullptr, nullptr);
-        dialog.sourceList()->addFiles({path("proj-other/b.obj"), path("proj/a.obj")});
+        dialog.sourceList()->addFiles(
+            {path("proj-other/b.obj"), path("proj/c.obj"), path("proj/a.obj")});
         QString warning;
         SgTestModalAnswer script(sgTestPressButton(QMessageBox::NoButton, nullptr, &warning));
         dialog.saveProjectConfiguration(path("proj/set"));
@@ -158,19 +147,27 @@ TEST_F(MorphLoaderDlgTest, ProjectPathsRelativeAbsoluteAndNetwork) {
         QDomDocument project;
         ASSERT_TRUE(project.setContent(sgTestReadFile(path("proj/set.scx"))));
         const QDomNodeList objects = project.elementsByTagName("Object");
-        ASSERT_EQ(objects.size(), 2);
+        ASSERT_EQ(objects.size(), 3);
         EXPECT_EQ(objects.at(0).toElement().attribute("Name"), "a.obj");
         EXPECT_EQ(objects.at(0).toElement().attribute("Path"), "/a.obj");
-        EXPECT_EQ(objects.at(1).toElement().attribute("Path"), path("proj-other/b.obj"));
+        EXPECT_EQ(objects.at(2).toElement().attribute("Path"), path("proj-other/b.obj"));
         EXPECT_TRUE(QFile::exists(path("proj/a.obj.scx")));
     }
-    // The project moved with its geometry loads the moved copy.
+    // The project moved with its geometry loads the moved copy in the saved order, skips
+    // geometry that is gone without a word, and reads the object file beside the geometry.
     sgTestWriteFile(path("copy/set.scx"), sgTestReadFile(path("proj/set.scx")));
     sgTestWriteFile(path("copy/a.obj"), TriangleObj);
+    sgTestWriteFile(path("copy/a.obj.scx"),
+                    "<VarnTargetImporter><FileType Type=\"Object\">"
+                    "<Name Value=\"second\"/></FileType></VarnTargetImporter>");
     SgMorphLoaderDlg dialog(nullptr, true, nullptr, nullptr);
+    SgTestModalAnswer script(QList<SgTestHandler>{});
     dialog.loadConfigurationFile(path("copy/set.scx"), path("copy"));
+    EXPECT_TRUE(script.titles().isEmpty());
     EXPECT_EQ(rowPaths(*dialog.sourceList()),
               (QStringList{path("copy/a.obj"), path("proj-other/b.obj")}));
+    EXPECT_EQ(value(dialog.sourceList()->topLevelItem(0), "Name"), "second");
+    EXPECT_EQ(value(dialog.sourceList()->topLevelItem(1), "Name"), "b");
 
     EXPECT_EQ(SgMorphConfiguration::resolvePath("E:/copy", "/a.obj"), "E:/copy/a.obj");
     EXPECT_EQ(SgMorphConfiguration::resolvePath("E:/copy", "//server/share/y.obj"),
@@ -183,30 +180,6 @@ TEST_F(MorphLoaderDlgTest, ProjectPathsRelativeAbsoluteAndNetwork) {
     sgTestWriteFile(path("copy") + path("proj/a.obj"), TriangleObj);
     EXPECT_EQ(SgMorphConfiguration::resolvePath(path("copy"), path("proj/a.obj")),
               path("copy") + path("proj/a.obj"));
-}
-
-TEST_F(MorphLoaderDlgTest, ProjectLoadsInSavedOrderAndSkipsMissingGeometry) {
-    const QStringList names{"one.obj", "two.obj", "gone.obj", "three.obj"};
-    QByteArray project = "<VarnTargetImporter Version=\"1\"><FileType Type=\"Project\">";
-    for (const QString &name : names) {
-        if (name != "gone.obj")
-            sgTestWriteFile(path(name), TriangleObj);
-        project += "<Object Name=\"" + name.toUtf8() + "\" Path=\"/" + name.toUtf8() + "\"/>";
-    }
-    project += "</FileType></VarnTargetImporter>";
-    sgTestWriteFile(path("set.scx"), project);
-    // The object file of "two" renames its morph.
-    sgTestWriteFile(path("two.obj.scx"),
-                    "<VarnTargetImporter><FileType Type=\"Object\">"
-                    "<Name Value=\"second\"/></FileType></VarnTargetImporter>");
-    SgMorphLoaderDlg dialog(nullptr, true, nullptr, nullptr);
-    SgTestModalAnswer script(QList<SgTestHandler>{});
-    dialog.loadConfigurationFile(path("set.scx"), m_dir.path());
-    EXPECT_TRUE(script.titles().isEmpty());
-    EXPECT_EQ(rowPaths(*dialog.sourceList()),
-              (QStringList{path("one.obj"), path("two.obj"), path("three.obj")}));
-    EXPECT_EQ(value(dialog.sourceList()->topLevelItem(1), "Name"), "second");
-    EXPECT_EQ(value(dialog.sourceList()->topLevelItem(0), "Name"), "one");
 }
 
 TEST_F(MorphLoaderDlgTest, BrokenFilesEndInLoadErrors) {
@@ -256,22 +229,18 @@ TEST_F(MorphLoaderDlgTest, ObjectValuesLoadAsTheRowsRead) {
     SgMorphLoaderDlg dialog(nullptr, true, nullptr, nullptr);
     dialog.sourceList()->addFile(path("head.obj"));
     SgMorphFileItem *source = topSource(dialog);
-    findKey(source, "UpdateOverrideExisting")->setValueText("Deltas Only");
-    findKey(source, "ERCType")->setValueText("3");
+    findRow(source, "UpdateOverrideExisting")->setValueText("Deltas Only");
     sgTestWriteFile(
         path("head.obj.scx"),
         "<VarnTargetImporter Version=\"1\"><FileType Type=\"Object\">"
-        "<CreateControlProperty Value=\"True\"><ERCType Value=\"7\">"
-        "<UseCustom Value=\"true\"/></ERCType></CreateControlProperty>"
         "<ReverseDeformations Value=\"True\"><Pose Value=\"/pose.ds\"/></ReverseDeformations>"
         "</FileType></VarnTargetImporter>");
     SgTestModalAnswer script(QList<SgTestHandler>{});
     dialog.loadConfigurationFile(path("head.obj.scx"), m_dir.path());
-    // The file's geometry was listed already: its settings go to that row, with no warning.
+    // The file's geometry was listed already: its settings go to that row, with no warning;
+    // what the file leaves out goes back to its default.
     EXPECT_TRUE(script.titles().isEmpty());
     ASSERT_EQ(dialog.sourceList()->topLevelItemCount(), 1);
-    EXPECT_EQ(value(source, "ERCType"), "3");
-    EXPECT_EQ(value(source, "UseCustom"), "False");
     EXPECT_EQ(value(source, "UpdateOverrideExisting"), "Make Unique");
     EXPECT_EQ(value(source, "Name"), "");
     EXPECT_EQ(value(source, "ReverseDeformations"), "True");
@@ -303,11 +272,17 @@ TEST_F(MorphLoaderDlgTest, SaveThenLoadReproducesEveryRowAndTheControlProperty) 
                                             {"ApplyAfterJointBinding", "True"},
                                             {"UpdateOverrideExisting", "Deltas and ERC Links"},
                                             {"CleanUp", "False"}})
-            findKey(source, key)->setValueText(text);
+            findRow(source, key)->setValueText(text);
+        // Attributes that must come back exactly: markup in the label, extreme floats.
         auto *property = new SgFloatProperty("smile");
-        property->setLabel("Smile Control");
-        property->setMin(-1.0f);
+        property->setLabel("Smile <Control> & \"more\"");
+        property->setMin(-3.4028235e38f);
         property->setMax(2.0f);
+        property->setDefaultValue(-1.0e-30f);
+        property->setSensitivity(0.0037f);
+        property->setValue(0.1f);
+        property->setDisplayAsPercent(true);
+        property->setCanAnimate(false);
         source->loader().setControlProperty(property);
         property->getAttributes(savedAttributes);
         saved = allValues(source);
@@ -349,7 +324,7 @@ TEST_F(MorphLoaderDlgTest, SaveThenLoadReproducesEveryRowAndTheControlProperty) 
     loaded = topSource(dialog)->loader().controlProperty();
     ASSERT_TRUE(loaded && loaded != existing);
     EXPECT_EQ(loaded->getOwner(), nullptr);
-    EXPECT_EQ(loaded->getLabel(), QString("Smile Control"));
+    EXPECT_EQ(loaded->getLabel(), QString("Smile <Control> & \"more\""));
 }
 
 TEST_F(MorphLoaderDlgTest, SaveOptionsCancelAbsoluteAndWithoutObjects) {

@@ -29,22 +29,6 @@ QLineEdit *openEditor(SgMorphSourceList &list) {
     return nullptr;
 }
 
-bool editorOpen(SgMorphSourceList &list) {
-    return openEditor(list) != nullptr;
-}
-
-// Types `text` into the in-place editor of column 1 of `row` and presses Enter.
-void editInPlace(SgMorphSourceList &list, QTreeWidgetItem *row, const QString &text) {
-    ASSERT_FALSE(editorOpen(list));
-    static_cast<SgMorphSourceItem *>(row)->showEditor(QPoint(), 1);
-    QLineEdit *editor = openEditor(list);
-    ASSERT_NE(editor, nullptr);
-    editor->setText(text);
-    QTest::keyClick(editor, Qt::Key_Return);
-    // The editor hands its text over from the event loop.
-    QCoreApplication::processEvents();
-}
-
 class SourceItems : public ::testing::Test {
 protected:
     QWidget window;
@@ -62,31 +46,43 @@ protected:
         head = new SgMorphFileItem(&list, QStringLiteral("/data/morphs/head.obj"));
         list.expandAll();
     }
+    // Types `text` into the in-place editor of column 1 of `row` and presses Enter, or with
+    // `enter` false moves the focus elsewhere.
+    void editInPlace(QTreeWidgetItem *row, const QString &text, bool enter = true) {
+        ASSERT_EQ(openEditor(list), nullptr);
+        static_cast<SgMorphSourceItem *>(row)->showEditor(QPoint(), 1);
+        QLineEdit *editor = openEditor(list);
+        ASSERT_NE(editor, nullptr);
+        editor->setText(text);
+        if (enter)
+            QTest::keyClick(editor, Qt::Key_Return);
+        else
+            elsewhere.setFocus();
+        // The editor hands its text over from the event loop.
+        QCoreApplication::processEvents();
+    }
 };
 
 TEST_F(SourceItems, CreateControlAndErcTypeSwitchTheirDependents) {
     auto *control = boolRow(head, "Create Control Property:");
     auto *useCustom = boolRow(head, "Use Custom Value:");
-    SgMorphSourceItem *value = findRow(head, "Value:");
     SgMorphSourceItem *erc = findRow(head, "ERC Type: ");
-    const QStringList five = {
-        "ERC Type: ", "Node:", "Property:", "Use Secondary Label:", "Hide Secondary Properties:"};
-
+    // Which dependent rows are enabled, as '1' and '0' in this order.
+    const auto enabled = [&] {
+        QString flags;
+        for (const char *label : {"ERC Type: ", "Node:", "Property:", "Use Secondary Label:",
+                                  "Hide Secondary Properties:", "Use Custom Value:", "Value:"})
+            flags += findRow(head, label)->isEnabled() ? '1' : '0';
+        return flags;
+    };
     editWithPopup(list, control, "no");
     EXPECT_FALSE(head->loader().createControl());
-    for (const QString &label : five)
-        EXPECT_FALSE(findRow(head, label)->isEnabled()) << label.toStdString();
-    EXPECT_FALSE(useCustom->isEnabled());
-    EXPECT_FALSE(value->isEnabled());
-
+    EXPECT_EQ(enabled(), "0000000");
     // Back on with "ERC[DeltaAdd]": "Use Custom Value:" again, "Value:" only once it is yes.
     editWithPopup(list, control, "yes");
-    for (const QString &label : five)
-        EXPECT_TRUE(findRow(head, label)->isEnabled()) << label.toStdString();
-    EXPECT_TRUE(useCustom->isEnabled());
-    EXPECT_FALSE(value->isEnabled());
+    EXPECT_EQ(enabled(), "1111110");
     editWithPopup(list, useCustom, "yes");
-    EXPECT_TRUE(value->isEnabled());
+    EXPECT_EQ(enabled(), "1111111");
     EXPECT_TRUE(head->loader().useCustomValue());
 
     // Every other type turns the custom value off and disables both rows, also after the
@@ -95,20 +91,17 @@ TEST_F(SourceItems, CreateControlAndErcTypeSwitchTheirDependents) {
                                "ERC[Multiply]", "ERC[Subtract]",   "ERC[Add]"};
     for (int code = 1; code < 6; ++code) {
         editWithPopup(list, useCustom, "yes");
-        const QStringList seen = editWithPopup(list, erc, types[code]);
-        EXPECT_EQ(seen, types);
+        EXPECT_EQ(editWithPopup(list, erc, types[code]), types);
         EXPECT_EQ(head->loader().ercType(), code);
         EXPECT_EQ(erc->valueText(), QString::number(code));
         EXPECT_EQ(useCustom->text(1), "no");
         EXPECT_FALSE(head->loader().useCustomValue());
         editWithPopup(list, control, "no");
         editWithPopup(list, control, "yes");
-        EXPECT_FALSE(useCustom->isEnabled()) << code;
-        EXPECT_FALSE(value->isEnabled()) << code;
+        EXPECT_EQ(enabled(), "1111100") << code;
         editWithPopup(list, erc, "ERC[DeltaAdd]");
-        EXPECT_TRUE(useCustom->isEnabled());
+        EXPECT_EQ(enabled(), "1111110") << code;
         EXPECT_EQ(useCustom->text(1), "no");
-        EXPECT_FALSE(value->isEnabled());
     }
 
     // A dismissed popup changes nothing; the ERC editor opens even while the row is disabled.
@@ -121,24 +114,20 @@ TEST_F(SourceItems, CreateControlAndErcTypeSwitchTheirDependents) {
     EXPECT_EQ(control->text(1), "no");
 }
 
-TEST_F(SourceItems, ReverseDeformationsEnablesThePoseRowAndItsDrops) {
+TEST_F(SourceItems, ReverseDeformationsEnablesThePoseRow) {
     auto *reverse = boolRow(head, "Reverse Deformations:");
     auto *pose = static_cast<SgMorphPoseItem *>(findRow(head, "Pose:"));
     editWithPopup(list, reverse, "yes");
     EXPECT_TRUE(head->loader().reverseModifiers());
-    EXPECT_TRUE(pose->isEnabled());
-    EXPECT_TRUE(pose->dropEnabled());
-    EXPECT_TRUE(pose->dragEnabled());
+    EXPECT_TRUE(pose->isEnabled() && pose->dragEnabled());
     editWithPopup(list, reverse, "no");
     EXPECT_FALSE(pose->isEnabled());
-    EXPECT_FALSE(pose->dropEnabled());
 
     // "None" in the pose popup clears a chosen pose.
     editWithPopup(list, reverse, "yes");
     pose->setValueText("/poses/sit.sgs");
     EXPECT_EQ(head->loader().poseFile(), "/poses/sit.sgs");
-    const QStringList seen = editWithPopup(list, pose, "None");
-    EXPECT_EQ(seen, QStringList({"None", "-", "Browse..."}));
+    EXPECT_EQ(editWithPopup(list, pose, "None"), QStringList({"None", "-", "Browse..."}));
     EXPECT_EQ(pose->text(1), "None");
     EXPECT_EQ(head->loader().poseFile(), "None");
 }
@@ -166,8 +155,6 @@ TEST_F(SourceItems, UnknownAndOutOfRangeTextsFallBackToDefaults) {
     value->setValueText("nan");
     EXPECT_FLOAT_EQ(loader.customValue(), 0.0f);
     EXPECT_EQ(value->text(1), "0");
-    findRow(head, "Node:")->setValueText("");
-    EXPECT_EQ(findRow(head, "Node:")->text(1), "- none -");
     // A bool row reads only "True" as yes.
     reverse->setValueText("true");
     EXPECT_FALSE(loader.reverseModifiers());
@@ -182,50 +169,44 @@ TEST_F(SourceItems, UnknownAndOutOfRangeTextsFallBackToDefaults) {
 TEST_F(SourceItems, InPlaceEditsFollowTheMorphNameAndRevertBadNumbers) {
     auto *label = findRow(head, "Label:");
     boolRow(head, "Use Secondary Label:")->setValue(true);
-    editInPlace(list, findRow(head, "Name:"), "smile");
+    editInPlace(findRow(head, "Name:"), "smile");
     EXPECT_EQ(head->loader().morphName(), "smile");
     EXPECT_EQ(label->text(1), "smile");
     EXPECT_EQ(findRow(head, "Property:")->text(1), "smile");
 
     // Leaving the label editor on the shown name keeps it following the name.
-    editInPlace(list, label, "smile");
+    editInPlace(label, "smile");
     EXPECT_EQ(head->loader().customLabel(), "");
-    editInPlace(list, findRow(head, "Name:"), "grin");
+    editInPlace(findRow(head, "Name:"), "grin");
     EXPECT_EQ(label->text(1), "grin");
 
-    editInPlace(list, label, "Big Grin");
+    editInPlace(label, "Big Grin");
     EXPECT_EQ(head->loader().customLabel(), "Big Grin");
-    editInPlace(list, findRow(head, "Name:"), "grin2");
+    editInPlace(findRow(head, "Name:"), "grin2");
     EXPECT_EQ(label->text(1), "Big Grin");
-    editInPlace(list, label, "");
+    editInPlace(label, "");
     EXPECT_EQ(head->loader().customLabel(), "");
     EXPECT_EQ(label->text(1), "grin2");
 
     auto *value = findRow(head, "Value:");
     boolRow(head, "Use Custom Value:")->setValue(true);
-    editInPlace(list, value, "2.5");
+    editInPlace(value, "2.5");
     EXPECT_FLOAT_EQ(head->loader().customValue(), 2.5f);
-    editInPlace(list, value, "abc");
+    editInPlace(value, "abc");
     EXPECT_EQ(value->text(1), "2.5");
     EXPECT_FLOAT_EQ(head->loader().customValue(), 2.5f);
 
     // The edit is also taken over when the editor loses focus.
-    ASSERT_FALSE(editorOpen(list));
-    static_cast<SgMorphSourceItem *>(value)->showEditor(QPoint(), 1);
-    QLineEdit *editor = openEditor(list);
-    ASSERT_NE(editor, nullptr);
-    editor->setText("0.5");
-    elsewhere.setFocus();
-    QCoreApplication::processEvents();
+    editInPlace(value, "0.5", false);
     EXPECT_FLOAT_EQ(head->loader().customValue(), 0.5f);
-    EXPECT_FALSE(editorOpen(list));
+    EXPECT_EQ(openEditor(list), nullptr);
 
     // Column 0 is never edited, and "Label:" only while "Use Secondary Label:" is yes.
     static_cast<SgMorphSourceItem *>(findRow(head, "Name:"))->showEditor(QPoint(), 0);
-    EXPECT_FALSE(editorOpen(list));
+    EXPECT_EQ(openEditor(list), nullptr);
     boolRow(head, "Use Secondary Label:")->setValue(false);
     label->showEditor(QPoint(), 1);
-    EXPECT_FALSE(editorOpen(list));
+    EXPECT_EQ(openEditor(list), nullptr);
 
     // A press on the current in-place row opens its editor; the first press only makes it
     // current.
@@ -233,24 +214,18 @@ TEST_F(SourceItems, InPlaceEditsFollowTheMorphNameAndRevertBadNumbers) {
     list.setCurrentItem(head);
     const QPoint at(list.columnViewportPosition(1) + 5, list.visualItemRect(name).center().y());
     QTest::mouseClick(list.viewport(), Qt::LeftButton, {}, at);
-    EXPECT_FALSE(editorOpen(list));
+    EXPECT_EQ(openEditor(list), nullptr);
     QTest::mouseClick(list.viewport(), Qt::LeftButton, {}, at);
-    EXPECT_TRUE(editorOpen(list));
+    EXPECT_NE(openEditor(list), nullptr);
 }
 
-// A file row starts on plain geometry with the export rows off; the in-memory row of a
-// returned mesh starts on a welded export with reverse deformations, expanded.
-TEST_F(SourceItems, FileAndMeshRowsStartWithTheirPresets) {
-    EXPECT_EQ(head->loader().morphName(), "head");
-    EXPECT_FALSE(head->loader().scenaraExported() || head->loader().reverseModifiers());
-    for (const char *label : {"Ignored Invisible Nodes:", "Used Bone Welds:", "Value:", "Pose:"})
-        EXPECT_FALSE(findRow(head, label)->isEnabled()) << label;
-    EXPECT_FALSE(findRow(head, "Pose:")->dropEnabled());
-
+// The in-memory row of a returned mesh starts on a welded export with reverse deformations,
+// expanded, so that a returned figure maps onto its bones.
+TEST_F(SourceItems, TheMeshRowStartsOnAWeldedExport) {
     auto *item = list.addMesh(nullptr, nullptr);
-    EXPECT_EQ(item->loader().morphName(), "FacMorph");
-    EXPECT_TRUE(item->isExpanded());
     const SgMorphLoader &loader = item->loader();
+    EXPECT_EQ(loader.morphName(), "FacMorph");
+    EXPECT_TRUE(item->isExpanded());
     EXPECT_TRUE(loader.scenaraExported() && loader.weldedGeometry() &&
                 loader.removedUnusedVertices() && loader.reverseModifiers());
     EXPECT_FALSE(loader.ignoredInvisibleNodes());

@@ -136,72 +136,55 @@ TEST_F(SourceList, ContextMenusForwardToRowsAndOfferSavingOnFileRows) {
     }
     list.showContextMenu(nullptr, at, 0);
 
-    // A right click on a setting row's value opens its editor.
+    // A right click on a setting row's value, or the context-menu key on the current row,
+    // opens the row's editor.
+    const auto contextMenu = [&](QContextMenuEvent::Reason reason, QPoint at) {
+        SgTestModalAnswer answer(sgTestChooseMenu({"yes"}));
+        QContextMenuEvent event(reason, at, list.viewport()->mapToGlobal(at));
+        QCoreApplication::sendEvent(list.viewport(), &event);
+        EXPECT_TRUE(answer.answered());
+    };
     list.expandAll();
-    QTreeWidgetItem *reverse = findRow(file, "Reverse Deformations:");
-    const QRect rect = list.visualItemRect(reverse);
-    const QPoint click(list.columnViewportPosition(1) + 5, rect.center().y());
-    {
-        SgTestModalAnswer answer(sgTestChooseMenu({"yes"}));
-        QContextMenuEvent event(QContextMenuEvent::Mouse, click,
-                                list.viewport()->mapToGlobal(click));
-        QCoreApplication::sendEvent(list.viewport(), &event);
-        EXPECT_TRUE(answer.answered());
-    }
+    const QRect rect = list.visualItemRect(findRow(file, "Reverse Deformations:"));
+    contextMenu(QContextMenuEvent::Mouse,
+                QPoint(list.columnViewportPosition(1) + 5, rect.center().y()));
     EXPECT_TRUE(static_cast<SgMorphFileItem *>(file)->loader().reverseModifiers());
-
-    // The context-menu key opens the editor of the current row.
     list.setCurrentItem(findRow(file, "Apply After Joint Binding:"));
-    {
-        SgTestModalAnswer answer(sgTestChooseMenu({"yes"}));
-        QContextMenuEvent event(QContextMenuEvent::Keyboard, QPoint(1, 1),
-                                list.viewport()->mapToGlobal(QPoint(1, 1)));
-        QCoreApplication::sendEvent(list.viewport(), &event);
-        EXPECT_TRUE(answer.answered());
-    }
+    contextMenu(QContextMenuEvent::Keyboard, QPoint(1, 1));
     EXPECT_TRUE(static_cast<SgMorphFileItem *>(file)->loader().applyAfterJoint());
 }
 
 TEST_F(SourceList, DropsAddGeometryFilesAndSetPoses) {
-    QString title, text;
-    const QPoint empty(10, list.viewport()->height() - 5);
-    {
-        SgTestModalAnswer answer(sgTestPressButton(QMessageBox::NoButton, &title, &text));
-        drop(list, {"/m/a.obj", "/m/notes.txt", "/m/b.obj", "/m/c.png"}, empty);
-        EXPECT_TRUE(answer.answered());
-    }
+    // Drops `files` at `point`; returns the text of the box that came, or "" when none did.
+    const auto dropAt = [&](const QStringList &files, QPoint point) {
+        QString text;
+        SgTestModalAnswer answer(sgTestPressButton(QMessageBox::NoButton, nullptr, &text), 300);
+        drop(list, files, point);
+        return answer.titles().join('|') + ": " + text;
+    };
+    const QString failed = "Error loading files: Some Files dropped in the Morph Loader could "
+                           "not be imported";
+    EXPECT_EQ(dropAt({"/m/a.obj", "/m/notes.txt", "/m/b.obj", "/m/c.png"},
+                     QPoint(10, list.viewport()->height() - 5)),
+              failed + ":\n\t/m/notes.txt\n\t/m/c.png");
     EXPECT_EQ(rowPaths(list), QStringList({"/m/b.obj", "/m/a.obj"}));
-    EXPECT_EQ(title, "Error loading files");
-    EXPECT_EQ(text, "Some Files dropped in the Morph Loader could not be imported:"
-                    "\n\t/m/notes.txt\n\t/m/c.png");
 
-    // A pose file onto the enabled "Pose:" row sets the pose and adds nothing.
+    // A pose file onto the enabled "Pose:" row sets the pose and adds nothing; while the row
+    // is not drop-enabled the list reports it.
     QTreeWidgetItem *file = list.topLevelItem(0);
-    auto *reverse = static_cast<SgMorphSourceBoolItem *>(findRow(file, "Reverse Deformations:"));
     auto *pose = static_cast<SgMorphPoseItem *>(findRow(file, "Pose:"));
     const QString script = "/poses/sit." + poseExtension();
     list.expandAll();
-    {
-        SgTestModalAnswer answer(sgTestPressButton(QMessageBox::NoButton, &title, &text), 300);
-        drop(list, {script}, list.visualItemRect(pose).center());
-        EXPECT_TRUE(answer.answered()); // not drop-enabled yet: the list reports it
-    }
+    const QPoint onPose = list.visualItemRect(pose).center();
+    EXPECT_EQ(dropAt({script}, onPose), failed + ":\n\t" + script);
     EXPECT_EQ(pose->text(1), "None");
-    reverse->setValue(true);
-    drop(list, {script}, list.visualItemRect(pose).center());
+    static_cast<SgMorphSourceBoolItem *>(findRow(file, "Reverse Deformations:"))->setValue(true);
+    EXPECT_EQ(dropAt({script}, onPose), ": ");
     EXPECT_EQ(pose->text(1), script);
     EXPECT_EQ(static_cast<SgMorphFileItem *>(file)->loader().poseFile(), script);
-    EXPECT_EQ(list.topLevelItemCount(), 2);
 
     // Anything else onto the pose row is refused with the pose kept.
-    {
-        SgTestModalAnswer answer(sgTestPressButton(QMessageBox::NoButton, &title, &text));
-        drop(list, {"/m/d.obj"}, list.visualItemRect(pose).center());
-        EXPECT_TRUE(answer.answered());
-    }
-    EXPECT_EQ(title, "Error loading files");
-    EXPECT_EQ(text, "Some Files dropped in the Morph Loader could not be imported as Pose files:"
-                    "\n\t/m/d.obj");
+    EXPECT_EQ(dropAt({"/m/d.obj"}, onPose), failed + " as Pose files:\n\t/m/d.obj");
     EXPECT_EQ(pose->text(1), script);
     EXPECT_EQ(list.topLevelItemCount(), 2);
 }

@@ -93,30 +93,6 @@ protected:
 
 const QString Header = "Could not create properties for the following reasons:\n";
 
-TEST_F(CreatePropertyDialog, AfterJointFollowsMorphAndTheTitleComesFirst) {
-    auto dialog = makeDialog();
-    dialog->show();
-    // "Create morph after joint" follows "Create as empty morph" without being unchecked.
-    auto *morph = child<QCheckBox>(*dialog, "SgCreateAsMorphOption");
-    auto *afterJoint = child<QCheckBox>(*dialog, "SgCreateAfterJointOption");
-    EXPECT_FALSE(afterJoint->isEnabled());
-    afterJoint->click();
-    EXPECT_FALSE(afterJoint->isChecked());
-    morph->setChecked(true);
-    afterJoint->click();
-    EXPECT_TRUE(afterJoint->isChecked());
-    morph->setChecked(false);
-    EXPECT_FALSE(afterJoint->isEnabled());
-    EXPECT_TRUE(afterJoint->isChecked());
-
-    // The title is there from the start, so a dialog run with exec() has it too.
-    auto single = std::make_unique<Dlg>(nullptr, "single", true, Dlg::FloatType, false, true);
-    EXPECT_EQ(single->windowTitle(), "Create Float Property");
-    single->show();
-    EXPECT_EQ(single->windowTitle(), "Create Float Property");
-    EXPECT_FALSE(child<QWidget>(*single, "SgPropTypeBox")->isVisible());
-}
-
 TEST_F(CreatePropertyDialog, ValidationListsEveryFailedCheckInOrder) {
     SgNode *node = addNode("body");
     const QString range = "Min is greater than Max", value = "Value is not within limits",
@@ -181,25 +157,6 @@ TEST_F(CreatePropertyDialog, ValidationListsEveryFailedCheckInOrder) {
     EXPECT_FALSE(created->isClamped());
 }
 
-TEST_F(CreatePropertyDialog, IntMaxSliderReachesTheHostLimitWithoutTypedText) {
-    SgNode *node = addNode("body");
-    auto dialog = makeDialog(Dlg::IntType);
-    dialog->show();
-    dialog->setCreationNode(node);
-    setNames(*dialog, "many", "Many");
-    setInt(*dialog, "SgIntMinAttrib", 2);
-    // The Max slider takes no typed text, yet reaches the host's default limit of 100 (its span
-    // starts at -1000).
-    child<QSlider>(*dialog, "SgIntMaxAttribSlider")->setValue(100 - -1000);
-    EXPECT_EQ(child<SgIntSlider>(*dialog, "SgIntMaxAttrib")->getValue(), 100);
-    EXPECT_EQ(child<SgIntSlider>(*dialog, "SgIntMinAttrib")->getValue(), 2); // untouched
-    setInt(*dialog, "SgIntVal", 50);
-    setInt(*dialog, "SgDefaultIntVal", 2);
-    clickCreate(*dialog, false);
-    ASSERT_EQ(node->getPropertyCount(), 1);
-    EXPECT_EQ(dynamic_cast<SgIntProperty *>(node->getProperty(0))->getMax(), 100.0f);
-}
-
 TEST_F(CreatePropertyDialog, EachTypeCreatesItsPropertyFromTheDialogsValues) {
     SgNode *first = addNode("first");
     auto *figure = new SgSkeleton("figure");
@@ -210,14 +167,12 @@ TEST_F(CreatePropertyDialog, EachTypeCreatesItsPropertyFromTheDialogsValues) {
     setNames(*dialog, " smile ", "Smile");
     setOn(*dialog, "SgPropertyHiddenAttrib", true);
     setOn(*dialog, "SgPropertyLockedAttrib", true);
-    setOn(*dialog, "SgPropertyAnimationAttrib", false);
 
     setFloat(*dialog, "SgFloatMinAttrib", -2.0f);
     setFloat(*dialog, "SgFloatMaxAttrib", 3.0f);
     setFloat(*dialog, "SgFloatVal", 0.5f);
     setFloat(*dialog, "SgDefaultFloatVal", 0.25f);
     setFloat(*dialog, "SgFloatSensitivityAttrib", 0.125f);
-    setOn(*dialog, "SgDisplayAsPercentAttrib", false);
     setOn(*dialog, "SgObeyLimitsAttrib", false);
     std::unique_ptr<SgProperty> property(dialog->createProperty());
     auto *floatProperty = dynamic_cast<SgFloatProperty *>(property.get());
@@ -272,6 +227,16 @@ TEST_F(CreatePropertyDialog, EachTypeCreatesItsPropertyFromTheDialogsValues) {
     EXPECT_TRUE(numericNode->getMustHaveNode());
     EXPECT_EQ(numericNode->getSensitivity(), 0.125f);
     EXPECT_EQ(numericNode->getMin(), -2.0f);
+
+    // The int Max slider takes no typed text, yet reaches the host's default limit of 100 (its
+    // span starts at -1000) without moving Min.
+    chooseType(*dialog, Dlg::IntType);
+    setInt(*dialog, "SgIntMinAttrib", 2);
+    child<QSlider>(*dialog, "SgIntMaxAttribSlider")->setValue(100 - -1000);
+    EXPECT_EQ(child<SgIntSlider>(*dialog, "SgIntMaxAttrib")->getValue(), 100);
+    EXPECT_EQ(child<SgIntSlider>(*dialog, "SgIntMinAttrib")->getValue(), 2);
+    property.reset(dialog->createProperty());
+    EXPECT_EQ(dynamic_cast<SgIntProperty *>(property.get())->getMax(), 100.0f);
 }
 
 TEST_F(CreatePropertyDialog, CreatesOnEveryNodeAndWarnsForARefusingOne) {
@@ -317,33 +282,53 @@ TEST_F(CreatePropertyDialog, EmptyMorphGoesFirstOrAfterTheJoint) {
     SgNode *withoutObject = addNode("withoutObject");
     auto dialog = makeDialog();
     dialog->show();
+    // "Create morph after joint" follows "Create as empty morph" without being unchecked.
+    auto *morph = child<QCheckBox>(*dialog, "SgCreateAsMorphOption");
+    auto *afterJoint = child<QCheckBox>(*dialog, "SgCreateAfterJointOption");
+    EXPECT_FALSE(afterJoint->isEnabled());
+    afterJoint->click();
+    EXPECT_FALSE(afterJoint->isChecked());
+    morph->setChecked(true);
+    afterJoint->click();
+    EXPECT_TRUE(afterJoint->isChecked());
+    morph->setChecked(false);
+    EXPECT_FALSE(afterJoint->isEnabled());
+    EXPECT_TRUE(afterJoint->isChecked());
+
+    // Before the joint: first in the stack; an object is made where there is none.
+    morph->setChecked(true);
+    afterJoint->click();
     SgNodeList nodes{withObject, withoutObject};
     dialog->setCreationNodes(nodes);
     setNames(*dialog, "bulge", "Bulge");
     setFloat(*dialog, "SgFloatMaxAttrib", 2.0f);
-    child<QCheckBox>(*dialog, "SgCreateAsMorphOption")->setChecked(true);
     clickCreate(*dialog, false);
     ASSERT_NE(withoutObject->getObject(), nullptr);
-    auto *morph = dynamic_cast<SgMorph *>(withObject->getObject()->getModifier(0));
-    ASSERT_NE(morph, nullptr);
-    EXPECT_EQ(morph->getName(), "bulge");
-    EXPECT_EQ(morph->getValueChannel()->getMax(), 2.0f);
-    EXPECT_EQ(morph->getValueChannel()->getLabel(), "Bulge");
-    EXPECT_EQ(morph->getValueChannel()->getName(), "bulge"); // named by the morph, not the dialog
+    auto *created = dynamic_cast<SgMorph *>(withObject->getObject()->getModifier(0));
+    ASSERT_NE(created, nullptr);
+    EXPECT_EQ(created->getName(), "bulge");
+    EXPECT_EQ(created->getValueChannel()->getMax(), 2.0f);
+    EXPECT_EQ(created->getValueChannel()->getLabel(), "Bulge");
+    EXPECT_EQ(created->getValueChannel()->getName(), "bulge"); // named by the morph
     EXPECT_EQ(withObject->getPropertyCount(), 0);
     EXPECT_EQ(withoutObject->getObject()->getModifierCount(), 1);
 
     // After the joint: appended to the stack.
-    auto after = makeDialog();
-    after->show();
-    after->setCreationNode(withObject);
-    setNames(*after, "late", "Late");
-    child<QCheckBox>(*after, "SgCreateAsMorphOption")->setChecked(true);
-    child<QCheckBox>(*after, "SgCreateAfterJointOption")->setChecked(true);
-    clickCreate(*after, false);
+    dialog->show();
+    dialog->setCreationNode(withObject);
+    setNames(*dialog, "late", "Late");
+    afterJoint->click();
+    clickCreate(*dialog, false);
     SgObject *object = withObject->getObject();
     ASSERT_EQ(object->getModifierCount(), 3);
     EXPECT_EQ(object->getModifier(2)->getName(), "late");
+
+    // A single-type dialog has its title from the start, so a dialog run with exec() has it
+    // too, and offers no type box.
+    Dlg single(nullptr, "single", true, Dlg::FloatType, false, true);
+    EXPECT_EQ(single.windowTitle(), "Create Float Property");
+    single.show();
+    EXPECT_FALSE(child<QWidget>(single, "SgPropTypeBox")->isVisible());
 }
 
 TEST_F(CreatePropertyDialog, PathDefaultsAndLabelAutoFill) {
@@ -404,8 +389,6 @@ public:
         : m_dialog(dialog), m_list(dialog.findChild<QTreeWidget *>("SgEnumAttrib")),
           m_value(dialog.findChild<SgEnumSlider *>("SgEnumAttrib")),
           m_default(dialog.findChild<SgEnumSlider *>("SgDefaultEnumAttrib")) {}
-
-    QTreeWidget *list() const { return m_list; }
 
     void doubleClick(int row, int column) {
         const QModelIndex index = m_list->model()->index(row, column);
@@ -506,10 +489,13 @@ TEST_F(CreatePropertyDialog, EnumEditorKeepsRowsAndSlidersInStep) {
     editor.expect({"0:b", "1:A", "2:C"}, __LINE__);
     EXPECT_EQ(editor.currentLabel(), "b");
 
-    // After a removal the rows below are renumbered, so later edits reach the right items.
+    // After a removal the rows below are renumbered, so later edits reach the right items, and
+    // the sliders' current item moves down with its index.
+    editor.defaultSlider()->setCurrentIndex(2);
     editor.select(0);
     editor.press("SgDeleteEnumDownButton");
     editor.expect({"0:A", "1:C"}, __LINE__);
+    EXPECT_EQ(editor.defaultSlider()->currentIndex(), 1);
     ASSERT_TRUE(editor.type(1, "Z"));
     editor.expect({"0:A", "1:Z"}, __LINE__);
     ASSERT_TRUE(editor.type(2, "D"));
