@@ -1,15 +1,12 @@
-// The host's containers: order kept through appends and removals, and misuse that warns (naming
-// the header and line) and leaves the container as it was.
+// The host's array that the bridge keeps its send list in: order kept through appends and
+// removals, and misuse that warns (naming the header and line) and leaves the array as it was.
 #include "sgcore/containers/sgtarray.h"
-#include "sgcore/containers/sgtsimplearray.h"
-#include "sgcore/containers/sgtsortedarray.h"
-#include "sgcore/containers/sgtstack.h"
 
 #include <QRegularExpression>
 #include <QStringList>
 #include <gtest/gtest.h>
 
-#include <climits>
+#include <vector>
 
 namespace {
 
@@ -46,6 +43,10 @@ private:
     QtMessageHandler m_previous = nullptr;
 };
 
+std::vector<int> items(const SgTArray<int> &array) {
+    return std::vector<int>(array.begin(), array.end());
+}
+
 } // namespace
 
 TEST(SgTArray, KeepsOrderAndRefusesMisuse) {
@@ -58,13 +59,9 @@ TEST(SgTArray, KeepsOrderAndRefusesMisuse) {
     EXPECT_TRUE(array.removeByIndex(0, 1));
     EXPECT_TRUE(array.removeByIndex(5, 3));
     EXPECT_TRUE(array.removeByIndex(15, 1));
-    ASSERT_EQ(array.count(), 15);
-    EXPECT_EQ(array[0], 10);
-    EXPECT_EQ(array[4], 50);
-    EXPECT_EQ(array[5], 90);
-    EXPECT_EQ(array[14], 180);
     EXPECT_EQ(array.addSpace(3), 15);
-    EXPECT_EQ(array[17], 0);
+    EXPECT_EQ(items(array), (std::vector<int>{10, 20, 30, 40, 50, 90, 100, 110, 120, 130, 140, 150,
+                                              160, 170, 180, 0, 0, 0}));
     capture.expectOne("sgtarray.h", QString());
 
     SgTArray<int> pair;
@@ -82,57 +79,5 @@ TEST(SgTArray, KeepsOrderAndRefusesMisuse) {
                       "Too many items specified for removal in SgTArray::removeByIndex()");
     EXPECT_EQ(pair.addSpace(-4), -1);
     capture.expectOne("sgtarray.h", "Invalid size '-4' passed to SgTArray::addSpace()");
-    ASSERT_EQ(pair.count(), 2);
-    EXPECT_EQ(pair[0], 1);
-    EXPECT_EQ(pair[1], 2);
-}
-
-TEST(SgTSortedAndSimpleArrays, KeepOrderFindAndWarn) {
-    WarningCapture capture;
-    SgTSortedArray<int> sorted;
-    for (int value : {5, 1, 9, 3, 5, 7})
-        sorted.add(value);
-    ASSERT_EQ(sorted.count(), 6);
-    const int expected[] = {1, 3, 5, 5, 7, 9};
-    for (int i = 0; i < 6; ++i)
-        EXPECT_EQ(sorted[i], expected[i]);
-    EXPECT_EQ(sorted.find(5), 2);
-    EXPECT_EQ(sorted.find(4), -1);
-    EXPECT_TRUE(sorted.remove(5));
-    EXPECT_EQ(sorted.find(5), 2);
-    EXPECT_FALSE(sorted.removeByIndex(3, 5));
-    capture.expectOne("sgtsortedarray.h", QString());
-    EXPECT_EQ(sorted[5], 0);
-    capture.expectOne("sgtsortedarray.h", "Index out of range in SgTSortedArray::operator[]");
-
-    SgTSimpleArray<float> values(3);
-    values[1] = 2.5f;
-    EXPECT_EQ(values.append(4.0f), 3);
-    EXPECT_EQ(values.find(2.5f), 1);
-    capture.expectOne("sgtsimplearray.h", QString());
-    values[4] = 1.0f;
-    capture.expectOne("sgtsimplearray.h", "Illegal array index in SgTSimpleArray::operator[]");
-    EXPECT_EQ(values.count(), 4);
-    EXPECT_EQ(values[3], 4.0f);
-}
-
-TEST(SgTStack, PushPopAndMisuse) {
-    WarningCapture capture;
-    SgTStack<int> stack(4);
-    for (int i = 0; i < 10; ++i)
-        EXPECT_TRUE(stack.push(i));
-    EXPECT_EQ(stack.top(), 9);
-    for (int i = 9; i >= 0; --i)
-        EXPECT_EQ(stack.pop(), i);
-    capture.expectOne("sgtstack.h", QString());
-    EXPECT_EQ(stack.pop(), 0);
-    capture.expectOne("sgtstack.h", "Empty stack in SgTStack::pop()");
-
-    struct Big {
-        char bytes[1 << 20];
-    };
-    SgTStack<Big> huge(INT_MAX);
-    EXPECT_FALSE(huge.addBlocks(INT_MAX));
-    capture.expectOne("sgtstack.h", "Out of memory in SgTStack::addBlocks");
-    EXPECT_TRUE(huge.isEmpty());
+    EXPECT_EQ(items(pair), (std::vector<int>{1, 2}));
 }

@@ -26,20 +26,6 @@ using namespace exchangetest;
 
 namespace {
 
-class ExchangeReaderTest : public ::testing::Test {
-protected:
-    void SetUp() override { clearLog(); }
-};
-
-std::unique_ptr<SgPolyShape> read(const QByteArray &record, QString *trailer = nullptr) {
-    QString text;
-    SgExchangeReader reader(record.constData(), size_t(record.size()));
-    std::unique_ptr<SgPolyShape> shape(reader.readShape(text));
-    if (trailer)
-        *trailer = text;
-    return shape;
-}
-
 SgDefaultMaterial *materialAt(const SgShape &shape, int index) {
     return dynamic_cast<SgDefaultMaterial *>(shape.getMaterial(index));
 }
@@ -70,7 +56,7 @@ std::vector<Facet> facetsByMaterial(const SgPolyMesh &mesh) {
 
 } // namespace
 
-TEST_F(ExchangeReaderTest, ReturnedRecordBecomesAShape) {
+TEST(ExchangeReaderTest, ReturnedRecordBecomesAShape) {
     SgPolyMesh *mesh = sgTestMesh({{1, 2, 3}, {0, 0, 0}, {1, 0, 0}, {0, 1, 0}, {1, 1, 0}},
                                   {{0.5f, 0.25f}, {1, 1}});
     sgTestAddFacet(*mesh, 1, {{0, 1}, {1, 0}, {2, -1}});
@@ -93,7 +79,7 @@ TEST_F(ExchangeReaderTest, ReturnedRecordBecomesAShape) {
     ASSERT_FALSE(record.isEmpty());
 
     QString trailer;
-    auto shape = read(record, &trailer);
+    auto shape = readRecord(record, &trailer);
     ASSERT_TRUE(shape);
     EXPECT_EQ(shape->getName(), "Prop");
     EXPECT_EQ(trailer, "tail");
@@ -126,7 +112,8 @@ TEST_F(ExchangeReaderTest, ReturnedRecordBecomesAShape) {
     EXPECT_FALSE(materialAt(*shape, 1)->getColorMap());
 }
 
-TEST_F(ExchangeReaderTest, EmptyBlocksAndUnknownFacetTypes) {
+TEST(ExchangeReaderTest, EmptyBlocksAndUnknownFacetTypes) {
+    clearLog();
     // name "E", V = 3, U = 0, M = 0, F = 4: 'X' (no corners), 'T' in material 1 of 1 (read as
     // 0), a 'P' of 2 corners, a 'P' of 5 corners in material 1; trailer.
     const QByteArray record = QByteArray::fromHex(
@@ -158,7 +145,7 @@ TEST_F(ExchangeReaderTest, EmptyBlocksAndUnknownFacetTypes) {
         "000000000000000000000000"
         "010000000000000000000000"
         "00000000");
-    auto shape = read(record);
+    auto shape = readRecord(record);
     ASSERT_TRUE(shape);
     const SgPolyMesh *mesh = shape->getPolyMesh();
     EXPECT_EQ(mesh->getVertex(0), SgVec3(10, 20, 30));
@@ -173,7 +160,7 @@ TEST_F(ExchangeReaderTest, EmptyBlocksAndUnknownFacetTypes) {
     EXPECT_TRUE(logLines().isEmpty());
 }
 
-TEST_F(ExchangeReaderTest, FigureRoundTripKeepsVerticesUVsAndFacetOrder) {
+TEST(ExchangeReaderTest, FigureRoundTripKeepsVerticesUVsAndFacetOrder) {
     SgAppSettings().setInt("FacetorBridgeTools", 1); // weld the base geometry
     auto figure = std::make_unique<SgSkeleton>("Body");
     figure->setLabel("Body");
@@ -202,7 +189,7 @@ TEST_F(ExchangeReaderTest, FigureRoundTripKeepsVerticesUVsAndFacetOrder) {
     // The modeler reads the record and sends its geometry back unchanged.
     SgExchangeNode node;
     ASSERT_TRUE(SgExchangeNodeReader(sent.constData(), size_t(sent.size())).read(node));
-    auto shape = read(SgFacetorReturn::encode(node));
+    auto shape = readRecord(SgFacetorReturn::encode(node));
     ASSERT_TRUE(shape);
     EXPECT_EQ(shape->getName(), "Body");
 

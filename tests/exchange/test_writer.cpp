@@ -2,6 +2,7 @@
 
 #include "exchangetestsupport.h"
 
+#include "exchange/sgexchangenodereader.h"
 #include "exchange/sgexchangewriter.h"
 #include "exchange/sgmaterialblockwriter.h"
 #include "sgcore/app/sgapp.h"
@@ -35,11 +36,6 @@ void mapBump(SgDefaultMaterial &material, SgTexture *texture) {
     material.getBumpControl()->setMapped(true);
 }
 
-class ExchangeWriterTest : public ::testing::Test {
-protected:
-    void SetUp() override { clearLog(); }
-};
-
 // A prop node with one polygon shape; the node owns everything.
 std::unique_ptr<SgNode> prop(const QString &label, SgPolyMesh *mesh,
                              const std::vector<SgMaterial *> &materials) {
@@ -48,6 +44,28 @@ std::unique_ptr<SgNode> prop(const QString &label, SgPolyMesh *mesh,
     for (SgMaterial *material : materials)
         shape->addMaterial(material);
     return std::unique_ptr<SgNode>(sgTestAttach(new SgNode(label), shape));
+}
+
+// The record of `node` as the modeler reads it, to its last byte.
+SgExchangeNode decode(SgNode *node, const QString &trailer = QString()) {
+    const QByteArray r = writeNode(node, trailer);
+    SgExchangeNode decoded;
+    SgExchangeNodeReader reader(r.constData(), size_t(r.size()));
+    EXPECT_TRUE(reader.read(decoded)) << reader.errorString().toStdString();
+    EXPECT_EQ(reader.bytesRead(), size_t(r.size()));
+    return decoded;
+}
+
+// The facets of a decoded record, each as "<type><material>:<first vertex>/<corners>".
+QStringList facetsOf(const SgExchangeNode &n) {
+    QStringList out;
+    for (const SgExchangeNode::Facet &f : n.facets)
+        out << QStringLiteral("%1%2:%3/%4")
+                   .arg(QChar(f.type))
+                   .arg(f.material)
+                   .arg(n.corners[f.firstCorner].vertex)
+                   .arg(f.cornerCount);
+    return out;
 }
 
 QString writeImage(const QString &path, QColor color) {
@@ -60,7 +78,7 @@ QString writeImage(const QString &path, QColor color) {
 
 } // namespace
 
-TEST_F(ExchangeWriterTest, WorkedRecordByteForByte) {
+TEST(ExchangeWriterTest, WorkedRecordByteForByte) {
     SgPolyMesh *mesh = sgTestMesh({{0, 0, 0}, {10, 0, 0}, {0, 10, 0}});
     sgTestAddFacet(*mesh, 0, {{0, 0, 0}, {1, 0, 0}, {2, 0, 0}});
     auto node = prop("A", mesh, {new BareMaterial("M")});
@@ -105,39 +123,29 @@ TEST_F(ExchangeWriterTest, WorkedRecordByteForByte) {
     EXPECT_EQ(r.toHex(), expected.toHex());
 }
 
-TEST_F(ExchangeWriterTest, RecordSizesAndScaling) {
-    // No UVs, triangles only, one material: U = 0 and every facet a 41-byte 'T' record.
+TEST(ExchangeWriterTest, FacetKindsUVsTrailerAndTheMeasure) {
+    // Vertices in modeler units, no UVs, a trailer.
     SgPolyMesh *triangles = sgTestMesh({{10, 20, 30}, {0, 0, 0}, {1, 1, 1}, {2, 2, 2}});
     sgTestAddFacet(*triangles, 0, {{0}, {1}, {2}});
     sgTestAddFacet(*triangles, 0, {{1}, {2}, {3}});
     auto triNode = prop("T", triangles, {new BareMaterial("M")});
-    const QByteArray t = writeNode(triNode.get(), "end");
-    const qsizetype uAt = 9 + 4 * 12;
-    EXPECT_EQ(i32At(t, uAt), 0);
-    const qsizetype fAt = uAt + 4 + 67;
-    EXPECT_EQ(i32At(t, fAt), 2);
-    EXPECT_EQ(t.at(fAt + 4), 'T');
-    EXPECT_EQ(t.at(fAt + 4 + 41), 'T');
-    EXPECT_EQ(t.size(), fAt + 4 + 2 * 41 + 4 + 3);
-    EXPECT_EQ(t.right(7), QByteArray("\x03\x00\x00\x00"
-                                     "end",
-                                     7));
+    const SgExchangeNode t = decode(triNode.get(), "end");
+    EXPECT_EQ(std::vector<float>(t.vertices.begin(), t.vertices.begin() + 3),
+              (std::vector<float>{1, 2, 3}));
+    EXPECT_EQ(t.uvCount(), 0);
+    EXPECT_EQ(facetsOf(t), (QStringList{"T0:0/3", "T0:1/3"}));
+    EXPECT_EQ(t.trailer, "end");
 
-    // A 7-corner polygon is 9 + 84 bytes; UVs are copied as they stand.
+    // UVs are copied as they stand; a polygon's corners keep all three indices.
     std::vector<SgVec3> ring(7);
     SgPolyMesh *polygon = sgTestMesh(ring, {{0.25f, 0.5f}, {1.0f, 0.0f}});
-    sgTestAddFacet(*polygon, 0, {{0, 1, 0}, {1, 0, 0}, {2}, {3}, {4}, {5}, {6, 1, 9}});
+    sgTestAddFacet(*polygon, 0, {{0, 1, 0}, {1, 0, 0}, {2, 0}, {3, 0}, {4, 0}, {5, 0}, {6, 1, 9}});
     auto polyNode = prop("P", polygon, {new BareMaterial("M")});
-    const QByteArray p = writeNode(polyNode.get());
-    const qsizetype pu = 9 + 7 * 12;
-    EXPECT_EQ(i32At(p, pu), 2);
-    EXPECT_FLOAT_EQ(f32At(p, pu + 4), 0.25f);
-    EXPECT_FLOAT_EQ(f32At(p, pu + 8), 0.5f);
-    const qsizetype pf = pu + 4 + 16 + 67;
-    EXPECT_EQ(p.at(pf + 4), 'P');
-    EXPECT_EQ(i32At(p, pf + 9), 7);
-    EXPECT_EQ(i32At(p, pf + 13 + 6 * 12 + 8), 9); // third index of the last corner
-    EXPECT_EQ(p.size(), pf + 4 + 9 + 84 + 4);
+    const SgExchangeNode p = decode(polyNode.get());
+    EXPECT_EQ(p.uvs, (std::vector<float>{0.25f, 0.5f, 1.0f, 0.0f}));
+    ASSERT_EQ(facetsOf(p), QStringList{"P0:0/7"});
+    EXPECT_EQ(p.corners[6].uv, 1);
+    EXPECT_EQ(p.corners[6].third, 9);
 
     // Polygons of the most corners the host holds stay inside the measured size.
     const int most = SgPolyMesh::kMaxPolygonCorners;
@@ -154,7 +162,7 @@ TEST_F(ExchangeWriterTest, RecordSizesAndScaling) {
     EXPECT_LE(w.size(), measured);
 }
 
-TEST_F(ExchangeWriterTest, FacetsGoInMaterialOrderAndUnknownMaterialsAreLeftOut) {
+TEST(ExchangeWriterTest, FacetsGoInMaterialOrderAndUnknownMaterialsAreLeftOut) {
     SgPolyMesh *mesh = sgTestMesh({{0, 0, 0}, {1, 0, 0}, {0, 1, 0}, {1, 1, 0}, {2, 2, 0}});
     sgTestAddFacet(*mesh, 1, {{0}, {1}, {2}});           // triangle of material 1 first
     sgTestAddFacet(*mesh, 0, {{0}, {1}, {3}, {2}});      // quad of material 0
@@ -162,26 +170,10 @@ TEST_F(ExchangeWriterTest, FacetsGoInMaterialOrderAndUnknownMaterialsAreLeftOut)
     sgTestAddFacet(*mesh, 0, {{3}, {2}, {1}});           // triangle of material 0
     sgTestAddFacet(*mesh, 1, {{0}, {1}, {2}, {3}, {4}}); // polygon of material 1
     auto node = prop("O", mesh, {new BareMaterial("a"), new BareMaterial("b")});
-    const QByteArray r = writeNode(node.get());
-    qsizetype at = 9 + 5 * 12 + 4 + 4 + 2 * 63;
-    ASSERT_EQ(i32At(r, at), 4);
-    at += 4;
-    const struct {
-        char type;
-        int material;
-        int firstVertex;
-        int bytes;
-    } expected[] = {{'T', 0, 3, 41}, {'Q', 0, 0, 53}, {'T', 1, 0, 41}, {'P', 1, 0, 69}};
-    for (const auto &e : expected) {
-        EXPECT_EQ(r.at(at), e.type);
-        EXPECT_EQ(i32At(r, at + 1), e.material);
-        EXPECT_EQ(i32At(r, at + (e.type == 'P' ? 9 : 5)), e.firstVertex);
-        at += e.bytes;
-    }
-    EXPECT_EQ(at + 4, r.size());
+    EXPECT_EQ(facetsOf(decode(node.get())), (QStringList{"T0:3/3", "Q0:0/4", "T1:0/3", "P1:0/5"}));
 }
 
-TEST_F(ExchangeWriterTest, MaterialEntryRules) {
+TEST(ExchangeWriterTest, MaterialEntryRules) {
     auto *material = new SgDefaultMaterial("skin");
     material->setDiffuseColor(QColor(255, 128, 0));
     material->setSpecularColor(QColor(0, 0, 255));
@@ -195,40 +187,26 @@ TEST_F(ExchangeWriterTest, MaterialEntryRules) {
     mapped->getOpacityControl()->setMapped(true);
     auto *bare = new BareMaterial("bare");
     auto node = prop("X", sgTestMesh({}), {material, mapped, bare});
-    const QByteArray r = writeNode(node.get());
-
-    qsizetype at = 4 + 1 + 4 + 4 + 4; // name, V, U, M
-    EXPECT_EQ(i32At(r, at - 4), 3);
-    // skin: colour floats, two empty diffuse strings (not mapped), 1 - glossiness, opacity.
-    at += 1 + 4 + 4 + 1;
-    EXPECT_EQ(f32At(r, at), 1.0f);
-    EXPECT_EQ(f32At(r, at + 4), 0.50196081f);
-    EXPECT_EQ(f32At(r, at + 8), 0.0f);
-    EXPECT_EQ(i32At(r, at + 12), 0);
-    EXPECT_EQ(i32At(r, at + 16), 0);
-    at += 20 + 1;
-    EXPECT_EQ(f32At(r, at + 8), 1.0f);
-    at += 12 + 1;
-    EXPECT_FLOAT_EQ(f32At(r, at), 0.75f);
-    EXPECT_FLOAT_EQ(f32At(r, at + 5), 0.5f);
-    EXPECT_FLOAT_EQ(f32At(r, at + 10), 0.3f);
-    at += 14 + 8;
+    const QList<SgExchangeNode::Material> m = decode(node.get()).materials;
+    ASSERT_EQ(m.size(), 3);
+    // skin: colours as floats, no image strings (not mapped), 1 - glossiness, opacity.
+    EXPECT_EQ(std::vector<float>(m[0].diffuse, m[0].diffuse + 3),
+              (std::vector<float>{1.0f, 0.50196081f, 0.0f}));
+    EXPECT_TRUE(m[0].diffuseImageFolder.isEmpty() && m[0].diffuseImageCopy.isEmpty());
+    EXPECT_EQ(m[0].specular[2], 1.0f);
+    EXPECT_FLOAT_EQ(m[0].invertedGlossiness, 0.75f);
+    EXPECT_FLOAT_EQ(m[0].opacity, 0.5f);
+    EXPECT_FLOAT_EQ(m[0].bumpStrength, 0.3f);
     // mapped: a mapped glossiness counts as 0 (1.0 written), a mapped opacity as 1.0.
-    at += 1 + 4 + 6 + 1 + 20 + 1 + 12 + 1;
-    EXPECT_FLOAT_EQ(f32At(r, at), 1.0f);
-    EXPECT_FLOAT_EQ(f32At(r, at + 5), 1.0f);
-    at += 14 + 8;
+    EXPECT_FLOAT_EQ(m[1].invertedGlossiness, 1.0f);
+    EXPECT_FLOAT_EQ(m[1].opacity, 1.0f);
     // bare: no property at all gives zero colours and strengths.
-    at += 1 + 4 + 4 + 1;
-    for (int i = 0; i < 3; ++i)
-        EXPECT_EQ(f32At(r, at + 4 * i), 0.0f);
-    at += 20 + 1 + 12 + 1;
-    EXPECT_EQ(f32At(r, at), 0.0f);
-    EXPECT_EQ(f32At(r, at + 5), 0.0f);
-    EXPECT_EQ(f32At(r, at + 10), 0.0f);
+    for (float value : {m[2].diffuse[0], m[2].diffuse[1], m[2].diffuse[2], m[2].specular[2],
+                        m[2].invertedGlossiness, m[2].opacity, m[2].bumpStrength})
+        EXPECT_EQ(value, 0.0f);
 }
 
-TEST_F(ExchangeWriterTest, ImagesAreCopiedAsJpegOncePerImageFileUnderSafeUniqueNames) {
+TEST(ExchangeWriterTest, ImagesAreCopiedAsJpegOncePerImageFileUnderSafeUniqueNames) {
     const QString source = writeImage(tempPath() + "/images/a/wood.png", Qt::red);
     const QString other = writeImage(tempPath() + "/images/b/wood.png", Qt::blue);
     SgTexture *wood = sgApp->getImageMgr()->getImage(source);
@@ -294,7 +272,7 @@ TEST_F(ExchangeWriterTest, ImagesAreCopiedAsJpegOncePerImageFileUnderSafeUniqueN
     EXPECT_EQ(SgMaterialBlockWriter::exportTextureAsJpeg(&missing), QString());
 }
 
-TEST_F(ExchangeWriterTest, LongImagePathsStayInsideTheMeasuredSize) {
+TEST(ExchangeWriterTest, LongImagePathsStayInsideTheMeasuredSize) {
     QString deep = tempPath() + "/images";
     while (deep.size() < 1400)
         deep += "/" + QString(60, QLatin1Char('d'));
@@ -314,7 +292,7 @@ TEST_F(ExchangeWriterTest, LongImagePathsStayInsideTheMeasuredSize) {
     EXPECT_EQ(buffer.right(16), QByteArray(16, '\x7f'));
 }
 
-TEST_F(ExchangeWriterTest, EmptyNodesAndShapesWithoutMaterialsOrUVs) {
+TEST(ExchangeWriterTest, EmptyNodesAndShapesWithoutMaterialsOrUVs) {
     // Nothing to send measures zero and writes nothing.
     SgNode bare("empty");
     SgExchangeWriter writer(&bare, QString());
@@ -323,18 +301,17 @@ TEST_F(ExchangeWriterTest, EmptyNodesAndShapesWithoutMaterialsOrUVs) {
     EXPECT_EQ(writer.write(&byte), 0);
     EXPECT_EQ(SgExchangeWriter(nullptr, QString()).write(&byte), 0);
 
-    // A shape without materials or UVs still fits its measure.
+    // A shape without materials or UVs still fits its measure, with no facet (none has a
+    // material to go with).
     SgPolyMesh *mesh = sgTestMesh({{0, 0, 0}, {1, 0, 0}, {0, 1, 0}});
     sgTestAddFacet(*mesh, 0, {{0}, {1}, {2}});
     auto node = prop("N", mesh, {});
     std::int32_t measured = 0;
-    const QByteArray r = writeNode(node.get(), QString(), &measured);
-    ASSERT_FALSE(r.isEmpty());
-    EXPECT_LE(r.size(), measured);
-    EXPECT_EQ(i32At(r, r.size() - 8), 0); // F = 0: no facet has a material to go with
+    EXPECT_LE(writeNode(node.get(), QString(), &measured).size(), measured);
+    EXPECT_TRUE(decode(node.get()).facets.empty());
 }
 
-TEST_F(ExchangeWriterTest, SubdivisionPatchesAreWrittenAsQuads) {
+TEST(ExchangeWriterTest, SubdivisionPatchesAreWrittenAsQuads) {
     auto *subd = new SgSubDMesh;
     SgVec3 *v = subd->setVertexCount(6);
     for (int i = 0; i < 6; ++i)
@@ -350,24 +327,16 @@ TEST_F(ExchangeWriterTest, SubdivisionPatchesAreWrittenAsQuads) {
     std::unique_ptr<SgNode> node(sgTestAttach(new SgNode("S"), shape));
 
     std::int32_t measured = 0;
-    const QByteArray r = writeNode(node.get(), QString(), &measured);
-    const qsizetype f = 9 + 6 * 12 + 4 + 4 + 2 * 63;
+    EXPECT_LE(writeNode(node.get(), QString(), &measured).size(), measured);
+    const SgExchangeNode n = decode(node.get());
     // The count says what follows: the patch without a material is not announced.
-    ASSERT_EQ(i32At(r, f), 2);
-    EXPECT_EQ(r.at(f + 4), 'Q');
-    EXPECT_EQ(i32At(r, f + 5), 0);
-    EXPECT_EQ(i32At(r, f + 9), 0);
-    EXPECT_EQ(i32At(r, f + 9 + 4), 0); // UV of corner 0
-    EXPECT_EQ(i32At(r, f + 9 + 8), 0); // third of corner 0
-    EXPECT_EQ(r.at(f + 4 + 53), 'Q');
-    EXPECT_EQ(i32At(r, f + 4 + 53 + 1), 1);
-    EXPECT_EQ(i32At(r, f + 4 + 53 + 5), 2);
-    EXPECT_EQ(i32At(r, f + 4 + 53 + 5 + 8), -1);
-    EXPECT_EQ(r.size(), f + 4 + 2 * 53 + 4);
-    EXPECT_LE(r.size(), measured);
+    ASSERT_EQ(facetsOf(n), (QStringList{"Q0:0/4", "Q1:2/4"}));
+    EXPECT_EQ(n.corners[0].uv, 0);
+    EXPECT_EQ(n.corners[0].third, 0);
+    EXPECT_EQ(n.corners[4].third, -1);
 }
 
-TEST_F(ExchangeWriterTest, ADestinationTooSmallIsNeverOverrun) {
+TEST(ExchangeWriterTest, ADestinationTooSmallIsNeverOverrun) {
     SgPolyMesh *mesh = sgTestMesh({{0, 0, 0}, {10, 0, 0}, {0, 10, 0}});
     sgTestAddFacet(*mesh, 0, {{0}, {1}, {2}});
     auto node = prop("A", mesh, {new BareMaterial("a-long-material-name")});

@@ -5,8 +5,6 @@
 
 #include <gtest/gtest.h>
 
-#include <QTemporaryDir>
-
 #include <charconv>
 #include <cstring>
 #include <string>
@@ -19,9 +17,8 @@ bool read(SgObjReader &r, const std::string &text) {
 
 std::vector<int> vertexIndices(const SgFaceCorner *c, int n) {
     std::vector<int> out;
-    for (int i = 0; i < n; ++i) {
+    for (int i = 0; i < n; ++i)
         out.push_back(c[i].vertex);
-    }
     return out;
 }
 
@@ -68,16 +65,14 @@ TEST(HostObjReader, KeepsVertexOrderPolygonsGroupsAndMaterials) {
     // Faces before any usemtl use "default"; names are indexed in order of first use.
     EXPECT_EQ(r.getMaterialNames(), (QStringList{QStringLiteral("default"), QStringLiteral("Skin"),
                                                  QStringLiteral("Nails")}));
-    EXPECT_EQ(m->getTriangleMaterial(0), 0);
-    EXPECT_EQ(m->getQuadMaterial(0), 1);
-    EXPECT_EQ(m->getPolygonMaterial(0), 2);
-    EXPECT_EQ(m->getTriangleMaterial(1), 1);
+    EXPECT_EQ(m->triangleMaterials(), (std::vector<uint8_t>{0, 1}));
+    EXPECT_EQ(m->quadMaterials(), std::vector<uint8_t>{1});
+    EXPECT_EQ(m->polygonMaterials(), std::vector<uint8_t>{2});
 
     ASSERT_EQ(m->getFaceGroupCount(), 1);
     EXPECT_EQ(m->getFaceGroupName(0), QStringLiteral("arm"));
-    EXPECT_EQ(m->getTriangleGroup(0), -1);
-    EXPECT_EQ(m->getQuadGroup(0), 0);
-    EXPECT_EQ(m->getTriangleGroup(1), -1);
+    EXPECT_EQ(m->triangleGroups(), (std::vector<int32_t>{-1, -1}));
+    EXPECT_EQ(m->quadGroups(), std::vector<int32_t>{0});
     EXPECT_EQ(m->getFaceGroupVertices(0), (std::vector<int32_t>{0, 1, 2, 3, 4}));
     QString why;
     EXPECT_TRUE(m->validate(&why)) << why.toStdString();
@@ -128,12 +123,9 @@ TEST(HostObjReader, RejectsMalformedInputWithFileAndLine) {
     }
 
     // A polygon of more than 255 corners cannot be stored.
-    std::string big = "v 0 0 0\n";
-    big += "f";
-    for (int i = 0; i < 256; ++i) {
+    std::string big = "v 0 0 0\nf";
+    for (int i = 0; i < 256; ++i)
         big += " 1";
-    }
-    big += "\n";
     SgObjReader r;
     EXPECT_FALSE(read(r, big));
     EXPECT_TRUE(r.getErrorString().contains(QLatin1String("255")))
@@ -141,9 +133,8 @@ TEST(HostObjReader, RejectsMalformedInputWithFileAndLine) {
 
     // More than 256 materials do not fit the 8-bit material index.
     std::string many = "v 0 0 0\n";
-    for (int i = 0; i < 257; ++i) {
+    for (int i = 0; i < 257; ++i)
         many += "usemtl m" + std::to_string(i) + "\n";
-    }
     EXPECT_FALSE(read(r, many));
     EXPECT_EQ(r.getErrorLine(), 258);
 
@@ -152,9 +143,8 @@ TEST(HostObjReader, RejectsMalformedInputWithFileAndLine) {
 }
 
 TEST(HostObjReader, ReadsFilesOddButValidTextAndExactNumbers) {
-    QTemporaryDir dir;
     // No final newline, tabs, a w component, a forward reference and ignored statements.
-    const QString path = sgTestWriteFile(dir.filePath(QStringLiteral("a.obj")),
+    const QString path = sgTestWriteFile(sgTestPath(QStringLiteral("a.obj")),
                                          "o thing\ns 1\nf 1 2 3\nv\t+1.5 -2 3 1\nv 1e-50 0 0\nv .5 "
                                          "0 0 0.2 0.3 0.4\nl 1 2\nf 1 2 3 # tail");
     SgObjReader r;

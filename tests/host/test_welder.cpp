@@ -1,6 +1,8 @@
-#include "sgcore/geometry/sgmodifier.h"
 #include "sgcore/geometry/sgpolymesh.h"
 #include "sgcore/materials/sgmaterial.h"
+#include "sgcore/morph/sgmorph.h"
+#include "sgcore/morph/sgmorphdeltas.h"
+#include "sgcore/properties/sgfloatproperty.h"
 #include "sgcore/scene/sgbone.h"
 #include "sgcore/scene/sgfigurewelder.h"
 #include "sgcore/scene/sgskeleton.h"
@@ -8,6 +10,7 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <memory>
 
 namespace {
@@ -17,12 +20,9 @@ namespace {
 std::vector<SgVec3> extract(const SgPolyMesh &mesh, const QString &group) {
     std::vector<SgVec3> out;
     const int g = mesh.findFaceGroup(group);
-    if (g < 0) {
-        return out;
-    }
-    for (int32_t v : mesh.getFaceGroupVertices(g)) {
-        out.push_back(mesh.getVertex(v));
-    }
+    if (g >= 0)
+        for (int32_t v : mesh.getFaceGroupVertices(g))
+            out.push_back(mesh.getVertex(v));
     return out;
 }
 
@@ -30,22 +30,6 @@ std::unique_ptr<SgPolyMesh> unweld(const SgFigureWelder &w, const SgVertexMesh &
     SgVertexMesh *out = w.unWeld(&edited);
     return std::unique_ptr<SgPolyMesh>(dynamic_cast<SgPolyMesh *>(out));
 }
-
-// A morph-like modifier that lifts vertex 0 by `amount`.
-class LiftFirstVertex : public SgModifier {
-public:
-    explicit LiftFirstVertex(float amount) : SgModifier(QStringLiteral("lift")), m_amount(amount) {}
-    void apply(SgVertexMesh *mesh, SgNode *) const override {
-        mesh->setVertex(0, mesh->getVertex(0) + SgVec3(0, 0, m_amount));
-    }
-    void applyInverse(SgVertexMesh *mesh, SgNode *) const override {
-        mesh->setVertex(0, mesh->getVertex(0) - SgVec3(0, 0, m_amount));
-    }
-    bool isMorphModifier() const override { return true; }
-
-private:
-    float m_amount;
-};
 
 } // namespace
 
@@ -102,14 +86,9 @@ TEST(HostWelder, MovingOneSeamVertexChangesExactlyThatVertexInEachBoneSharingIt)
     SgFigureWelder welder(figure.get(), false, true, true, true);
     const SgPolyMesh *welded = welder.getGeometry();
     // The seam between bone 0 and bone 1 at (1, 1, 0).
-    int seam = -1;
-    for (int i = 0; i < welded->getVertexCount(); ++i) {
-        if (welded->getVertex(i) == SgVec3(1, 1, 0)) {
-            EXPECT_EQ(seam, -1) << "seam vertices are welded into one";
-            seam = i;
-        }
-    }
-    ASSERT_GE(seam, 0);
+    const std::vector<SgVec3> &all = welded->vertices();
+    ASSERT_EQ(std::count(all.begin(), all.end(), SgVec3(1, 1, 0)), 1) << "welded into one";
+    const int seam = int(std::find(all.begin(), all.end(), SgVec3(1, 1, 0)) - all.begin());
     EXPECT_EQ(welder.getWeldCounts()[size_t(seam)], 2);
 
     std::unique_ptr<SgVertexMesh> edited(welded->clone());
@@ -123,11 +102,8 @@ TEST(HostWelder, MovingOneSeamVertexChangesExactlyThatVertexInEachBoneSharingIt)
         const std::vector<SgVec3> got = extract(*result, bones[b]->getName());
         ASSERT_EQ(got.size(), own.size());
         for (size_t i = 0; i < own.size(); ++i) {
-            if (int(i) == changedIndex[b]) {
-                EXPECT_EQ(got[i], SgVec3(1, 1, 0.5f));
-            } else {
-                EXPECT_EQ(got[i], own[i]) << "bone " << b << " vertex " << i;
-            }
+            EXPECT_EQ(got[i], int(i) == changedIndex[b] ? SgVec3(1, 1, 0.5f) : own[i])
+                << "bone " << b << " vertex " << i;
         }
     }
 
@@ -165,7 +141,12 @@ TEST(HostWelder, FlagsSelectBonesSeamsAndMorphedGeometry) {
     bones[1]->setHidden(false);
 
     // Morphed geometry: the weld shows the morph, unwelding takes it out again.
-    bones[0]->getObject()->addModifier(new LiftFirstVertex(2.0f));
+    auto *lift = new SgMorphDeltas;
+    lift->setVertCount(sgTestGeometry(bones[0])->getVertexCount());
+    lift->addDelta(0, SgVec3(0, 0, 2), true);
+    auto *morph = new SgMorph(QStringLiteral("lift"), lift);
+    morph->getValueChannel()->setValue(1.0f);
+    bones[0]->getObject()->addModifier(morph);
     SgFigureWelder morphed(figure.get(), false, true, true, true);
     EXPECT_EQ(morphed.getGeometry()->getVertex(0), SgVec3(0, 0, 2));
     result = unweld(morphed, *morphed.getGeometry());
@@ -197,40 +178,4 @@ TEST(HostWelder, OrderedBonesFollowTheFigureHierarchy) {
     EXPECT_EQ(w.getBones(), (SgBoneList{ab[1], ab[0]}));
     EXPECT_EQ(w.getGeometry()->getFaceGroupName(0), QStringLiteral("bone1"));
     EXPECT_EQ(w.getGeometry()->getVertexCount(), 4 + 4 - 2);
-}
-
-// The face-group vertex lists that un-welding relies on: all groups at once (marked over each
-// group's span, or sorted when the group is sparse) give what each group gives alone.
-TEST(HostWelder, AllFaceGroupVerticesMatchEachGroupAlone) {
-    SgPolyMesh mesh;
-    mesh.beginEdit(true);
-    mesh.setVertexArray(2000);
-    const int dense = mesh.addFaceGroup(QStringLiteral("dense"));
-    const int sparse = mesh.addFaceGroup(QStringLiteral("sparse"));
-    const int shared = mesh.addFaceGroup(QStringLiteral("shared"));
-    mesh.addFaceGroup(QStringLiteral("empty"));
-    auto face = [&](int group, std::initializer_list<int> corners) {
-        mesh.setActiveFaceGroup(group);
-        mesh.startFace();
-        for (const int v : corners)
-            mesh.addFaceEdge(v);
-        mesh.finishFace();
-    };
-    for (int v = 10; v + 3 < 60; v += 2)
-        face(dense, {v + 3, v, v + 1, v + 2});
-    face(sparse, {1999, 0, 1000});
-    face(sparse, {5, 1999, 7, 1500, 3});
-    face(shared, {12, 11, 10});
-    face(-1, {100, 101, 102});
-    face(shared, {13, 1998, 12, 14});
-    mesh.finishEdit();
-
-    const std::vector<std::vector<int32_t>> all = mesh.getAllFaceGroupVertices();
-    ASSERT_EQ(all.size(), 4u);
-    for (int g = 0; g < 4; ++g)
-        EXPECT_EQ(all[size_t(g)], mesh.getFaceGroupVertices(g)) << g;
-    EXPECT_EQ(all[size_t(sparse)], (std::vector<int32_t>{0, 3, 5, 7, 1000, 1500, 1999}));
-    EXPECT_EQ(all[size_t(shared)], (std::vector<int32_t>{10, 11, 12, 13, 14, 1998}));
-    EXPECT_EQ(all[size_t(dense)].size(), 50u);
-    EXPECT_TRUE(all[3].empty());
 }

@@ -9,6 +9,7 @@
 #include <memory>
 #include <sstream>
 #include <string>
+#include <thread>
 
 namespace {
 
@@ -97,23 +98,23 @@ std::string run(const std::string &line) {
         in >> anchored >> loose >> a;
         return "1 0 " + churn(anchored, loose, static_cast<int>(a));
     }
+    in >> a >> b; // the numbers a command takes, if any
+    if (command == "sleep") {
+        std::this_thread::sleep_for(std::chrono::milliseconds(a));
+        return "1 0";
+    }
     if (!segment)
         return "0 -1 no segment";
     SgSharedMemory &memory = *segment;
-    if (command == "create") {
-        in >> a;
+    if (command == "create")
         return answer(memory.create(static_cast<std::int32_t>(a)));
-    }
-    if (command == "attach") {
-        in >> a;
+    if (command == "attach")
         return answer(memory.attach(static_cast<int>(a)));
-    }
     if (command == "detach")
         return answer(memory.detach());
     if (command == "lock")
         return answer(memory.lock());
     if (command == "trylock") {
-        in >> a;
         const auto start = Clock::now();
         const bool locked = memory.tryLock(static_cast<int>(a));
         return answer(locked, std::to_string(msSince(start)));
@@ -122,14 +123,9 @@ std::string run(const std::string &line) {
         memory.unlock();
         return answer(true);
     }
-    if (command == "exists")
-        return answer(memory.exists());
     if (command == "count")
         return answer(true, std::to_string(memory.attachCount()));
-    if (command == "size")
-        return answer(true, std::to_string(memory.size()));
     if (command == "write" || command == "read") {
-        in >> a >> b;
         if (!memory.data() || a < 0 || a + 4 > memory.size())
             return "0 -1 out of range";
         if (command == "read")

@@ -7,38 +7,22 @@
 #ifdef _WIN32
 #include <windows.h>
 #else
-#include <cerrno>
-#include <climits>
-#include <csignal>
-#include <fcntl.h>
-#include <poll.h>
-#include <spawn.h>
-#include <sys/wait.h>
-#include <unistd.h>
-extern char **environ;
+#include <QCoreApplication>
+#include <QProcess>
 #endif
+
+#ifdef _WIN32
 
 namespace {
 
-#ifdef _WIN32
 std::string peerProgram() {
     char path[MAX_PATH] = {};
     const DWORD length = GetModuleFileNameA(nullptr, path, MAX_PATH);
     std::string self(path, length);
     return self.substr(0, self.find_last_of("\\/") + 1) + "shm_peer.exe";
 }
-#else
-std::string peerProgram() {
-    char path[PATH_MAX] = {};
-    const ssize_t length = readlink("/proc/self/exe", path, sizeof path - 1);
-    std::string self(path, length > 0 ? static_cast<size_t>(length) : 0);
-    return self.substr(0, self.find_last_of('/') + 1) + "shm_peer";
-}
-#endif
 
 } // namespace
-
-#ifdef _WIN32
 
 ShmPeerProcess::ShmPeerProcess() {
     SECURITY_ATTRIBUTES inherit = {static_cast<DWORD>(sizeof(SECURITY_ATTRIBUTES)), nullptr, TRUE};
@@ -82,20 +66,9 @@ bool ShmPeerProcess::writeLine(const std::string &line) {
            written == text.size();
 }
 
-bool ShmPeerProcess::readLine(std::string *line, int) {
-    for (;;) {
-        const auto end = m_buffer.find('\n');
-        if (end != std::string::npos) {
-            *line = m_buffer.substr(0, end);
-            m_buffer.erase(0, end + 1);
-            return true;
-        }
-        char chunk[256];
-        DWORD got = 0;
-        if (!ReadFile(m_fromPeer, chunk, sizeof chunk, &got, nullptr) || got == 0)
-            return false;
-        m_buffer.append(chunk, got);
-    }
+long ShmPeerProcess::readChunk(char *chunk, int size, int) {
+    DWORD got = 0;
+    return ReadFile(m_fromPeer, chunk, static_cast<DWORD>(size), &got, nullptr) ? long(got) : -1;
 }
 
 void ShmPeerProcess::kill() {
@@ -119,50 +92,51 @@ void ShmPeerProcess::quit() {
 
 #else
 
-ShmPeerProcess::ShmPeerProcess() {
-    int toPeer[2];
-    int fromPeer[2];
-    if (pipe2(toPeer, O_CLOEXEC) != 0)
-        return;
-    if (pipe2(fromPeer, O_CLOEXEC) != 0) {
-        close(toPeer[0]);
-        close(toPeer[1]);
-        return;
-    }
-    posix_spawn_file_actions_t actions;
-    posix_spawn_file_actions_init(&actions);
-    posix_spawn_file_actions_adddup2(&actions, toPeer[0], STDIN_FILENO);
-    posix_spawn_file_actions_adddup2(&actions, fromPeer[1], STDOUT_FILENO);
-    const std::string program = peerProgram();
-    char *argv[] = {const_cast<char *>(program.c_str()), nullptr};
-    pid_t pid = -1;
-    const int error = posix_spawn(&pid, program.c_str(), &actions, nullptr, argv, environ);
-    posix_spawn_file_actions_destroy(&actions);
-    close(toPeer[0]);
-    close(fromPeer[1]);
-    if (error != 0) {
-        close(toPeer[1]);
-        close(fromPeer[0]);
-        return;
-    }
-    m_pid = pid;
-    m_toPeer = toPeer[1];
-    m_fromPeer = fromPeer[0];
-    m_running = true;
+ShmPeerProcess::ShmPeerProcess() : m_process(new QProcess) {
+    m_process->setProcessChannelMode(QProcess::ForwardedErrorChannel);
+    m_process->start(QCoreApplication::applicationDirPath() + QStringLiteral("/shm_peer"), {});
+    m_running = m_process->waitForStarted(5000);
 }
 
 bool ShmPeerProcess::writeLine(const std::string &line) {
-    const std::string text = line + "\n";
-    size_t done = 0;
-    while (done < text.size()) {
-        const ssize_t n = write(m_toPeer, text.data() + done, text.size() - done);
-        if (n < 0 && errno == EINTR)
-            continue;
-        if (n <= 0)
-            return false;
-        done += static_cast<size_t>(n);
-    }
-    return true;
+    m_process->write((line + "\n").c_str());
+    return m_process->waitForBytesWritten(5000);
+}
+
+long ShmPeerProcess::readChunk(char *chunk, int size, int timeoutMs) {
+    if (m_process->bytesAvailable() == 0 && !m_process->waitForReadyRead(timeoutMs))
+        return -1;
+    return long(m_process->read(chunk, size));
+}
+
+void ShmPeerProcess::kill() {
+    if (!m_running)
+        return;
+    m_process->kill();
+    m_process->waitForFinished(5000);
+    m_running = false;
+}
+
+void ShmPeerProcess::quit() {
+    if (!m_running)
+        return;
+    writeLine("quit");
+    m_process->waitForFinished(5000);
+    kill();
+}
+
+#endif
+
+ShmPeerProcess::~ShmPeerProcess() {
+    kill();
+#ifndef _WIN32
+    delete m_process;
+#endif
+}
+
+void ShmPeerProcess::send(const std::string &command) {
+    if (m_running)
+        writeLine(command);
 }
 
 bool ShmPeerProcess::readLine(std::string *line, int timeoutMs) {
@@ -173,50 +147,18 @@ bool ShmPeerProcess::readLine(std::string *line, int timeoutMs) {
             m_buffer.erase(0, end + 1);
             return true;
         }
-        pollfd ready = {m_fromPeer, POLLIN, 0};
-        const int polled = poll(&ready, 1, timeoutMs);
-        if (polled < 0 && errno == EINTR)
-            continue;
-        if (polled <= 0)
-            return false;
         char chunk[256];
-        const ssize_t got = read(m_fromPeer, chunk, sizeof chunk);
+        const long got = readChunk(chunk, sizeof chunk, timeoutMs);
         if (got <= 0)
             return false;
         m_buffer.append(chunk, static_cast<size_t>(got));
     }
 }
 
-void ShmPeerProcess::kill() {
-    if (!m_running)
-        return;
-    ::kill(m_pid, SIGKILL);
-    int status = 0;
-    waitpid(m_pid, &status, 0);
-    close(m_toPeer);
-    close(m_fromPeer);
-    m_running = false;
-}
-
-void ShmPeerProcess::quit() {
-    if (!m_running)
-        return;
-    writeLine("quit");
-    std::string rest;
-    readLine(&rest, 5000); // returns at end of file, when the peer has exited
-    kill();
-}
-
-#endif
-
-ShmPeerProcess::~ShmPeerProcess() {
-    kill();
-}
-
-std::vector<long long> ShmPeerProcess::call(const std::string &command, int timeoutMs) {
+std::vector<long long> ShmPeerProcess::answer(const std::string &command, int timeoutMs) {
     std::vector<long long> fields;
     std::string line;
-    if (!m_running || !writeLine(command))
+    if (!m_running)
         return fields;
     if (!readLine(&line, timeoutMs)) {
         ADD_FAILURE() << "the peer process gave no answer to \"" << command << "\" within "

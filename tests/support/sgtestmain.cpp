@@ -1,8 +1,6 @@
 #include "tests/support/sgtestmain.h"
 
-#include "sgcore/app/sgapp.h"
 #include "sgcore/app/sgappsettings.h"
-#include "sgcore/scene/sgscene.h"
 
 #include <gtest/gtest.h>
 
@@ -17,14 +15,13 @@
 #include <QTimer>
 #include <QWidget>
 
-#include <atomic>
-#include <chrono>
+#include <algorithm>
+#include <csignal>
 #include <cstdio>
 #include <cstdlib>
-#include <memory>
-#include <mutex>
 #include <string>
-#include <thread>
+
+#include <unistd.h>
 
 namespace {
 
@@ -70,53 +67,47 @@ private:
 };
 
 // Ends the program when one test runs past the limit: a hang then fails with the test's name
-// within seconds instead of waiting for ctest's time-out. It watches from a thread of its own,
-// since the stuck test holds the main thread.
+// within seconds instead of waiting for ctest's time-out. An alarm signal does it, since the
+// stuck test holds the main thread; its handler only writes the prepared message and exits.
 class StuckTestWatchdog : public ::testing::EmptyTestEventListener {
 public:
     explicit StuckTestWatchdog(int seconds) : m_limitSeconds(seconds) {
-        m_thread = std::thread([this] { watch(); });
+        std::signal(SIGALRM, [](int) {
+            [[maybe_unused]] const ssize_t n = write(STDERR_FILENO, s_message, s_length);
+            std::_Exit(1);
+        });
     }
-    ~StuckTestWatchdog() override {
-        m_stop = true;
-        m_thread.join();
+    // Restarts the running test's clock with the new limit (0: none).
+    void setLimit(int seconds) {
+        m_limitSeconds = seconds;
+        if (!m_test.empty())
+            arm();
     }
-    void setLimit(int seconds) { m_limitSeconds = seconds; }
 
 private:
-    using Clock = std::chrono::steady_clock;
     void OnTestStart(const ::testing::TestInfo &test) override {
-        std::lock_guard guard(m_mutex);
         m_test = std::string(test.test_suite_name()) + "." + test.name();
-        m_start = Clock::now();
+        arm();
     }
     void OnTestEnd(const ::testing::TestInfo &) override {
-        std::lock_guard guard(m_mutex);
         m_test.clear();
+        alarm(0);
     }
-    void watch() {
-        while (!m_stop) {
-            std::this_thread::sleep_for(std::chrono::milliseconds(100));
-            std::lock_guard guard(m_mutex);
-            const int limit = m_limitSeconds;
-            if (m_test.empty() || limit <= 0 ||
-                Clock::now() - m_start < std::chrono::seconds(limit))
-                continue;
-            std::fprintf(stderr,
-                         "[  STUCK   ] %s has run for more than %d s: a wait that should give up "
-                         "never returned (SG_TEST_STUCK_SECONDS sets the limit)\n",
-                         m_test.c_str(), limit);
-            std::fflush(stderr);
-            std::_Exit(1);
-        }
+    void arm() {
+        alarm(0);
+        s_length = size_t(std::max(
+            0, std::snprintf(s_message, sizeof s_message,
+                             "[  STUCK   ] %s has run for more than %d s: a wait that should give "
+                             "up never returned (SG_TEST_STUCK_SECONDS sets the limit)\n",
+                             m_test.c_str(), m_limitSeconds)));
+        s_length = std::min(s_length, sizeof s_message - 1);
+        alarm(unsigned(std::max(0, m_limitSeconds)));
     }
 
-    std::atomic<int> m_limitSeconds;
-    std::atomic<bool> m_stop{false};
-    std::mutex m_mutex;
+    static inline char s_message[1024];
+    static inline size_t s_length = 0;
+    int m_limitSeconds;
     std::string m_test;
-    Clock::time_point m_start;
-    std::thread m_thread;
 };
 
 StuckTestWatchdog *g_watchdog = nullptr;
