@@ -2,6 +2,7 @@
 
 #include "sgcore/geometry/sgpolymesh.h"
 
+#include <algorithm>
 #include <bit>
 #include <cstddef>
 #include <cstdint>
@@ -17,20 +18,24 @@
 //   "vt u v"         two short numbers
 //   "f a/b/c ..."    3 to 255 corners of positive indices (v, v/vt, v//vn, v/vt/vn)
 // A short number is [-]digits[.digits] with at most eight digits (seven after the point) and no
-// exponent;
-// an index has one to seven digits and no leading zero; blanks are spaces, tabs and '\r'.
+// exponent; an index has one to seven digits and is not 0 (on lines of up to 64 bytes leading
+// zeros are read as the general reader reads them, on longer ones they are left to it); blanks
+// are spaces, tabs and '\r'.
 //
-// Each function reads one line from just after its keyword and returns the start of the next
-// line, or null when the line is not in its plain form (anything else: comments, signs,
-// exponents, extra values, errors). Null takes nothing, so the caller reads the line again with
-// its general reader, which accepts every plain line with the same result; numbers convert
-// exactly as std::from_chars does (correctly rounded).
+// Each function reads one line from just after its keyword, sets `next` to the start of the
+// next line and returns true, or returns false when the line is not in its plain form (anything
+// else: comments, signs, exponents, extra values, errors). False takes nothing, so the caller
+// reads the line again with its general reader, which accepts every plain line with the same
+// result; numbers convert exactly as std::from_chars does (correctly rounded). `next` comes
+// from the line's end alone, not from the checks, so that the next line's reading need not
+// wait for this line's numbers: the checks end in a branch that is predicted.
 //
 // Speed: a line of up to 64 bytes is classified in one sweep of 16-byte compares into bit masks
-// (digits, points, signs, slashes, blanks, line end); the numbers' places then come from the
-// masks, not from the bytes read before them, so their conversions overlap. Longer faces go
-// through a word-at-a-time scan. Every read stays below `limit`, which must leave kReadAhead
-// readable bytes behind it: the caller calls only while the line starts before `limit`.
+// (digits, points, signs, slashes, blanks, line end); the numbers' and indices' places then come
+// from the masks, not from the bytes read before them, so their conversions overlap. Longer
+// faces, and faces with an empty index ("v//vn"), go through a word-at-a-time scan. Every read
+// stays below `limit`, which must leave kReadAhead readable bytes behind it: the caller calls only
+// while the line starts before `limit`.
 namespace SgObjPlainLine {
 
 constexpr std::ptrdiff_t kReadAhead = 96;
@@ -103,28 +108,36 @@ constexpr double kInversePowersOfTen[] = {1e0, 1e-1, 1e-2, 1e-3, 1e-4, 1e-5, 1e-
     return true;
 }
 
-// Digits, blanks and the line's end among 64 bytes, one bit per byte; only up to the 16-byte
-// block that holds the first line end.
+// Digits, blanks, the line's end and up to two marks (none when 0) among 64 bytes, one bit per
+// byte; only up to the 16-byte block that holds the first line end.
 struct Masks {
-    std::uint64_t digit = 0, blank = 0, end = 0;
+    std::uint64_t digit = 0, blank = 0, end = 0, mark = 0, mark2 = 0;
 };
 
-inline Masks classify(const char *p) {
+template <char Mark, char Mark2 = Mark>
+[[gnu::always_inline]] inline Masks classify(const char *p) {
     Masks m;
 #if defined(__SSE2__)
     const __m128i zero = _mm_set1_epi8('0'), nine = _mm_set1_epi8(9);
     const __m128i space = _mm_set1_epi8(' '), tab = _mm_set1_epi8('\t');
     const __m128i cr = _mm_set1_epi8('\r'), newline = _mm_set1_epi8('\n');
+    const __m128i mark = _mm_set1_epi8(Mark), mark2 = _mm_set1_epi8(Mark2);
+#pragma GCC unroll 4
     for (int i = 0; i < 64; i += 16) {
         const __m128i v = _mm_loadu_si128(reinterpret_cast<const __m128i *>(p + i));
         const __m128i d = _mm_sub_epi8(v, zero);
         const __m128i blank = _mm_or_si128(
             _mm_or_si128(_mm_cmpeq_epi8(v, space), _mm_cmpeq_epi8(v, tab)), _mm_cmpeq_epi8(v, cr));
-        m.digit |= std::uint64_t(
-                       std::uint16_t(_mm_movemask_epi8(_mm_cmpeq_epi8(_mm_min_epu8(d, nine), d))))
-                   << i;
-        m.blank |= std::uint64_t(std::uint16_t(_mm_movemask_epi8(blank))) << i;
-        m.end |= std::uint64_t(std::uint16_t(_mm_movemask_epi8(_mm_cmpeq_epi8(v, newline)))) << i;
+        const auto bits = [i](__m128i x) {
+            return std::uint64_t(std::uint16_t(_mm_movemask_epi8(x))) << i;
+        };
+        m.digit |= bits(_mm_cmpeq_epi8(_mm_min_epu8(d, nine), d));
+        m.blank |= bits(blank);
+        if constexpr (Mark != 0)
+            m.mark |= bits(_mm_cmpeq_epi8(v, mark));
+        if constexpr (Mark2 != Mark)
+            m.mark2 |= bits(_mm_cmpeq_epi8(v, mark2));
+        m.end |= bits(_mm_cmpeq_epi8(v, newline));
         if (m.end)
             break;
     }
@@ -134,6 +147,8 @@ inline Masks classify(const char *p) {
         const std::uint64_t bit = std::uint64_t(1) << i;
         m.digit |= static_cast<unsigned>(c - '0') < 10 ? bit : 0;
         m.blank |= (c == ' ' || c == '\t' || c == '\r') ? bit : 0;
+        m.mark |= (Mark != 0 && c == Mark) ? bit : 0;
+        m.mark2 |= (Mark2 != Mark && c == Mark2) ? bit : 0;
         m.end |= c == '\n' ? bit : 0;
     }
 #endif
@@ -149,23 +164,38 @@ inline Masks classify(const char *p) {
     return (mask >> at) & 1u;
 }
 
-// The first byte of each blank-separated word of a line of up to 64 bytes; 0 when the line is
-// longer.
-[[gnu::always_inline]] inline std::uint64_t wordStarts(const Masks &m, int &length) {
+// The bytes of a line of up to 64 bytes (its end excluded) as a mask, and its length; 0 when the
+// line is longer.
+[[gnu::always_inline]] inline std::uint64_t lineBytes(const Masks &m, int &length) {
     if (m.end == 0)
         return 0;
     length = std::countr_zero(m.end);
-    const std::uint64_t words = ~m.blank & ((std::uint64_t(1) << length) - 1);
-    return words & ~(words << 1);
+    return (std::uint64_t(1) << length) - 1;
 }
 
+// The bytes below `count` (0 to 8) of a word.
+constexpr std::uint64_t kLowBytes[9] = {0,
+                                        0xFF,
+                                        0xFFFF,
+                                        0xFFFFFF,
+                                        0xFFFFFFFF,
+                                        0xFFFFFFFFFF,
+                                        0xFFFFFFFFFFFF,
+                                        0xFFFFFFFFFFFFFF,
+                                        ~std::uint64_t(0)};
+
 // Reads `count` blank-separated short numbers of a line of up to 64 bytes from the masks.
-inline const char *numbersInWindow(const char *p, float *out, int count) {
-    const Masks m = classify(p);
+[[gnu::always_inline]] inline bool numbersInWindow(const char *p, float *out, int count,
+                                                   const char *&next) {
+    const Masks m = classify<0>(p);
     int length = 0;
-    std::uint64_t starts = wordStarts(m, length);
+    const std::uint64_t line = lineBytes(m, length);
+    next = p + length + 1;
+    const std::uint64_t words = ~m.blank & line;
+    std::uint64_t starts = words & ~(words << 1);
     const std::uint64_t stops = m.blank | m.end;
     int k = 0;
+#pragma GCC unroll 3
     for (; starts != 0 && k < count; ++k, starts &= starts - 1) {
         int at = std::countr_zero(starts);
         const bool negative = p[at] == '-';
@@ -178,59 +208,111 @@ inline const char *numbersInWindow(const char *p, float *out, int count) {
         const int fractionDigits = point ? runLength(m.digit, at) : 0;
         at += fractionDigits;
         const int allDigits = integerDigits + fractionDigits;
-        if (!bitAt(stops, at) || allDigits == 0 || allDigits > 8 || fractionDigits > 7)
-            return nullptr;
+        if (!bitAt(stops, at) | (unsigned(allDigits - 1) > 7u) | (fractionDigits > 7))
+            return false;
         // The digits on both sides of the point as one word: the integer digits from the
         // word at the first digit, the rest from the word one byte further on.
         std::uint64_t before = 0, after = 0;
         std::memcpy(&before, digits, 8);
         std::memcpy(&after, digits + 1, 8);
-        const std::uint64_t low = integerDigits ? ~std::uint64_t(0) >> (64 - 8 * integerDigits) : 0;
+        const std::uint64_t low = kLowBytes[integerDigits];
         const std::uint64_t word = point ? (before & low) | (after & ~low) : before;
-        std::uint32_t mantissa = wordValue(word, allDigits);
+        const std::uint32_t mantissa = wordValue(word, allDigits);
         if (!toFloat(negative, mantissa, fractionDigits, out[k]))
-            return nullptr;
+            return false;
     }
-    return k == count && starts == 0 && m.end ? p + length + 1 : nullptr;
+    return k == count && starts == 0 && line;
 }
 
-// One index of a face from the masks: one to seven digits, no leading zero.
-[[gnu::always_inline]] inline bool indexInWindow(const char *p, const Masks &m, int &at,
-                                                 std::int32_t &out, std::uint32_t &max) {
-    const int digits = runLength(m.digit, at);
-    if (digits == 0 || digits > 7 || p[at] == '0')
-        return false;
-    const std::uint32_t value = digitsValue(p + at, digits);
+// The bytes just after the digit runs that start at the bits of `starts`: adding a run's first
+// bit to the digit mask carries through the run to the byte behind it.
+[[gnu::always_inline]] inline std::uint64_t behindRuns(std::uint64_t digit, std::uint64_t starts) {
+    return (digit + starts) & ~digit;
+}
+
+// The index in the run of digits that starts at the lowest bit of `starts` and ends at the
+// lowest bit of `ends` (both not 0; at most seven digits), and both bits cleared; its value
+// goes into `max`, and the sign bit of `zero` is set for an index 0.
+[[gnu::always_inline]] inline std::int32_t nextIndex(const char *p, std::uint64_t &starts,
+                                                     std::uint64_t &ends, std::uint32_t &max,
+                                                     std::uint32_t &zero) {
+    const int first = __builtin_ctzll(starts), last = __builtin_ctzll(ends);
+    std::uint64_t chunk = 0;
+    std::memcpy(&chunk, p + first, 8);
+    // The digits to the top of the word, as wordValue does.
+    chunk <<= 8 * (7 - last + first);
+    chunk = ((chunk & 0x0F0F0F0F0F0F0F0Fu) * 2561) >> 8;
+    chunk = ((chunk & 0x00FF00FF00FF00FFu) * 6553601) >> 16;
+    const auto value =
+        static_cast<std::uint32_t>(((chunk & 0x0000FFFF0000FFFFu) * 42949672960001u) >> 32);
+    starts &= starts - 1;
+    ends &= ends - 1;
     max = value > max ? value : max;
-    out = std::int32_t(value) - 1;
-    at += digits;
-    return true;
+    zero |= value - 1;
+    return std::int32_t(value - 1);
 }
 
-inline const char *faceInWindow(const char *p, SgFaceCorner *corners, int &count,
-                                FaceIndexMax &max) {
-    const Masks m = classify(p);
-    int length = 0;
-    const std::uint64_t stops = m.blank | m.end;
-    count = 0;
-    for (std::uint64_t starts = wordStarts(m, length); starts != 0; starts &= starts - 1) {
-        SgFaceCorner &c = corners[count++];
-        c.uv = -1;
-        c.third = -1;
-        int at = std::countr_zero(starts);
-        if (!indexInWindow(p, m, at, c.vertex, max.vertex))
-            return nullptr;
-        if (p[at] == '/') {
-            ++at;
-            if (p[at] != '/' && !indexInWindow(p, m, at, c.uv, max.uv))
-                return nullptr;
-            if (p[at] == '/' && !indexInWindow(p, m, ++at, c.third, max.normal))
-                return nullptr;
-        }
-        if (!bitAt(stops, at))
-            return nullptr;
+// The corners of a face line with `K` slashes to the corner: their indices' runs start at the
+// bits of `starts[i]` and end just before those of `behind[i]` (i = 0 for the first index of
+// each corner, 1 after the first slash, 2 after the second); false for an index 0.
+template <int K>
+[[gnu::always_inline]] inline bool cornersFrom(const char *p, const std::uint64_t *starts,
+                                               const std::uint64_t *behind, SgFaceCorner *corners,
+                                               int &count, FaceIndexMax &max) {
+    std::uint64_t s0 = starts[0], e0 = behind[0] >> 1;
+    std::uint64_t s1 = starts[1], e1 = behind[1] >> 1;
+    std::uint64_t s2 = starts[2], e2 = behind[2] >> 1;
+    std::uint32_t zero = 0, maxVertex = 0, maxUV = 0, maxNormal = 0;
+    int n = 0;
+    for (; s0 != 0; ++n) {
+        SgFaceCorner &c = corners[n];
+        c.vertex = nextIndex(p, s0, e0, maxVertex, zero);
+        c.uv = K >= 1 ? nextIndex(p, s1, e1, maxUV, zero) : -1;
+        c.third = K == 2 ? nextIndex(p, s2, e2, maxNormal, zero) : -1;
     }
-    return m.end ? p + length + 1 : nullptr;
+    count = n;
+    max = {maxVertex, maxUV, maxNormal};
+    // Indices have at most seven digits: only an index 0 sets the sign bit.
+    return std::int32_t(zero) >= 0;
+}
+
+// A face line of up to 64 bytes whose corners all have the same form, "v", "v/vt" or
+// "v/vt/vn" (no empty index), from the masks: the form is checked on the masks (only digits,
+// blanks and slashes; every slash between two digits; runs of at most seven digits; behind the
+// first index of every corner a slash or of none, and so on), and each index is then read from
+// its run's first and last bit, so the indices of a line convert side by side.
+[[gnu::always_inline]] inline bool faceInWindow(const char *p, SgFaceCorner *corners, int &count,
+                                                FaceIndexMax &max, const char *&next) {
+    const Masks m = classify<'/'>(p);
+    int length = 0;
+    const std::uint64_t line = lineBytes(m, length);
+    next = p + length + 1;
+    const std::uint64_t digit = m.digit & line, slash = m.mark & line;
+    std::uint64_t eight = digit & (digit >> 1);
+    eight &= eight >> 2;
+    eight &= eight >> 4;
+    if (line == 0 || ((digit | slash | m.blank) & line) != line ||
+        (slash & ~((digit << 1) & (digit >> 1))) != 0 || eight != 0)
+        return false;
+    // The runs that follow a blank (byte 0, the blank after the keyword, is not a digit).
+    std::uint64_t starts[3] = {digit & ~((digit | slash) << 1), 0, 0};
+    std::uint64_t behind[3] = {behindRuns(digit, starts[0]), 0, 0};
+    int k = 0;
+    // Every slash follows a run and is followed by one, so the slashes behind the first runs,
+    // then behind the runs after those, account for all of them.
+    while (k < 2 && (behind[k] & slash) != 0) {
+        if ((behind[k] & ~slash) != 0)
+            return false;
+        starts[k + 1] = behind[k] << 1;
+        behind[k + 1] = behindRuns(digit, starts[k + 1]);
+        ++k;
+    }
+    if ((behind[k] & slash) != 0)
+        return false;
+    const bool indicesFrom1 = k == 0   ? cornersFrom<0>(p, starts, behind, corners, count, max)
+                              : k == 1 ? cornersFrom<1>(p, starts, behind, corners, count, max)
+                                       : cornersFrom<2>(p, starts, behind, corners, count, max);
+    return indicesFrom1 && count >= 3;
 }
 
 [[gnu::always_inline]] inline bool isBlank(char c) {
@@ -280,26 +362,25 @@ inline const char *faceInWords(const char *p, const char *limit, SgFaceCorner *c
 } // namespace detail
 
 // "v": `p` just after the keyword.
-inline const char *vertex(const char *p, float out[3]) {
-    return detail::numbersInWindow(p, out, 3);
+[[gnu::always_inline]] inline bool vertex(const char *p, float out[3], const char *&next) {
+    return detail::numbersInWindow(p, out, 3, next);
 }
 
 // "vt": `p` just after the keyword.
-inline const char *uv(const char *p, float out[2]) {
-    return detail::numbersInWindow(p, out, 2);
+[[gnu::always_inline]] inline bool uv(const char *p, float out[2], const char *&next) {
+    return detail::numbersInWindow(p, out, 2, next);
 }
 
 // "f": `p` just after the keyword; `corners` has room for 255. Sets the corner count (3 or
 // more on success) and the line's largest indices.
-inline const char *face(const char *p, const char *limit, SgFaceCorner *corners, int &count,
-                        FaceIndexMax &max) {
+[[gnu::always_inline]] inline bool face(const char *p, const char *limit, SgFaceCorner *corners,
+                                        int &count, FaceIndexMax &max, const char *&next) {
     max = FaceIndexMax();
-    const char *next = detail::faceInWindow(p, corners, count, max);
-    if (!next) {
-        max = FaceIndexMax();
-        next = detail::faceInWords(p, limit, corners, count, max);
-    }
-    return next && count >= 3 ? next : nullptr;
+    if (detail::faceInWindow(p, corners, count, max, next))
+        return true;
+    max = FaceIndexMax();
+    next = detail::faceInWords(p, limit, corners, count, max);
+    return next && count >= 3;
 }
 
 } // namespace SgObjPlainLine

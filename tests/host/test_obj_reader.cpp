@@ -173,4 +173,18 @@ TEST(HostObjReader, ReadsFilesOddButValidTextAndExactNumbers) {
         std::from_chars(numbers[i], numbers[i] + std::strlen(numbers[i]), expected);
         EXPECT_EQ(0, std::memcmp(&expected, &r.getMesh()->getVertices()[i].x, 4)) << numbers[i];
     }
+
+    // Plain faces of every form read as the general reader reads them (on indented lines).
+    const std::string faces =
+        "v 0 0 0\nv 1 0 0\nv 0 1 0\nvt 0 0\nvt 1 0\nvn 0 0 1\nusemtl m\n"
+        "f 1 2 3\nf 1/1 2/2 3/1\nf 1/1/1 2/2/1 003/1/1 1/2/1\nf 3//1 2//1 1//1\n" +
+        std::string(100, '#') + "\n";
+    std::string indented = " ";
+    for (char c : faces)
+        indented += c == '\n' ? std::string("\n ") : std::string(1, c);
+    SgObjReader general;
+    ASSERT_TRUE(read(r, faces) && read(general, indented));
+    EXPECT_EQ(r.getMesh()->triangleCorners(), general.getMesh()->triangleCorners());
+    EXPECT_EQ(r.getMesh()->quadCorners(), general.getMesh()->quadCorners());
+    EXPECT_EQ(r.getMesh()->getTriangleCount(), 3);
 }
