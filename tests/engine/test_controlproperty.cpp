@@ -47,28 +47,21 @@ struct TwoProps {
 
 class ControlProperty : public EngineTest {};
 
-TEST_F(ControlProperty, WithoutAUsableControlTheMorphsAreMadeUnlinked) {
-    // No control node: every morph is made, none linked.
+// A namesake on the control node that is not a float property: no link, and the log says so.
+TEST_F(ControlProperty, ANamesakeThatIsNoFloatPropertyLeavesTheMorphsUnlinked) {
     TwoProps props;
-    props.run();
-    ASSERT_TRUE(channelOf(props.a, "Smile") && channelOf(props.b, "Smile"));
-    EXPECT_EQ(props.loader.controlProperty(), nullptr);
-    EXPECT_EQ(channelOf(props.a, "Smile")->getControllerCount(), 0);
-
-    // A namesake on the control node that is not a float property: no link, and the log says so.
-    TwoProps other;
     auto *controls = new SgNode("Controls");
     scene()->addNode(controls);
     controls->addProperty(new SgIntProperty("Smile"));
-    other.loader.setControlNode(controls);
-    other.run();
-    ASSERT_TRUE(channelOf(other.a, "Smile") && channelOf(other.b, "Smile"));
-    EXPECT_EQ(channelOf(other.a, "Smile")->getControllerCount(), 0);
-    EXPECT_EQ(other.loader.controlProperty(), nullptr);
-    EXPECT_TRUE(other.log.toHtml().contains("Warning: </FONT>The property Smile on Controls is "
+    props.loader.setControlNode(controls);
+    props.run();
+    ASSERT_TRUE(channelOf(props.a, "Smile") && channelOf(props.b, "Smile"));
+    EXPECT_EQ(channelOf(props.a, "Smile")->getControllerCount(), 0);
+    EXPECT_EQ(props.loader.controlProperty(), nullptr);
+    EXPECT_TRUE(props.log.toHtml().contains("Warning: </FONT>The property Smile on Controls is "
                                             "not a float property: the morph is not linked to a "
                                             "control property.<BR>\n</BODY>"))
-        << other.log.toHtml().toStdString();
+        << props.log.toHtml().toStdString();
 }
 
 TEST_F(ControlProperty, FirstMorphOnTheControlNodeDrivesTheOthers) {
@@ -137,39 +130,32 @@ TEST_F(ControlProperty, UnplacedPropertiesArePlacedOrDiscarded) {
     auto *controls = new SgNode("Controls");
     scene()->addNode(controls);
 
-    // A free property is placed on the control node.
-    {
+    // Prepares `property` as a loader's control for the control node, then runs `check` on the
+    // loader before it ends.
+    const auto prepare = [&](SgNumericProperty *property, auto check) {
         SgMorphLoader loader;
-        auto *free = new SgFloatProperty("Dial");
-        loader.setControlProperty(free);
+        loader.setControlProperty(property);
         loader.setControlNode(controls);
         loader.prepareControlProperty();
-        EXPECT_EQ(free->getOwner(), controls);
-    }
-    EXPECT_TRUE(controls->findProperty("Dial")); // placed: the loader leaves it
-
-    // A free namesake is dropped for the node's own property.
-    {
-        SgMorphLoader loader;
-        auto *free = new SgFloatProperty("Dial");
-        const auto life = free->getLifeToken();
-        loader.setControlProperty(free);
-        loader.setControlNode(controls);
-        loader.prepareControlProperty();
+        check(loader);
+    };
+    // A free property is placed on the control node, where the loader leaves it; a free
+    // namesake is dropped for the node's own property.
+    auto *dial = new SgFloatProperty("Dial");
+    prepare(dial, [&](SgMorphLoader &) { EXPECT_EQ(dial->getOwner(), controls); });
+    EXPECT_EQ(controls->findProperty("Dial"), dial);
+    auto *namesake = new SgFloatProperty("Dial");
+    const auto life = namesake->getLifeToken();
+    prepare(namesake, [&](SgMorphLoader &loader) {
         EXPECT_TRUE(life.expired());
-        EXPECT_EQ(loader.controlProperty(), controls->findProperty("Dial"));
-    }
-
+        EXPECT_EQ(loader.controlProperty(), dial);
+    });
     // A control morph goes onto the control node's object, made for it when missing.
-    {
-        SgMorphLoader loader;
-        auto *morph = new SgMorph("Ctrl");
-        loader.setControlProperty(morph->getValueChannel());
-        loader.setControlNode(controls);
-        loader.prepareControlProperty();
+    auto *morph = new SgMorph("Ctrl");
+    prepare(morph->getValueChannel(), [&](SgMorphLoader &) {
         ASSERT_TRUE(controls->getObject());
         EXPECT_EQ(controls->getObject()->findModifier("Ctrl"), morph);
-    }
+    });
 
     // Without a control node, replaced, or left at the end: an unplaced property is deleted.
     std::weak_ptr<const void> lives[3];
@@ -181,9 +167,9 @@ TEST_F(ControlProperty, UnplacedPropertiesArePlacedOrDiscarded) {
         loader.prepareControlProperty();
         EXPECT_EQ(loader.controlProperty(), nullptr);
 
-        auto *morph = new SgMorph("Two");
-        lives[1] = morph->getValueChannel()->getLifeToken();
-        loader.setControlProperty(morph->getValueChannel());
+        auto *two = new SgMorph("Two");
+        lives[1] = two->getValueChannel()->getLifeToken();
+        loader.setControlProperty(two->getValueChannel());
         auto *third = new SgIntProperty("Three");
         lives[2] = third->getLifeToken();
         loader.setControlProperty(third);

@@ -88,7 +88,7 @@ protected:
     }
 };
 
-TEST_F(FigureScene, ModeZeroTakesEveryBoneOfTheSelectedBonesFigureAndTheFigure) {
+TEST_F(FigureScene, ModesZeroAndTwoChooseTheSelectedFigureOrThePrimarySelection) {
     list.addFile(writeFile("lift.obj", figureTarget(0.5, 0)));
     scene->selectNode(neck);
     list.createMorphs(options, 0, log);
@@ -111,6 +111,18 @@ TEST_F(FigureScene, ModeZeroTakesEveryBoneOfTheSelectedBonesFigureAndTheFigure) 
     EXPECT_EQ(lastProgress().total, 0);
     EXPECT_TRUE(empty.hasProblems());
     EXPECT_FALSE(hasMorph(head, "again"));
+
+    // Mode 2 loads onto the primary selection only.
+    list.clear();
+    list.addFile(writeFile("dent.obj", "v 0 2 0.5\nv 1 2 0\nv 0 3 0\nf 1 2 3\n"));
+    scene->selectNode(neck);
+    scene->selectNode(prop, true);
+    SgMorphLoadLog primary;
+    list.createMorphs(options, 2, primary);
+    EXPECT_EQ(triedNodes(), QStringList({"box"}));
+    EXPECT_TRUE(hasMorph(prop, "dent"));
+    EXPECT_FALSE(primary.hasProblems());
+    EXPECT_EQ(lastProgress().total, 2);
 }
 
 TEST_F(FigureScene, ModeOneRunsSourcesTopDownOnTheSelectionAndSkipsOnAFailedPose) {
@@ -138,17 +150,6 @@ TEST_F(FigureScene, ModeOneRunsSourcesTopDownOnTheSelectionAndSkipsOnAFailedPose
     EXPECT_FALSE(hasMorph(neck, "third"));
     EXPECT_FALSE(hasMorph(head, "first"));
     EXPECT_EQ(lastProgress().total, 3); // one target times three file rows
-}
-
-TEST_F(FigureScene, ModeTwoLoadsOntoThePrimarySelectionOnly) {
-    list.addFile(writeFile("dent.obj", "v 0 2 0.5\nv 1 2 0\nv 0 3 0\nf 1 2 3\n"));
-    scene->selectNode(neck);
-    scene->selectNode(prop, true);
-    list.createMorphs(options, 2, log);
-    EXPECT_EQ(triedNodes(), QStringList({"box"}));
-    EXPECT_TRUE(hasMorph(prop, "dent"));
-    EXPECT_FALSE(log.hasProblems());
-    EXPECT_EQ(lastProgress().total, 2);
 }
 
 TEST_F(FigureScene, TheInMemorySourceTargetsItsOwnFiguresBones) {

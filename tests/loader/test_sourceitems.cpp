@@ -167,9 +167,10 @@ TEST_F(SourceItems, UnknownAndOutOfRangeTextsFallBackToDefaults) {
 }
 
 TEST_F(SourceItems, InPlaceEditsFollowTheMorphNameAndRevertBadNumbers) {
+    SgMorphSourceItem *name = findRow(head, "Name:");
     auto *label = findRow(head, "Label:");
     boolRow(head, "Use Secondary Label:")->setValue(true);
-    editInPlace(findRow(head, "Name:"), "smile");
+    editInPlace(name, "smile");
     EXPECT_EQ(head->loader().morphName(), "smile");
     EXPECT_EQ(label->text(1), "smile");
     EXPECT_EQ(findRow(head, "Property:")->text(1), "smile");
@@ -177,12 +178,12 @@ TEST_F(SourceItems, InPlaceEditsFollowTheMorphNameAndRevertBadNumbers) {
     // Leaving the label editor on the shown name keeps it following the name.
     editInPlace(label, "smile");
     EXPECT_EQ(head->loader().customLabel(), "");
-    editInPlace(findRow(head, "Name:"), "grin");
+    editInPlace(name, "grin");
     EXPECT_EQ(label->text(1), "grin");
 
     editInPlace(label, "Big Grin");
     EXPECT_EQ(head->loader().customLabel(), "Big Grin");
-    editInPlace(findRow(head, "Name:"), "grin2");
+    editInPlace(name, "grin2");
     EXPECT_EQ(label->text(1), "Big Grin");
     editInPlace(label, "");
     EXPECT_EQ(head->loader().customLabel(), "");
@@ -202,7 +203,7 @@ TEST_F(SourceItems, InPlaceEditsFollowTheMorphNameAndRevertBadNumbers) {
     EXPECT_EQ(openEditor(list), nullptr);
 
     // Column 0 is never edited, and "Label:" only while "Use Secondary Label:" is yes.
-    static_cast<SgMorphSourceItem *>(findRow(head, "Name:"))->showEditor(QPoint(), 0);
+    name->showEditor(QPoint(), 0);
     EXPECT_EQ(openEditor(list), nullptr);
     boolRow(head, "Use Secondary Label:")->setValue(false);
     label->showEditor(QPoint(), 1);
@@ -210,7 +211,6 @@ TEST_F(SourceItems, InPlaceEditsFollowTheMorphNameAndRevertBadNumbers) {
 
     // A press on the current in-place row opens its editor; the first press only makes it
     // current.
-    SgMorphSourceItem *name = findRow(head, "Name:");
     list.setCurrentItem(head);
     const QPoint at(list.columnViewportPosition(1) + 5, list.visualItemRect(name).center().y());
     QTest::mouseClick(list.viewport(), Qt::LeftButton, {}, at);

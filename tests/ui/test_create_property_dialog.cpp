@@ -404,18 +404,16 @@ public:
         QTest::mouseRelease(viewport, Qt::LeftButton, Qt::NoModifier, point);
     }
 
-    // Double-clicks the label of `row` and types `text`. Returns whether an editor opened.
-    bool type(int row, const QString &text) {
+    // Double-clicks the label of `row` and types `text` into the editor that opens.
+    void type(int row, const QString &text) {
         doubleClick(row, 1);
         QLineEdit *editor = openEditor();
-        if (!editor)
-            return false;
+        ASSERT_NE(editor, nullptr) << "no editor on row " << row;
         editor->selectAll();
         QTest::keyClick(editor, Qt::Key_Backspace);
         QTest::keyClicks(editor, text);
         QTest::keyClick(editor, Qt::Key_Return);
         QApplication::processEvents();
-        return true;
     }
 
     // The open in-place editor, or null (closed editors linger until deleted).
@@ -427,8 +425,9 @@ public:
         return nullptr;
     }
 
-    void select(int row) { m_list->setCurrentItem(m_list->topLevelItem(row)); }
-    void press(const char *button) {
+    // Selects `row` and presses the up, down or delete button.
+    void press(int row, const char *button) {
+        m_list->setCurrentItem(m_list->topLevelItem(row));
         QTest::mouseClick(m_dialog.findChild<QPushButton *>(button), Qt::LeftButton);
     }
 
@@ -465,44 +464,38 @@ TEST_F(CreatePropertyDialog, EnumEditorKeepsRowsAndSlidersInStep) {
     editor.expect({}, __LINE__);
     editor.doubleClick(0, 0); // the "Int Val" column is not renamed
     EXPECT_EQ(editor.openEditor(), nullptr);
-    ASSERT_TRUE(editor.type(0, "A"));
+    editor.type(0, "A");
     editor.expect({"0:A"}, __LINE__);
-    ASSERT_TRUE(editor.type(1, "B"));
-    ASSERT_TRUE(editor.type(2, "C"));
+    editor.type(1, "B");
+    editor.type(2, "C");
     editor.expect({"0:A", "1:B", "2:C"}, __LINE__);
-    ASSERT_TRUE(editor.type(1, "b"));
+    editor.type(1, "b");
     editor.expect({"0:A", "1:b", "2:C"}, __LINE__);
 
     // Moves that change nothing: first row up, placeholder up or down, last real row down.
-    editor.select(0);
-    editor.press("SgMoveEnumUpButton");
-    editor.select(3);
-    editor.press("SgMoveEnumUpButton");
-    editor.press("SgMoveEnumDownButton");
-    editor.press("SgDeleteEnumDownButton");
-    editor.select(2);
-    editor.press("SgMoveEnumDownButton");
+    editor.press(0, "SgMoveEnumUpButton");
+    editor.press(3, "SgMoveEnumUpButton");
+    editor.press(3, "SgMoveEnumDownButton");
+    editor.press(3, "SgDeleteEnumDownButton");
+    editor.press(2, "SgMoveEnumDownButton");
     editor.expect({"0:A", "1:b", "2:C"}, __LINE__);
 
-    editor.select(1);
-    editor.press("SgMoveEnumUpButton");
+    editor.press(1, "SgMoveEnumUpButton");
     editor.expect({"0:b", "1:A", "2:C"}, __LINE__);
     EXPECT_EQ(editor.currentLabel(), "b");
 
     // After a removal the rows below are renumbered, so later edits reach the right items, and
     // the sliders' current item moves down with its index.
     editor.defaultSlider()->setCurrentIndex(2);
-    editor.select(0);
-    editor.press("SgDeleteEnumDownButton");
+    editor.press(0, "SgDeleteEnumDownButton");
     editor.expect({"0:A", "1:C"}, __LINE__);
     EXPECT_EQ(editor.defaultSlider()->currentIndex(), 1);
-    ASSERT_TRUE(editor.type(1, "Z"));
+    editor.type(1, "Z");
     editor.expect({"0:A", "1:Z"}, __LINE__);
-    ASSERT_TRUE(editor.type(2, "D"));
-    editor.select(1);
-    editor.press("SgDeleteEnumDownButton");
+    editor.type(2, "D");
+    editor.press(1, "SgDeleteEnumDownButton");
     editor.expect({"0:A", "1:D"}, __LINE__);
-    ASSERT_TRUE(editor.type(2, ""));
+    editor.type(2, "");
 
     // The property takes the rows' labels and both sliders' indices.
     editor.defaultSlider()->setCurrentIndex(1);
@@ -521,8 +514,8 @@ TEST_F(CreatePropertyDialog, DefaultsSavedValuesAndCancel) {
     dialog->setDefaultName("keep");
     dialog->show();
     EnumEditor editor(*dialog);
-    ASSERT_TRUE(editor.type(0, "A"));
-    ASSERT_TRUE(editor.type(1, "B"));
+    editor.type(0, "A");
+    editor.type(1, "B");
     editor.defaultSlider()->setCurrentIndex(1);
     setText(*dialog, "SgPropertyLabelAttrib", "Keep");
     setFloat(*dialog, "SgFloatMinAttrib", -4.0f);
@@ -532,9 +525,8 @@ TEST_F(CreatePropertyDialog, DefaultsSavedValuesAndCancel) {
     setText(*dialog, "SgPropertyInternalNameAttrib", "changed");
     setFloat(*dialog, "SgFloatMinAttrib", 7.0f);
     setOn(*dialog, "SgPropertyHiddenAttrib", true);
-    editor.select(0);
-    editor.press("SgDeleteEnumDownButton");
-    ASSERT_TRUE(editor.type(1, "X"));
+    editor.press(0, "SgDeleteEnumDownButton");
+    editor.type(1, "X");
     QTest::mouseClick(child<QPushButton>(*dialog, "SgCancelCreatePropButton"), Qt::LeftButton);
     EXPECT_EQ(dialog->result(), QDialog::Rejected);
     EXPECT_FALSE(dialog->isVisible());
