@@ -32,7 +32,9 @@
 //
 // Speed: a line of up to 64 bytes is classified in one sweep of 16-byte compares into bit masks
 // (digits, points, signs, slashes, blanks, line end); the numbers' and indices' places then come
-// from the masks, not from the bytes read before them, so their conversions overlap. Longer
+// from the masks, not from the bytes read before them, so their conversions overlap; a run of
+// lines keeps its last line's shape (NumberShape, FaceShape), and a line with the same masks
+// skips the scans and checks and only converts its digits. Longer
 // faces, and faces with an empty index ("v//vn"), go through a word-at-a-time scan. Every read
 // stays below `limit`, which must leave kReadAhead readable bytes behind it: the caller calls only
 // while the line starts before `limit`.
