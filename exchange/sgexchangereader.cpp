@@ -111,7 +111,12 @@ private:
         if (available == 0)
             return 0;
         const unsigned char *source = input.take(0);
-        SgFaceCorner batch[kBatch * corners];
+        // Storage that is not filled with default corners first: each corner is written once.
+        union Batch {
+            Batch() {}
+            SgFaceCorner items[kBatch * corners];
+        } stack;
+        SgFaceCorner *batch = stack.items;
         std::uint8_t materials[kBatch];
         std::uint32_t bad = 0;
         size_t n = 0;

@@ -32,7 +32,9 @@
 //
 // Speed: a line of up to 64 bytes is classified in one sweep of 16-byte compares into bit masks
 // (digits, points, signs, slashes, blanks, line end); the numbers' and indices' places then come
-// from the masks, not from the bytes read before them, so their conversions overlap. Longer
+// from the masks, not from the bytes read before them, so their conversions overlap; a run of
+// lines keeps its last line's shape (NumberShape, FaceShape), and a line with the same masks
+// skips the scans and checks and only converts its digits. Longer
 // faces, and faces with an empty index ("v//vn"), go through a word-at-a-time scan. Every read
 // stays below `limit`, which must leave kReadAhead readable bytes behind it: the caller calls only
 // while the line starts before `limit`.
@@ -173,6 +175,43 @@ template <char Mark, char Mark2 = Mark>
     return (std::uint64_t(1) << length) - 1;
 }
 
+// The value of the eight digits of `word` (in memory order, leading zeros included).
+[[gnu::always_inline]] inline std::uint32_t eightDigits(std::uint64_t word) {
+    word = ((word & 0x0F0F0F0F0F0F0F0Fu) * 2561) >> 8;
+    word = ((word & 0x00FF00FF00FF00FFu) * 6553601) >> 16;
+    return static_cast<std::uint32_t>(((word & 0x0000FFFF0000FFFFu) * 42949672960001u) >> 32);
+}
+
+// A line's masks up to its end, which decide everything about a plain line but its digits'
+// values. Consecutive lines of a big file mostly share them (numbers printed with the same
+// number of digits, indices of the same lengths), so a line whose key equals the last one's
+// skips the scans and checks and only converts its digits.
+struct LineKey {
+    // A real key has one end bit at most: the empty key matches no line.
+    std::uint64_t digit = 0, blank = 0, end = ~std::uint64_t(0), mark = 0, mark2 = 0;
+    bool operator==(const LineKey &) const = default;
+};
+
+[[gnu::always_inline]] inline LineKey keyOf(const Masks &m) {
+    // The bits up to the first line end (all bits without one).
+    const std::uint64_t upToEnd = m.end ^ (m.end - 1);
+    return {m.digit & upToEnd, m.blank & upToEnd, m.end & upToEnd, m.mark & upToEnd,
+            m.mark2 & upToEnd};
+}
+
+// What a plain line of numbers' masks say about each number.
+struct NumberShape {
+    struct Number {
+        std::uint64_t low;  // the bytes of the integer digits, or all bytes without a point
+        int digitsAt;       // the first digit
+        int shift;          // the bits that put the digits at the top of a word
+        int fractionDigits; // digits after the point
+        bool negative;
+    };
+    LineKey key;
+    Number numbers[3];
+};
+
 // The bytes below `count` (0 to 8) of a word.
 constexpr std::uint64_t kLowBytes[9] = {0,
                                         0xFF,
@@ -184,44 +223,66 @@ constexpr std::uint64_t kLowBytes[9] = {0,
                                         0xFFFFFFFFFFFFFF,
                                         ~std::uint64_t(0)};
 
-// Reads `count` blank-separated short numbers of a line of up to 64 bytes from the masks.
-[[gnu::always_inline]] inline bool numbersInWindow(const char *p, float *out, int count,
-                                                   const char *&next) {
-    const Masks m = classify<0>(p);
+// Finds and checks `count` blank-separated short numbers of a line of up to 64 bytes from its
+// masks ('.' the mark, '-' the second mark) into `shape`; false when the line is not plain.
+inline bool numberShape(const Masks &m, int count, NumberShape &shape) {
     int length = 0;
     const std::uint64_t line = lineBytes(m, length);
-    next = p + length + 1;
     const std::uint64_t words = ~m.blank & line;
     std::uint64_t starts = words & ~(words << 1);
     const std::uint64_t stops = m.blank | m.end;
     int k = 0;
-#pragma GCC unroll 3
     for (; starts != 0 && k < count; ++k, starts &= starts - 1) {
+        NumberShape::Number &n = shape.numbers[k];
         int at = std::countr_zero(starts);
-        const bool negative = p[at] == '-';
-        at += negative;
-        const char *digits = p + at;
+        n.negative = bitAt(m.mark2, at);
+        at += n.negative;
+        n.digitsAt = at;
         const int integerDigits = runLength(m.digit, at);
         at += integerDigits;
-        const bool point = p[at] == '.';
+        const bool point = bitAt(m.mark, at);
         at += point;
-        const int fractionDigits = point ? runLength(m.digit, at) : 0;
-        at += fractionDigits;
-        const int allDigits = integerDigits + fractionDigits;
-        if (!bitAt(stops, at) | (unsigned(allDigits - 1) > 7u) | (fractionDigits > 7))
+        n.fractionDigits = point ? runLength(m.digit, at) : 0;
+        at += n.fractionDigits;
+        const int allDigits = integerDigits + n.fractionDigits;
+        if (!bitAt(stops, at) | (unsigned(allDigits - 1) > 7u) | (n.fractionDigits > 7))
             return false;
-        // The digits on both sides of the point as one word: the integer digits from the
+        // The digits on both sides of the point make one word: the integer digits from the
         // word at the first digit, the rest from the word one byte further on.
-        std::uint64_t before = 0, after = 0;
-        std::memcpy(&before, digits, 8);
-        std::memcpy(&after, digits + 1, 8);
-        const std::uint64_t low = kLowBytes[integerDigits];
-        const std::uint64_t word = point ? (before & low) | (after & ~low) : before;
-        const std::uint32_t mantissa = wordValue(word, allDigits);
-        if (!toFloat(negative, mantissa, fractionDigits, out[k]))
-            return false;
+        n.low = point ? kLowBytes[integerDigits] : ~std::uint64_t(0);
+        n.shift = 8 * (8 - allDigits);
     }
     return k == count && starts == 0 && line;
+}
+
+// One number of a line of the shape's form.
+[[gnu::always_inline]] inline bool numberOf(const char *p, const NumberShape::Number &n,
+                                            float &out) {
+    std::uint64_t before = 0, after = 0;
+    std::memcpy(&before, p + n.digitsAt, 8);
+    std::memcpy(&after, p + n.digitsAt + 1, 8);
+    const std::uint64_t word = (before & n.low) | (after & ~n.low);
+    return toFloat(n.negative, eightDigits(word << n.shift), n.fractionDigits, out);
+}
+
+// Reads `count` blank-separated short numbers of a line of up to 64 bytes; `shape` is the last
+// line's.
+[[gnu::always_inline]] inline bool numbersInWindow(const char *p, float *out, int count,
+                                                   const char *&next, NumberShape &shape) {
+    const Masks m = classify<'.', '-'>(p);
+    next = p + std::countr_zero(m.end) + 1;
+    const LineKey key = keyOf(m);
+    if (!(key == shape.key)) {
+        shape.key = LineKey();
+        if (!numberShape(m, count, shape))
+            return false;
+        shape.key = key;
+    }
+    bool ok = true;
+#pragma GCC unroll 3
+    for (int k = 0; k < count; ++k)
+        ok &= numberOf(p, shape.numbers[k], out[k]);
+    return ok;
 }
 
 // The bytes just after the digit runs that start at the bits of `starts`: adding a run's first
@@ -230,63 +291,33 @@ constexpr std::uint64_t kLowBytes[9] = {0,
     return (digit + starts) & ~digit;
 }
 
-// The index in the run of digits that starts at the lowest bit of `starts` and ends at the
-// lowest bit of `ends` (both not 0; at most seven digits), and both bits cleared; its value
-// goes into `max`, and the sign bit of `zero` is set for an index 0.
-[[gnu::always_inline]] inline std::int32_t nextIndex(const char *p, std::uint64_t &starts,
-                                                     std::uint64_t &ends, std::uint32_t &max,
-                                                     std::uint32_t &zero) {
-    const int first = __builtin_ctzll(starts), last = __builtin_ctzll(ends);
-    std::uint64_t chunk = 0;
-    std::memcpy(&chunk, p + first, 8);
-    // The digits to the top of the word, as wordValue does.
-    chunk <<= 8 * (7 - last + first);
-    chunk = ((chunk & 0x0F0F0F0F0F0F0F0Fu) * 2561) >> 8;
-    chunk = ((chunk & 0x00FF00FF00FF00FFu) * 6553601) >> 16;
-    const auto value =
-        static_cast<std::uint32_t>(((chunk & 0x0000FFFF0000FFFFu) * 42949672960001u) >> 32);
-    starts &= starts - 1;
-    ends &= ends - 1;
-    max = value > max ? value : max;
-    zero |= value - 1;
-    return std::int32_t(value - 1);
-}
+// What a plain face line's masks say about its indices: `K` slashes to the corner, and where
+// each index's digits start and the shift that puts them at the top of a word, corner by
+// corner.
+struct FaceShape {
+    LineKey key;
+    int k = 0, count = 0;
+    // A line of 64 bytes holds at most 31 indices.
+    std::int8_t first[32], shift[32];
+};
 
-// The corners of a face line with `K` slashes to the corner: their indices' runs start at the
-// bits of `starts[i]` and end just before those of `behind[i]` (i = 0 for the first index of
-// each corner, 1 after the first slash, 2 after the second); false for an index 0.
-template <int K>
-[[gnu::always_inline]] inline bool cornersFrom(const char *p, const std::uint64_t *starts,
-                                               const std::uint64_t *behind, SgFaceCorner *corners,
-                                               int &count, FaceIndexMax &max) {
-    std::uint64_t s0 = starts[0], e0 = behind[0] >> 1;
-    std::uint64_t s1 = starts[1], e1 = behind[1] >> 1;
-    std::uint64_t s2 = starts[2], e2 = behind[2] >> 1;
-    std::uint32_t zero = 0, maxVertex = 0, maxUV = 0, maxNormal = 0;
-    int n = 0;
-    for (; s0 != 0; ++n) {
-        SgFaceCorner &c = corners[n];
-        c.vertex = nextIndex(p, s0, e0, maxVertex, zero);
-        c.uv = K >= 1 ? nextIndex(p, s1, e1, maxUV, zero) : -1;
-        c.third = K == 2 ? nextIndex(p, s2, e2, maxNormal, zero) : -1;
+// The runs of one index of every corner: they start at the bits of `starts` and end at those of
+// `ends`; every `step`-th place of the shape from `at` on.
+inline void runsOf(std::uint64_t starts, std::uint64_t ends, int at, int step, FaceShape &shape) {
+    for (; starts != 0; starts &= starts - 1, ends &= ends - 1, at += step) {
+        const int first = __builtin_ctzll(starts), last = __builtin_ctzll(ends);
+        shape.first[at] = std::int8_t(first);
+        shape.shift[at] = std::int8_t(8 * (7 - last + first));
     }
-    count = n;
-    max = {maxVertex, maxUV, maxNormal};
-    // Indices have at most seven digits: only an index 0 sets the sign bit.
-    return std::int32_t(zero) >= 0;
 }
 
-// A face line of up to 64 bytes whose corners all have the same form, "v", "v/vt" or
-// "v/vt/vn" (no empty index), from the masks: the form is checked on the masks (only digits,
-// blanks and slashes; every slash between two digits; runs of at most seven digits; behind the
-// first index of every corner a slash or of none, and so on), and each index is then read from
-// its run's first and last bit, so the indices of a line convert side by side.
-[[gnu::always_inline]] inline bool faceInWindow(const char *p, SgFaceCorner *corners, int &count,
-                                                FaceIndexMax &max, const char *&next) {
-    const Masks m = classify<'/'>(p);
+// Checks a face line of up to 64 bytes whose corners all have the same form, "v", "v/vt" or
+// "v/vt/vn" (no empty index), on its masks ('/' the mark), and finds its indices' runs: only
+// digits, blanks and slashes; every slash between two digits; runs of at most seven digits;
+// behind the first index of every corner a slash or of none, and so on; three corners or more.
+inline bool faceShape(const Masks &m, FaceShape &shape) {
     int length = 0;
     const std::uint64_t line = lineBytes(m, length);
-    next = p + length + 1;
     const std::uint64_t digit = m.digit & line, slash = m.mark & line;
     std::uint64_t eight = digit & (digit >> 1);
     eight &= eight >> 2;
@@ -309,10 +340,61 @@ template <int K>
     }
     if ((behind[k] & slash) != 0)
         return false;
-    const bool indicesFrom1 = k == 0   ? cornersFrom<0>(p, starts, behind, corners, count, max)
-                              : k == 1 ? cornersFrom<1>(p, starts, behind, corners, count, max)
-                                       : cornersFrom<2>(p, starts, behind, corners, count, max);
-    return indicesFrom1 && count >= 3;
+    shape.k = k;
+    shape.count = 0;
+    for (std::uint64_t s = starts[0]; s != 0; s &= s - 1)
+        ++shape.count;
+    for (int i = 0; i <= k; ++i)
+        runsOf(starts[i], behind[i] >> 1, i, k + 1, shape);
+    return shape.count >= 3;
+}
+
+// The index at the shape's place `i` of a line, as a corner's 0-based index; its value goes
+// into `max`, and the sign bit of `zero` is set for an index 0.
+[[gnu::always_inline]] inline std::int32_t indexOf(const char *p, const FaceShape &shape, int i,
+                                                   std::uint32_t &max, std::uint32_t &zero) {
+    std::uint64_t chunk = 0;
+    std::memcpy(&chunk, p + shape.first[i], 8);
+    const std::uint32_t value = eightDigits(chunk << shape.shift[i]);
+    max = value > max ? value : max;
+    zero |= value - 1;
+    return std::int32_t(value - 1);
+}
+
+// The corners of a line of the shape's form, which has `K` slashes to the corner; false for an
+// index 0.
+template <int K>
+[[gnu::always_inline]] inline bool cornersOf(const char *p, const FaceShape &shape,
+                                             SgFaceCorner *corners, FaceIndexMax &max) {
+    std::uint32_t zero = 0, maxVertex = 0, maxUV = 0, maxNormal = 0;
+    for (int i = 0, at = 0; i < shape.count; ++i, at += K + 1) {
+        SgFaceCorner &c = corners[i];
+        c.vertex = indexOf(p, shape, at, maxVertex, zero);
+        c.uv = K >= 1 ? indexOf(p, shape, at + (K >= 1), maxUV, zero) : -1;
+        c.third = K == 2 ? indexOf(p, shape, at + 2 * (K == 2), maxNormal, zero) : -1;
+    }
+    max = {maxVertex, maxUV, maxNormal};
+    // Indices have at most seven digits: only an index 0 sets the sign bit.
+    return std::int32_t(zero) >= 0;
+}
+
+// A face line of up to 64 bytes in a plain form (see faceShape); `shape` is the last line's.
+[[gnu::always_inline]] inline bool faceInWindow(const char *p, SgFaceCorner *corners, int &count,
+                                                FaceIndexMax &max, const char *&next,
+                                                FaceShape &shape) {
+    const Masks m = classify<'/'>(p);
+    next = p + std::countr_zero(m.end) + 1;
+    const LineKey key = keyOf(m);
+    if (!(key == shape.key)) {
+        shape.key = LineKey();
+        if (!faceShape(m, shape))
+            return false;
+        shape.key = key;
+    }
+    count = shape.count;
+    return shape.k == 0   ? cornersOf<0>(p, shape, corners, max)
+           : shape.k == 1 ? cornersOf<1>(p, shape, corners, max)
+                          : cornersOf<2>(p, shape, corners, max);
 }
 
 [[gnu::always_inline]] inline bool isBlank(char c) {
@@ -361,22 +443,29 @@ inline const char *faceInWords(const char *p, const char *limit, SgFaceCorner *c
 
 } // namespace detail
 
+// What a run of lines of one kind keeps of its last line, so that a line of the same shape is
+// read without the scans and checks (see LineKey); one per run, starting empty.
+using NumberShape = detail::NumberShape;
+using FaceShape = detail::FaceShape;
+
 // "v": `p` just after the keyword.
-[[gnu::always_inline]] inline bool vertex(const char *p, float out[3], const char *&next) {
-    return detail::numbersInWindow(p, out, 3, next);
+[[gnu::always_inline]] inline bool vertex(const char *p, float out[3], const char *&next,
+                                          NumberShape &shape) {
+    return detail::numbersInWindow(p, out, 3, next, shape);
 }
 
 // "vt": `p` just after the keyword.
-[[gnu::always_inline]] inline bool uv(const char *p, float out[2], const char *&next) {
-    return detail::numbersInWindow(p, out, 2, next);
+[[gnu::always_inline]] inline bool uv(const char *p, float out[2], const char *&next,
+                                      NumberShape &shape) {
+    return detail::numbersInWindow(p, out, 2, next, shape);
 }
 
 // "f": `p` just after the keyword; `corners` has room for 255. Sets the corner count (3 or
 // more on success) and the line's largest indices.
 [[gnu::always_inline]] inline bool face(const char *p, const char *limit, SgFaceCorner *corners,
-                                        int &count, FaceIndexMax &max, const char *&next) {
-    max = FaceIndexMax();
-    if (detail::faceInWindow(p, corners, count, max, next))
+                                        int &count, FaceIndexMax &max, const char *&next,
+                                        FaceShape &shape) {
+    if (detail::faceInWindow(p, corners, count, max, next, shape))
         return true;
     max = FaceIndexMax();
     next = detail::faceInWords(p, limit, corners, count, max);

@@ -176,9 +176,11 @@ private:
     template <typename T> const char *readNumberRun(std::vector<T> &items) {
         constexpr bool vertices = std::is_same_v<T, SgVec3>;
         SgBatchAppender<T> out(items);
+        SgObjPlainLine::NumberShape shape;
         const auto readLine = [&](const char *p, const char *&next) __attribute__((always_inline)) {
-            float v[3];
-            if (!(vertices ? SgObjPlainLine::vertex(p, v, next) : SgObjPlainLine::uv(p, v, next))) {
+            float v[3] = {};
+            if (!(vertices ? SgObjPlainLine::vertex(p, v, next, shape)
+                           : SgObjPlainLine::uv(p, v, next, shape))) {
                 return false;
             }
             reserveFor(items, p - (vertices ? 1 : 2), next);
@@ -218,12 +220,13 @@ private:
                                 m_mesh->triangleGroups(), material, m_group);
         FacetBatch<4> quads(m_mesh->quadCorners(), m_mesh->quadMaterials(), m_mesh->quadGroups(),
                             material, m_group);
+        SgObjPlainLine::FaceShape shape;
         return readRun(
             "f ", [&](const char *p, const char *&next) __attribute__((always_inline)) {
                 int n = 0;
                 SgObjPlainLine::FaceIndexMax max;
                 SgFaceCorner *corners = triangles.next();
-                if (!SgObjPlainLine::face(p, m_fastEnd, corners, n, max, next)) {
+                if (!SgObjPlainLine::face(p, m_fastEnd, corners, n, max, next, shape)) {
                     return false;
                 }
                 noteReference(max.vertex, m_maxVertexRef, m_maxVertexLine);

@@ -14,6 +14,8 @@
 
 #include <bit>
 #include <cstring>
+#include <limits>
+#include <numeric>
 #include <unordered_set>
 
 // What the welder remembers of one bone.
@@ -128,14 +130,23 @@ SgFaceCorner remapCorner(const SgFaceCorner &c, int32_t vertex, int32_t uvCount,
     return out;
 }
 
-// Appends `from[i]` mapped by `map` to `to` for every i. The map is taken by value and holds
-// values, not references: the batch's stores could otherwise alias what it refers to, and the
-// compiler would load it again for every item.
+// Appends `from[i]` mapped by `map` to `to` for every i, a chunk at a time: each chunk is added
+// to the vector (its default values stay in the first-level cache) and overwritten there, so
+// that the vector's memory is written once and nothing is copied twice. The map is taken by
+// value and holds values, not references: the stores could otherwise alias what it refers to,
+// and the compiler would load it again for every item.
 template <typename T, typename U, typename Map>
 void appendMapped(std::vector<T> &to, const std::vector<U> &from, Map map) {
-    SgBatchAppender<T> out(to);
-    for (const U &item : from) {
-        out.push(map(item));
+    constexpr size_t kChunk = 512;
+    for (size_t start = 0; start < from.size(); start += kChunk) {
+        const size_t n = std::min(kChunk, from.size() - start);
+        const size_t at = to.size();
+        to.resize(at + n);
+        T *out = to.data() + at;
+        const U *in = from.data() + start;
+        for (size_t i = 0; i < n; ++i) {
+            out[i] = map(in[i]);
+        }
     }
 }
 
@@ -213,32 +224,69 @@ void appendCarriers(SgPolyMesh &out, const std::vector<int32_t> &vertices, int32
     }
 }
 
-inline bool insideAny(const std::vector<SgBox3> &boxes, const SgVec3 &p) {
-    for (const SgBox3 &b : boxes) {
-        if (p.x >= b.min.x && p.x <= b.max.x && p.y >= b.min.y && p.y <= b.max.y &&
-            p.z >= b.min.z && p.z <= b.max.z) {
-            return true;
+// Four floats that the compiler keeps in one vector register.
+using Float4 = float __attribute__((vector_size(16)));
+
+// The box around `n` positions. Four positions (twelve floats, three vectors) at a time into
+// running minima and maxima per lane, folded into the box at the end: a vector pass instead of
+// a chain of scalar comparisons. A coordinate that is not a number extends nothing, as with
+// SgBox3::extend.
+SgBox3 boxOf(const SgVec3 *positions, size_t n) {
+    constexpr float kMax = std::numeric_limits<float>::max();
+    Float4 low[3] = {{kMax, kMax, kMax, kMax}, {kMax, kMax, kMax, kMax}, {kMax, kMax, kMax, kMax}};
+    Float4 high[3] = {-low[0], -low[1], -low[2]};
+    const auto *f = reinterpret_cast<const float *>(positions);
+    size_t i = 0;
+    for (; i + 4 <= n; i += 4) {
+        for (size_t k = 0; k < 3; ++k) {
+            Float4 v;
+            std::memcpy(&v, f + 3 * i + 4 * k, sizeof v);
+            low[k] = v < low[k] ? v : low[k];
+            high[k] = v > high[k] ? v : high[k];
         }
     }
-    return false;
+    // Lane l of vector k holds float 4k + l of each block of twelve: coordinate (4k + l) % 3.
+    float lowOf[3] = {kMax, kMax, kMax}, highOf[3] = {-kMax, -kMax, -kMax};
+    for (size_t k = 0; k < 3; ++k) {
+        for (size_t l = 0; l < 4; ++l) {
+            const size_t axis = (4 * k + l) % 3;
+            lowOf[axis] = std::min(lowOf[axis], low[k][l]);
+            highOf[axis] = std::max(highOf[axis], high[k][l]);
+        }
+    }
+    SgBox3 box;
+    box.min = {lowOf[0], lowOf[1], lowOf[2]};
+    box.max = {highOf[0], highOf[1], highOf[2]};
+    for (; i < n; ++i) {
+        box.extend(positions[i]);
+    }
+    return box;
+}
+
+// The vertices of `mesh` that none of its facets use, in ascending order.
+std::vector<int32_t> unusedVertices(const SgPolyMesh &mesh) {
+    const size_t n = size_t(mesh.getVertexCount());
+    std::vector<uint8_t> used(n, 0);
+    forEachCorner(mesh, [&](const SgFaceCorner &c) { used[size_t(c.vertex)] = 1; });
+    std::vector<int32_t> unused;
+    for (const uint8_t *at = used.data(), *end = at + n;
+         (at = static_cast<const uint8_t *>(std::memchr(at, 0, size_t(end - at)))) != nullptr;
+         ++at) {
+        unused.push_back(int32_t(at - used.data()));
+    }
+    return unused;
 }
 
 // For each bone, where its vertices can meet another bone's: the overlaps of its bounding box
 // with the other bones' boxes. A vertex outside all of them equals no vertex of another bone,
 // so it needs no probe of the position table, and welds exactly as before without one (the
 // table then holds only the vertices near seams, small enough to stay in the caches).
-template <typename Slices> std::vector<std::vector<SgBox3>> seamRegions(const Slices &slices) {
-    std::vector<SgBox3> boxes(slices.size());
+// The bones' own boxes are left in `boxes`.
+template <typename Slices>
+std::vector<std::vector<SgBox3>> seamRegions(const Slices &slices, std::vector<SgBox3> &boxes) {
+    boxes.assign(slices.size(), SgBox3());
     for (size_t b = 0; b < slices.size(); ++b) {
-        // Grown in a local: the positions are floats as the box is, so a box in the vector
-        // would be stored and loaded again for every vertex.
-        SgBox3 box;
-        const SgVec3 *p = slices[b].source;
-        const int32_t n = slices[b].base->getVertexCount();
-        for (int32_t i = 0; i < n; ++i) {
-            box.extend(p[i]);
-        }
-        boxes[b] = box;
+        boxes[b] = boxOf(slices[b].source, size_t(slices[b].base->getVertexCount()));
     }
     std::vector<std::vector<SgBox3>> regions(slices.size());
     for (size_t b = 0; b < slices.size(); ++b) {
@@ -258,17 +306,57 @@ template <typename Slices> std::vector<std::vector<SgBox3>> seamRegions(const Sl
     return regions;
 }
 
+// A seam region of a bone: its box, and the axis along which it covers least of the bone's
+// box, tested first.
+struct SeamRegion {
+    SgBox3 box;
+    int axis = 0;
+    float low = 0.0f, high = 0.0f; // the box along that axis
+
+    SeamRegion(const SgBox3 &region, const SgBox3 &bone) : box(region) {
+        float least = 2.0f;
+        for (int a = 0; a < 3; ++a) {
+            const float extent = bone.max[a] - bone.min[a];
+            const float share = extent > 0.0f ? (region.max[a] - region.min[a]) / extent : 1.0f;
+            if (share < least) {
+                least = share;
+                axis = a;
+            }
+        }
+        low = box.min[axis];
+        high = box.max[axis];
+    }
+
+    // Whether `p` lies in the box. Most vertices of a bone lie outside along the first axis
+    // tested, so that the other comparisons are rarely made.
+    bool contains(const SgVec3 &p) const {
+        const float c = reinterpret_cast<const float *>(&p)[axis];
+        return c >= low && c <= high && p.x >= box.min.x && p.x <= box.max.x && p.y >= box.min.y &&
+               p.y <= box.max.y && p.z >= box.min.z && p.z <= box.max.z;
+    }
+};
+
 // For each bone, its vertices inside its seam regions, in ascending order (the only ones the
 // weld probes); `count` is their number in all.
 template <typename Slices>
 std::vector<std::vector<int32_t>>
-seamVertices(const Slices &slices, const std::vector<std::vector<SgBox3>> &regions, size_t &count) {
+seamVertices(const Slices &slices, const std::vector<SgBox3> &boxes,
+             const std::vector<std::vector<SgBox3>> &regions, size_t &count) {
     std::vector<std::vector<int32_t>> seams(slices.size());
     count = 0;
     for (size_t b = 0; b < slices.size(); ++b) {
+        std::vector<SeamRegion> tests;
+        for (const SgBox3 &region : regions[b]) {
+            tests.emplace_back(region, boxes[b]);
+        }
+        const SgVec3 *source = slices[b].source;
         const int32_t n = slices[b].base->getVertexCount();
-        for (int32_t i = 0; i < n && !regions[b].empty(); ++i) {
-            if (insideAny(regions[b], slices[b].source[size_t(i)])) {
+        for (int32_t i = 0; i < n && !tests.empty(); ++i) {
+            bool inside = false;
+            for (const SeamRegion &test : tests) {
+                inside = inside || test.contains(source[size_t(i)]);
+            }
+            if (inside) {
                 seams[b].push_back(i);
             }
         }
@@ -412,51 +500,67 @@ void SgFigureWelder::build(SgSkeleton *figure, bool ignoreInvisible, bool weldGe
         }
     }
     size_t seamCount = 0;
-    const std::vector<std::vector<int32_t>> seams =
-        weldGeometry ? seamVertices(m_slices, seamRegions(m_slices), seamCount)
-                     : std::vector<std::vector<int32_t>>(m_slices.size());
+    std::vector<std::vector<int32_t>> seams(m_slices.size());
+    if (weldGeometry) {
+        std::vector<SgBox3> boxes;
+        const std::vector<std::vector<SgBox3>> regions = seamRegions(m_slices, boxes);
+        seams = seamVertices(m_slices, boxes, regions, seamCount);
+    }
     PositionTable table(seamCount);
     int32_t outStart = 0;
     int32_t uvOffset = 0;
     for (size_t b = 0; b < m_slices.size(); ++b) {
         BoneSlice &s = m_slices[b];
         const int32_t n = s.base->getVertexCount();
-        std::vector<uint8_t> used(size_t(n), 0);
-        forEachCorner(*s.base, [&](const SgFaceCorner &c) { used[size_t(c.vertex)] = 1; });
+        s.unused = unusedVertices(*s.base);
         s.weldIndex.reserve(size_t(n));
         const int32_t *seam = seams[b].data();
         const int32_t *seamEnd = seam + seams[b].size();
+        const int32_t *unused = s.unused.data();
+        const int32_t *unusedEnd = unused + s.unused.size();
         auto nextWelded = static_cast<int32_t>(wv.size()); // the index of the next new one
-        {
-            SgBatchAppender<SgVec3> positions(wv);
-            SgBatchAppender<int32_t> weldIndex(s.weldIndex);
-            for (int32_t i = 0; i < n; ++i) {
-                const bool onSeam = seam != seamEnd && *seam == i;
-                seam += onSeam;
-                if (!used[size_t(i)]) {
-                    s.unused.push_back(i);
-                    if (removeUnused) {
-                        weldIndex.push(-1);
-                        continue;
-                    }
+        for (int32_t i = 0; i < n; ++i) {
+            // Up to the next seam or unused vertex each vertex is a new welded one: that run
+            // goes in with block moves.
+            const int32_t nextSeam = seam != seamEnd ? *seam : n;
+            const int32_t nextUnused = unused != unusedEnd ? *unused : n;
+            const int32_t runEnd = std::min(nextSeam, nextUnused);
+            if (runEnd > i) {
+                wv.insert(wv.end(), s.source + i, s.source + runEnd);
+                const size_t from = s.weldIndex.size();
+                s.weldIndex.resize(from + size_t(runEnd - i));
+                std::iota(s.weldIndex.begin() + std::ptrdiff_t(from), s.weldIndex.end(),
+                          nextWelded);
+                nextWelded += runEnd - i;
+                i = runEnd;
+                if (i == n) {
+                    break;
                 }
-                const SgVec3 &p = s.source[size_t(i)];
-                int32_t w = nextWelded;
-                if (onSeam) {
-                    PositionTable::Slot &slot = table.slotFor(p);
-                    if (slot.index < 0) {
-                        slot = {p, nextWelded, int32_t(b)};
-                    } else if (slot.lastBone != int32_t(b)) {
-                        w = slot.index;
-                        slot.lastBone = int32_t(b);
-                    }
-                }
-                if (w == nextWelded) {
-                    positions.push(p);
-                    ++nextWelded;
-                }
-                weldIndex.push(w);
             }
+            const bool onSeam = nextSeam == i;
+            seam += onSeam;
+            const bool isUnused = nextUnused == i;
+            unused += isUnused;
+            if (isUnused && removeUnused) {
+                s.weldIndex.push_back(-1);
+                continue;
+            }
+            const SgVec3 &p = s.source[size_t(i)];
+            int32_t w = nextWelded;
+            if (onSeam) {
+                PositionTable::Slot &slot = table.slotFor(p);
+                if (slot.index < 0) {
+                    slot = {p, nextWelded, int32_t(b)};
+                } else if (slot.lastBone != int32_t(b)) {
+                    w = slot.index;
+                    slot.lastBone = int32_t(b);
+                }
+            }
+            if (w == nextWelded) {
+                wv.push_back(p);
+                ++nextWelded;
+            }
+            s.weldIndex.push_back(w);
         }
         s.outStart = outStart;
         outStart += n;
