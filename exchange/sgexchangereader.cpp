@@ -3,13 +3,13 @@
 #include "exchange/sgfacetblockwriter.h"
 #include "exchange/sgmaterialblockreader.h"
 #include "exchange/sgrecordinput.h"
+#include "exchange/sgscaledfloats.h"
 #include "sgcore/app/sgapp.h"
 #include "sgcore/geometry/sgmap.h"
 #include "sgcore/geometry/sgpolymesh.h"
 #include "sgcore/geometry/sgpolyshape.h"
 
 #include <algorithm>
-#include <bit>
 #include <cmath>
 #include <cstring>
 
@@ -31,22 +31,14 @@ inline std::uint32_t notFinite(std::uint32_t bits) {
 }
 
 // A coordinate that is not a finite number, or becomes one only in host units, would tear
-// any morph made from the record: the record is refused. Branch-free over all coordinates, so
-// that the loop runs in vector code; the check comes once, at the end.
+// any morph made from the record: the record is refused. The check runs over all coordinates
+// in vector code and tells once, at the end.
 void readVertices(SgRecordInput &input, SgPolyMesh &mesh) {
     const std::int32_t count = input.count(12);
     static_assert(sizeof(SgVec3) == 12);
-    auto *to = reinterpret_cast<float *>(mesh.setVertexArray(count));
+    auto *to = mesh.setVertexArray(count);
     const unsigned char *source = input.take(size_t(count) * 12);
-    std::uint32_t bad = 0;
-    for (size_t i = 0; i < size_t(count) * 3; ++i) {
-        float value;
-        std::memcpy(&value, source + 4 * i, 4);
-        const auto scaled = float(double(value) * kToHostUnits);
-        bad |= notFinite(std::bit_cast<std::uint32_t>(scaled));
-        to[i] = scaled;
-    }
-    if (bad)
+    if (sgScaleFloats(source, to, size_t(count) * 3, kToHostUnits))
         throw SgRecordError("vertex coordinate not finite");
 }
 

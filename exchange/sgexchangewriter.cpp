@@ -3,6 +3,7 @@
 #include "exchange/sgfacetblockwriter.h"
 #include "exchange/sgmaterialblockwriter.h"
 #include "exchange/sgrecordoutput.h"
+#include "exchange/sgscaledfloats.h"
 #include "sgcore/app/sgapp.h"
 #include "sgcore/app/sgappsettings.h"
 #include "sgcore/geometry/sgmap.h"
@@ -155,13 +156,9 @@ void SgExchangeWriter::writeVertices(SgRecordOutput &output) const {
     const int count = m_geometry->getVertexCount();
     output.putInt32(count);
     unsigned char *to = output.claim(static_cast<std::size_t>(count) * 12);
-    const SgVec3 *from = m_geometry->getVertices();
-    for (int i = 0; i < count; ++i) {
-        const float xyz[3] = {static_cast<float>(from[i].x * kToModelerUnits),
-                              static_cast<float>(from[i].y * kToModelerUnits),
-                              static_cast<float>(from[i].z * kToModelerUnits)};
-        std::memcpy(to + static_cast<std::size_t>(i) * 12, xyz, 12);
-    }
+    static_assert(sizeof(SgVec3) == 12);
+    sgScaleFloats(m_geometry->getVertices(), to, static_cast<std::size_t>(count) * 3,
+                  kToModelerUnits);
 }
 
 void SgExchangeWriter::writeUVs(SgRecordOutput &output) const {
