@@ -37,10 +37,6 @@ struct Arm {
     }
 };
 
-float distance(const SgVec3 &a, const SgVec3 &b) {
-    return (a - b).length();
-}
-
 } // namespace
 
 class ReverseDeformations : public EngineTest {};
@@ -72,7 +68,7 @@ TEST_F(ReverseDeformations, LoadedSculptOfAPoseIsReproducedWhenPosedAgain) {
         morph->getValueChannel()->setValue(1.0f);
         const SgVertexMesh *shown = arm.lower->getObject()->getCachedGeom();
         for (int i = 0; i < sculpt->getVertexCount(); ++i)
-            EXPECT_LT(distance(shown->getVertex(i), sculpt->getVertex(i)), 1e-4f) << i;
+            EXPECT_LT((shown->getVertex(i) - sculpt->getVertex(i)).length(), 1e-4f) << i;
     }
 }
 

@@ -1,31 +1,10 @@
+// What the plug-in's links rely on from the host's properties: a linked value is clamped after
+// its links, and a link cycle is read without recursing. (Names, namesakes and ownership are
+// checked through the morph engine's control properties.)
 #include "sgcore/morph/sgerclink.h"
 #include "sgcore/properties/sgfloatproperty.h"
-#include "sgcore/properties/sgintproperty.h"
-#include "sgcore/scene/sgnode.h"
-#include "tests/support/sgtestmain.h"
 
 #include <gtest/gtest.h>
-
-TEST(HostProperties, NamesAreUniquePerElementAndOwnershipIsTracked) {
-    SgNode node(QStringLiteral("n"));
-    auto *a = new SgFloatProperty(QStringLiteral("Smile"));
-    EXPECT_EQ(node.addProperty(a), 0);
-    EXPECT_EQ(a->getOwner(), &node);
-    // A second property of the name (names are case-sensitive) is refused and stays unowned.
-    auto *dup = new SgIntProperty(QStringLiteral("Smile"));
-    EXPECT_EQ(node.addProperty(dup), 82);
-    EXPECT_EQ(dup->getOwner(), nullptr);
-    EXPECT_EQ(node.findProperty(QStringLiteral("smile")), nullptr);
-
-    // Removing deletes the property; taking hands it back unowned.
-    const std::weak_ptr<const void> life = a->getLifeToken();
-    EXPECT_EQ(node.removeProperty(QStringLiteral("Smile")), 0);
-    EXPECT_TRUE(life.expired());
-    EXPECT_EQ(node.addProperty(dup), 0);
-    EXPECT_EQ(node.takeProperty(dup), dup);
-    EXPECT_EQ(dup->getOwner(), nullptr);
-    delete dup;
-}
 
 TEST(HostProperties, LinkedValuesClampOnReadingAndACycleDoesNotRecurse) {
     SgFloatProperty control(QStringLiteral("control"));

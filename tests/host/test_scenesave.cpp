@@ -118,6 +118,7 @@ TEST(HostSceneSave, ReopensToTheSameStateAndSavesTheSameFileAgain) {
         const SgPolyMesh *b = meshOf(now);
         EXPECT_EQ(b->vertices(), a->vertices()) << was->getName().toStdString();
         EXPECT_EQ(b->triangleCorners(), a->triangleCorners());
+        EXPECT_EQ(b->quadCorners(), a->quadCorners());
         EXPECT_EQ(b->polygonCorners(), a->polygonCorners());
         EXPECT_EQ(b->quadMaterials(), a->quadMaterials());
         EXPECT_EQ(b->polygonMaterials(), a->polygonMaterials());

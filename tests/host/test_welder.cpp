@@ -10,7 +10,6 @@
 
 #include <gtest/gtest.h>
 
-#include <algorithm>
 #include <memory>
 
 namespace {
@@ -81,36 +80,16 @@ TEST(HostWelder, OnlyVerticesOfDifferentBonesWeld) {
         EXPECT_EQ(extract(*result, bone->getName()), sgTestGeometry(bone)->vertices());
 }
 
-TEST(HostWelder, MovingOneSeamVertexChangesExactlyThatVertexInEachBoneSharingIt) {
+// An edited seam vertex goes to each bone sharing it: the morph engine's welded-figure test
+// checks that through the morphs it makes.
+TEST(HostWelder, TheFirstWeldedVertexUnweldsAsEditedAndOtherCountsAreRefused) {
     std::unique_ptr<SgSkeleton> figure(sgTestFigure(QStringLiteral("Fig"), 3, 2));
     SgFigureWelder welder(figure.get(), false, true, true, true);
-    const SgPolyMesh *welded = welder.getGeometry();
-    // The seam between bone 0 and bone 1 at (1, 1, 0).
-    const std::vector<SgVec3> &all = welded->vertices();
-    ASSERT_EQ(std::count(all.begin(), all.end(), SgVec3(1, 1, 0)), 1) << "welded into one";
-    const int seam = int(std::find(all.begin(), all.end(), SgVec3(1, 1, 0)) - all.begin());
-    EXPECT_EQ(welder.getWeldCounts()[size_t(seam)], 2);
-
-    std::unique_ptr<SgVertexMesh> edited(welded->clone());
-    edited->setVertex(seam, SgVec3(1, 1, 0.5f));
+    std::unique_ptr<SgVertexMesh> edited(welder.getGeometry()->clone());
+    edited->setVertex(0, SgVec3(0, 0, 0.25f));
     auto result = unweld(welder, *edited);
     ASSERT_TRUE(result);
-    const SgBoneList bones = figure->getAllBones();
-    const int changedIndex[3] = {4, 1, -1}; // right column row 1 in bone 0, left in bone 1
-    for (int b = 0; b < 3; ++b) {
-        const std::vector<SgVec3> own = sgTestGeometry(bones[b])->vertices();
-        const std::vector<SgVec3> got = extract(*result, bones[b]->getName());
-        ASSERT_EQ(got.size(), own.size());
-        for (size_t i = 0; i < own.size(); ++i) {
-            EXPECT_EQ(got[i], int(i) == changedIndex[b] ? SgVec3(1, 1, 0.5f) : own[i])
-                << "bone " << b << " vertex " << i;
-        }
-    }
-
-    // The first welded vertex is un-welded as edited too.
-    edited->setVertex(0, SgVec3(0, 0, 0.25f));
-    result = unweld(welder, *edited);
-    EXPECT_EQ(extract(*result, bones[0]->getName())[0], SgVec3(0, 0, 0.25f));
+    EXPECT_EQ(extract(*result, QStringLiteral("bone0"))[0], SgVec3(0, 0, 0.25f));
 
     // A mesh of another vertex count cannot be unwelded.
     for (int change : {1, -2}) {

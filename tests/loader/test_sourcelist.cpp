@@ -148,7 +148,7 @@ TEST_F(SourceList, DropsAddGeometryFilesAndSetPoses) {
     // Drops `files` at `point`; returns the text of the box that came, or "" when none did.
     const auto dropAt = [&](const QStringList &files, QPoint point) {
         QString text;
-        SgTestModalAnswer answer(sgTestPressButton(QMessageBox::NoButton, nullptr, &text), 300);
+        SgTestModalAnswer answer(sgTestPressButton(QMessageBox::NoButton, nullptr, &text));
         drop(list, files, point);
         return answer.titles().join('|') + ": " + text;
     };
