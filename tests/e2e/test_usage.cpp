@@ -57,11 +57,6 @@ constexpr qint64 kBlockLimitMs = 100;
 constexpr int kModelerHostTimeoutMs = 2000;
 constexpr int kHeldDialogMs = 2600; // past the modeler's host time-out
 
-qint64 nowMs() {
-    using namespace std::chrono;
-    return duration_cast<milliseconds>(steady_clock::now().time_since_epoch()).count();
-}
-
 // A second thread of this process that wakes every 2 ms and adds up the time it could not. A
 // stall that it saw as well is the machine's (the process was not scheduled), not a block of the
 // GUI thread: only what is left of a GUI stall after the witness's stalls meanwhile counts
@@ -78,9 +73,11 @@ public:
 
 private:
     void run() {
-        for (qint64 last = nowMs(); !m_stop;) {
+        QElapsedTimer clock;
+        clock.start();
+        for (qint64 last = 0; !m_stop;) {
             std::this_thread::sleep_for(std::chrono::milliseconds(2));
-            const qint64 now = nowMs();
+            const qint64 now = clock.elapsed();
             if (now - last > 20)
                 m_stalledMs += now - last;
             last = now;
@@ -126,7 +123,11 @@ public:
             std::function<void()> run;
         };
         const std::vector<Action> actions = {
-            {"send", 30, [this] { send(); }},
+            {"send", 30,
+             [this] {
+                 selectSome();
+                 sendSelection();
+             }},
             {"select", 10, [this] { selectSome(); }},
             {"reload", 4, [this] { reload(); }},
             {"remove", 6, [this] { removeSome(); }},
@@ -259,12 +260,8 @@ private:
         updatePending();
         for (SgNode *node : m_bridge.sendList())
             if (!before.contains(node) && !m_pending.contains(node->getLabel()))
-                m_pending.insert(node->getLabel(), {receivedCount(node->getLabel()), -1, {}});
-    }
-
-    void send() {
-        selectSome();
-        sendSelection();
+                m_pending.insert(node->getLabel(),
+                                 {receivedCount(node->getLabel(), modelerLog()), -1, {}});
     }
 
     void removeSome() {
@@ -348,11 +345,10 @@ private:
 
     // How often a modeler has received the node labelled `label` (named as it travelled, in
     // 8 bits).
-    int receivedCount(const QString &label, const QString &log) const {
+    static int receivedCount(const QString &label, const QString &log) {
         const QString travelled = QString::fromLatin1(label.toLatin1());
         return int(log.count(QStringLiteral(" received %1 vertices=").arg(travelled)));
     }
-    int receivedCount(const QString &label) const { return receivedCount(label, modelerLog()); }
 
     // A pending label is done once a modeler has received it again, or the host has said that
     // it could not be sent. One that the same live modeler has not received for a while is a
