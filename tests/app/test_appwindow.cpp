@@ -133,9 +133,9 @@ TEST(AppWindow, ShowsThePluginActionTheSceneItsPropertiesAndThePreferences) {
     EXPECT_EQ(scene->getPrimarySelection(), figure);
     EXPECT_EQ(scene->getSelectedNodes().size(), 1);
     // A selection made elsewhere shows in the tree.
-    scene->selectNode(scene->findNodeByLabel(QStringLiteral("Box")));
-    EXPECT_TRUE(
-        window.sceneTree()->itemOf(scene->findNodeByLabel(QStringLiteral("Box")))->isSelected());
+    SgNode *box = scene->findNodeByLabel(QStringLiteral("Box"));
+    scene->selectNode(box);
+    EXPECT_TRUE(window.sceneTree()->itemOf(box)->isSelected());
     EXPECT_FALSE(item->isSelected());
 
     // A control property on the figure shows in the panel and is set from it.
@@ -304,10 +304,9 @@ TEST(AppWindow, SavesReopensDeletesAndNeverLosesChangesSilently) {
         sgTestAnswering({sgTestPressButton(QMessageBox::Save)}, [&] { return window.close(); }));
     SgScene check;
     ASSERT_TRUE(SgSceneFile().load(saved, &check));
+    SgNode *checked = check.findNodeByLabel(QStringLiteral("Blobby"));
     EXPECT_EQ(
-        static_cast<SgFloatProperty *>(
-            check.findNodeByLabel(QStringLiteral("Blobby"))->findProperty(QStringLiteral("Grow")))
-            ->getValue(),
+        static_cast<SgFloatProperty *>(checked->findProperty(QStringLiteral("Grow")))->getValue(),
         -0.5f);
     // A figure goes with its bones.
     scene->selectNode(figure);
