@@ -111,24 +111,6 @@ TEST_F(SourceItems, CreateControlAndErcTypeSwitchTheirDependents) {
     EXPECT_EQ(control->text(1), "no");
 }
 
-TEST_F(SourceItems, ReverseDeformationsEnablesThePoseRow) {
-    auto *reverse = boolRow(head, "Reverse Deformations:");
-    auto *pose = static_cast<SgMorphPoseItem *>(findRow(head, "Pose:"));
-    editWithPopup(list, reverse, "yes");
-    EXPECT_TRUE(head->loader().reverseModifiers());
-    EXPECT_TRUE(pose->isEnabled() && pose->dragEnabled());
-    editWithPopup(list, reverse, "no");
-    EXPECT_FALSE(pose->isEnabled());
-
-    // "None" in the pose popup clears a chosen pose.
-    editWithPopup(list, reverse, "yes");
-    pose->setValueText("/poses/sit.sgs");
-    EXPECT_EQ(head->loader().poseFile(), "/poses/sit.sgs");
-    EXPECT_EQ(editWithPopup(list, pose, "None"), QStringList({"None", "-", "Browse..."}));
-    EXPECT_EQ(pose->text(1), "None");
-    EXPECT_EQ(head->loader().poseFile(), "None");
-}
-
 // Every row's text round trip and its value in the loader is checked through a saved and
 // loaded configuration file (test_morphloaderdlg); here the texts a file may hold wrongly.
 TEST_F(SourceItems, UnknownAndOutOfRangeTextsFallBackToDefaults) {
