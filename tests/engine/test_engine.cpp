@@ -1,25 +1,184 @@
-#include "enginetestsupport.h"
-
+// The morph engine: the delta scan, morph creation on props, bones and welded figures, the
+// override and orphan rules, control properties and their links, geometry files and reversed
+// deformations.
+#include "sgcore/app/sgapp.h"
+#include "sgcore/app/sgimporter.h"
+#include "sgcore/app/sgimportmgr.h"
+#include "sgcore/app/sgmessagesink.h"
+#include "sgcore/importer/sgfileiosettings.h"
 #include "sgcore/morph/sgerclink.h"
 #include "sgcore/morph/sgmorph.h"
 #include "sgcore/morph/sgmorphdeltas.h"
+#include "sgcore/morph/sgrigidskinbinding.h"
 #include "sgcore/properties/sgfloatproperty.h"
 #include "sgcore/properties/sgintproperty.h"
+#include "sgcore/scene/sgbone.h"
 #include "sgcore/scene/sgfigurewelder.h"
+#include "sgcore/scene/sgscene.h"
+#include "sgcore/scene/sgskeleton.h"
+#include "sgcore/script/sgscript.h"
 #include "sharedsource/engine/sgfacegroupcache.h"
 #include "sharedsource/engine/sgmorphloader.h"
+#include "sharedsource/engine/sgmorphloaderquestions.h"
 #include "sharedsource/engine/sgmorphloadlog.h"
-
+#include "tests/support/sgtestmain.h"
 #include "tests/support/sgtestmodal.h"
+#include "tests/support/sgtestscene.h"
 
 #include <QSignalSpy>
+#include <QTemporaryDir>
+#include <gtest/gtest.h>
 
+#include <cmath>
+#include <cstdint>
+#include <deque>
 #include <limits>
 #include <memory>
-
-using namespace enginetest;
+#include <optional>
+#include <utility>
+#include <vector>
 
 namespace {
+
+// Meshes start with no reference: `hold` takes one for the holder's life, as an owner does.
+struct Unref {
+    void operator()(SgRefCountedItem *item) const { item->unref(); }
+};
+template <typename Mesh> std::unique_ptr<Mesh, Unref> hold(Mesh *mesh) {
+    mesh->ref();
+    return std::unique_ptr<Mesh, Unref>(mesh);
+}
+
+// Answers the loader's name questions without dialogs: each takes the next of `names` (nullopt
+// cancels; none left cancels too) and records the name it was asked about. Pose questions are
+// declined.
+struct ScriptedQuestions : SgMorphLoaderQuestions {
+    std::deque<std::optional<QString>> names;
+    QStringList askedAbout;
+
+    bool askNewMorphName(const QString &name, QString &newName) override {
+        askedAbout << name;
+        if (names.empty() || !names.front()) {
+            names.clear();
+            return false;
+        }
+        newName = *names.front();
+        names.pop_front();
+        return true;
+    }
+    bool continueWithoutPose(const QString &, const QString &) override { return false; }
+};
+
+// The per-test application state: the scene emptied and the message sink cleared.
+class EngineTest : public ::testing::Test {
+protected:
+    void SetUp() override {
+        sgApp->getScene()->clear();
+        sgApp->getMessageSink()->clear();
+    }
+    void TearDown() override { sgApp->getScene()->clear(); }
+
+    static SgScene *scene() { return sgApp->getScene(); }
+    static QStringList logLines() { return sgApp->getMessageSink()->logLines(); }
+    static QStringList statusLines() { return sgApp->getMessageSink()->statusLines(); }
+};
+
+class Deltas : public EngineTest {};
+
+TEST_F(Deltas, ThresholdIsStrictlyAboveOneThousandth) {
+    std::unique_ptr<SgPolyMesh> base(sgTestRowMesh(200));
+    // Moved vertices sit at the origin, where 0.001 and 0.0011 are differences as written.
+    for (int i : {3, 70, 71, 150, 198, 199})
+        base->setVertex(i, SgVec3());
+    std::unique_ptr<SgPolyMesh> morph(sgTestCopyVertices(*base));
+
+    // Exactly 0.001 (as a float) in one axis, in both directions: no delta, in a block or tail
+    // of its own and beside a vertex that moves.
+    for (int i : {3, 71, 198})
+        morph->setVertex(i, base->getVertex(i) + SgVec3(0.001f, 0.0f, 0.0f));
+    morph->setVertex(150, base->getVertex(150) - SgVec3(0.0f, 0.0f, 0.001f));
+    EXPECT_EQ(SgMorphLoader::computeDeltas(*base, *morph), nullptr);
+
+    // 0.0011 gives an entry, in a quiet block and in the tail after the last full block.
+    const SgVec3 moved = SgVec3(0.0f, 0.0011f, 0.0f);
+    morph->setVertex(70, base->getVertex(70) + moved);
+    morph->setVertex(199, base->getVertex(199) - moved);
+    std::unique_ptr<SgMorphDeltas> deltas(SgMorphLoader::computeDeltas(*base, *morph));
+    ASSERT_TRUE(deltas);
+    EXPECT_EQ(deltas->getVertCount(), 200);
+    ASSERT_EQ(deltas->getNumEntries(), 2);
+    EXPECT_EQ(deltas->getVertex(0), 70);
+    EXPECT_NEAR(deltas->getDelta(0).y, 0.0011f, 1e-6);
+    EXPECT_EQ(deltas->getVertex(1), 199);
+    EXPECT_NEAR(deltas->getDelta(1).y, -0.0011f, 1e-6);
+}
+
+TEST_F(Deltas, MatchAPlainLoopWhateverTheMixOfMovedAndQuietVertices) {
+    // Runs of fully moved blocks; after them blocks with one quiet vertex, with a random third
+    // quiet, or with a single moved vertex, at shifting positions; single moved axes at every
+    // position of a vertex; and a tail shorter than a block.
+    const int count = 64 * 40 + 23;
+    std::unique_ptr<SgPolyMesh> base(sgTestRowMesh(count));
+    std::unique_ptr<SgPolyMesh> morph(sgTestCopyVertices(*base));
+    std::uint32_t seed = 7;
+    for (int i = 0; i < count; ++i) {
+        seed = seed * 1664525u + 1013904223u;
+        const int block = i / 64;
+        const bool marked = i % 64 == (block * 13) % 64;
+        const int kind = block % 5;
+        const bool moves = kind < 2 || (kind == 2 && !marked) ||
+                           (kind == 3 && (seed >> 8) % 3 != 0) || (kind == 4 && marked);
+        if (!moves)
+            continue;
+        SgVec3 move;
+        const float step = (seed >> 20) % 2 ? 0.5f : -0.0015f;
+        (i % 3 == 0 ? move.x : i % 3 == 1 ? move.y : move.z) = step;
+        morph->setVertex(i, base->getVertex(i) + move);
+    }
+    std::vector<std::pair<int, SgVec3>> expected;
+    for (int i = 0; i < count; ++i) {
+        const SgVec3 d = morph->getVertex(i) - base->getVertex(i);
+        if (std::fabs(d.x) > 0.001f || std::fabs(d.y) > 0.001f || std::fabs(d.z) > 0.001f)
+            expected.emplace_back(i, d);
+    }
+    std::unique_ptr<SgMorphDeltas> deltas(SgMorphLoader::computeDeltas(*base, *morph));
+    ASSERT_TRUE(deltas);
+    std::vector<std::pair<int, SgVec3>> entries;
+    for (int e = 0; e < deltas->getNumEntries(); ++e)
+        entries.emplace_back(deltas->getVertex(e), deltas->getDelta(e));
+    EXPECT_TRUE(entries == expected); // not EXPECT_EQ: a failure would print every entry
+}
+
+TEST_F(Deltas, CountMismatchAndInvalidTargetsGiveNoTable) {
+    std::unique_ptr<SgPolyMesh> base(sgTestRowMesh(200));
+    std::unique_ptr<SgPolyMesh> shorter(sgTestRowMesh(10, 1.0f));
+    EXPECT_EQ(SgMorphLoader::computeDeltas(*base, *shorter), nullptr);
+    EXPECT_EQ(statusLines().last(), QString("Vertex Count mismatch - delta calculation failed."));
+
+    // A coordinate that is not a number or infinite must never become a delta, wherever it is:
+    // beside a move, in a block without one, or in the tail.
+    for (float bad :
+         {std::numeric_limits<float>::quiet_NaN(), std::numeric_limits<float>::infinity()}) {
+        for (int at : {0, 100, 199}) {
+            std::unique_ptr<SgPolyMesh> morph(sgTestCopyVertices(*base));
+            morph->setVertex(5, base->getVertex(5) + SgVec3(1.0f, 0.0f, 0.0f));
+            const SgVec3 b = base->getVertex(at); // only one coordinate of the vertex is bad
+            morph->setVertex(at, SgVec3(b.x, bad, b.z));
+            EXPECT_EQ(SgMorphLoader::computeDeltas(*base, *morph), nullptr);
+            EXPECT_EQ(statusLines().last(),
+                      QString("Morph target has invalid coordinates - delta calculation failed."));
+        }
+    }
+    // The fault in the node's own geometry is named as such, in a full block and in the tail.
+    for (int at : {3, 70}) {
+        std::unique_ptr<SgPolyMesh> broken(sgTestRowMesh(72));
+        std::unique_ptr<SgPolyMesh> morph(sgTestCopyVertices(*broken));
+        broken->setVertex(at, SgVec3(std::numeric_limits<float>::infinity(), 0.0f, 0.0f));
+        EXPECT_EQ(SgMorphLoader::computeDeltas(*broken, *morph), nullptr);
+        EXPECT_EQ(statusLines().last(),
+                  QString("Base geometry has invalid coordinates - delta calculation failed."));
+    }
+}
 
 SgMorph *morphOn(SgNode *node, const QString &name) {
     return dynamic_cast<SgMorph *>(node->getObject()->findModifier(name));
@@ -44,6 +203,31 @@ struct Prop {
         return mesh;
     }
     void create(SgPolyMesh *target) { loader.createMorphForNode(hold(target).get(), node, log); }
+};
+
+class TextImporter : public SgImporter {
+public:
+    QString getName() const override { return "Text"; }
+    QStringList getExtensions() const override { return {"txt"}; }
+};
+
+// A two-bone arm bound rigidly: upper at the origin, lower hanging from (0, 2, 0).
+struct Arm {
+    SgSkeleton *figure = new SgSkeleton("Arm");
+    SgBone *upper = sgTestNode<SgBone>("upper", sgTestRowMesh(8));
+    SgBone *lower = sgTestNode<SgBone>("lower", sgTestRowMesh(8, 0.5f));
+
+    Arm() {
+        lower->setOrigin(SgVec3(0, 2, 0));
+        figure->addBone(upper);
+        figure->addBone(lower, upper);
+        sgApp->getScene()->addNode(figure);
+        SgRigidSkinBinding::bindFigure(figure);
+    }
+    void pose() {
+        upper->setLocalRot(SgQuat::fromAxisAngle(SgVec3(0, 0, 1), 0.5f));
+        lower->setLocalRot(SgQuat::fromAxisAngle(SgVec3(1, 0, 0), 0.8f));
+    }
 };
 
 } // namespace
@@ -460,7 +644,7 @@ SgERCLink *onlyLink(SgNumericProperty *channel) {
 }
 
 SgNumericProperty *channelOf(SgNode *node, const QString &morph) {
-    auto *m = dynamic_cast<SgMorph *>(node->getObject()->findModifier(morph));
+    SgMorph *m = morphOn(node, morph);
     return m ? m->getValueChannel() : nullptr;
 }
 
@@ -604,4 +788,107 @@ TEST_F(ControlProperty, UnplacedPropertiesArePlacedOrDiscarded) {
     }
     for (const auto &life : lives)
         EXPECT_TRUE(life.expired());
+}
+
+TEST_F(MorphCreation, GeometryFileLoadsMakeMorphsOrReportWhyNot) {
+    QTemporaryDir dir;
+    const auto writeFile = [&](const QString &name, const QByteArray &text) {
+        return sgTestWriteFile(dir.filePath(name), text);
+    };
+    auto *node = sgTestNode("Head", sgTestRowMesh(12));
+    scene()->addNode(node);
+    SgMorphLoader loader;
+    loader.setMorphName("Brow");
+    loader.setCreateControl(false);
+    SgFileIOSettings options;
+
+    // The head's vertices with vertex 6 moved by 0.25 in z.
+    QByteArray obj;
+    for (int i = 0; i < 12; ++i) {
+        const SgVec3 p = sgTestGeometry(node)->getVertex(i) + SgVec3(0, 0, i == 6 ? 0.25f : 0);
+        obj += QStringLiteral("v %1 %2 %3\n").arg(p.x).arg(p.y).arg(p.z).toLatin1();
+    }
+    loader.setFilename(writeFile("brow.obj", obj + "f 1 2 3\n"));
+    SgMorphLoadLog log;
+    loader.loadMorphForNode(options, node, log);
+    EXPECT_EQ(log.toHtml(), QString("<HTML><HEAD></HEAD><BODY>\nLoading morph Brow...<BR>"
+                                    "\nCreated morph successfully.<BR>\n</BODY>"));
+    EXPECT_TRUE(statusLines().contains("Loading Morph: brow.obj"));
+    SgMorph *morph = morphOn(node, "Brow");
+    ASSERT_TRUE(morph);
+    EXPECT_EQ(morph->getDeltas()->getVertex(0), 6);
+
+    // Each failure to read ends in its status line, one log error and no morph.
+    sgApp->getImportMgr()->addImporter(new TextImporter);
+    const QString missing = dir.filePath("missing.obj");
+    const QString unknown = dir.filePath("notes.xyz");
+    const QString text = writeFile("notes.txt", "hello");
+    const QString broken = writeFile("broken.obj", "v 1 2\nf 1 9 9\n");
+    const struct {
+        QString file;
+        QString status;
+    } failures[] = {{missing, "Failed to load morph source file: " + missing},
+                    {unknown, "Failed to find an importer for " + unknown + "."},
+                    {text, "The importer for " + text + " is not a geometry importer."},
+                    {broken, "Failed to load morph source file: " + broken}};
+    loader.setMorphName("Other");
+    for (const auto &failure : failures) {
+        SgMorphLoadLog failed;
+        loader.setFilename(failure.file);
+        loader.loadMorphForNodes(options, {node}, failed);
+        EXPECT_EQ(statusLines().last(), failure.status);
+        EXPECT_EQ(failed.toHtml(), QString("<HTML><HEAD></HEAD><BODY>\nLoading morph Other...<BR>"
+                                           "\n<FONT COLOR=#ff0000>Error: </FONT>Could not load "
+                                           "geometry from file.<BR>\n</BODY>"));
+    }
+    EXPECT_EQ(node->getObject()->getModifierCount(), 1);
+}
+
+TEST_F(MorphCreation, ReversedSculptOfAPoseIsReproducedWhenPosedAgain) {
+    for (bool afterJoint : {false, true}) {
+        SCOPED_TRACE(afterJoint ? "after joint" : "before joint");
+        Arm arm;
+        arm.pose();
+        // Sculpt the posed lower bone: two vertices pushed out.
+        const auto sculpt = hold(sgTestCopyVertices(*arm.lower->getObject()->getCachedGeom()));
+        sculpt->setVertex(2, sculpt->getVertex(2) + SgVec3(0.3f, -0.2f, 0.1f));
+        sculpt->setVertex(6, sculpt->getVertex(6) + SgVec3(0.0f, 0.0f, 0.5f));
+
+        SgMorphLoader loader;
+        loader.setMorphName("Fix");
+        loader.setCreateControl(false);
+        loader.setReverseModifiers(true);
+        loader.setApplyAfterJoint(afterJoint);
+        SgMorphLoadLog log;
+        loader.createMorphForNode(sculpt.get(), arm.lower, log);
+        ASSERT_FALSE(log.hasProblems());
+
+        SgMorph *morph = morphOn(arm.lower, "Fix");
+        ASSERT_TRUE(morph);
+        EXPECT_EQ(arm.lower->getObject()->getModifierIndex(morph), afterJoint ? 1 : 0);
+        EXPECT_EQ(morph->getDeltas()->getNumEntries(), 2);
+
+        morph->getValueChannel()->setValue(1.0f);
+        const SgVertexMesh *shown = arm.lower->getObject()->getCachedGeom();
+        for (int i = 0; i < sculpt->getVertexCount(); ++i)
+            EXPECT_LT((shown->getVertex(i) - sculpt->getVertex(i)).length(), 1e-4f) << i;
+    }
+}
+
+// A pose that does not load asks whether to go on without it (test_createmorphs).
+TEST_F(MorphCreation, PoseFileRunsOnlyWithReverseDeformations) {
+    Arm arm;
+    QTemporaryDir dir;
+    SgMorphLoader loader;
+    loader.setPoseFile(sgTestWriteFile(dir.filePath("bend.sgs"),
+                                       "scene.setRotation('lower', 90, 0, 0);\nprint('bent');\n"));
+    EXPECT_TRUE(loader.applyPose()); // reverse deformations off: nothing runs
+    EXPECT_TRUE(arm.lower->getLocalRot().isIdentity());
+
+    loader.setReverseModifiers(true);
+    EXPECT_TRUE(loader.applyPose());
+    EXPECT_NEAR(arm.lower->getLocalRot().x, std::sqrt(0.5f), 1e-5);
+    EXPECT_EQ(logLines().last(), QString("bent"));
+    loader.setPoseFile("None");
+    EXPECT_TRUE(loader.applyPose());
 }
