@@ -1,6 +1,7 @@
 #include "tests/support/sgtestdrivers.h"
 
 #include <QAbstractButton>
+#include <QAbstractItemView>
 #include <QAction>
 #include <QApplication>
 #include <QFileDialog>
@@ -77,6 +78,15 @@ SgTestHandler sgTestPressButton(QMessageBox::StandardButton button, QString *tit
         else
             box->reject();
     });
+}
+
+QLineEdit *sgTestOpenEditor(const QAbstractItemView *view) {
+    QCoreApplication::sendPostedEvents(nullptr, QEvent::DeferredDelete);
+    for (QLineEdit *editor : view->viewport()->findChildren<QLineEdit *>()) {
+        if (editor->isVisible())
+            return editor;
+    }
+    return nullptr;
 }
 
 SgTestHandler sgTestChooseFile(const QString &path, QString *folder, QString *typed) {

@@ -13,6 +13,8 @@
 
 #include <functional>
 
+class QAbstractItemView;
+class QLineEdit;
 class QMenu;
 
 using SgTestHandler = std::function<void(QWidget *)>;
@@ -24,6 +26,9 @@ SgTestHandler sgTestChooseMenu(const QStringList &path, QStringList *seen = null
 
 // The entries of `menu`: their texts, separators as "-"; with `withData` as "text=data".
 QStringList sgTestMenuEntries(const QMenu *menu, bool withData = false);
+
+// The open in-place editor of `view`, or null (closed editors are deleted first).
+QLineEdit *sgTestOpenEditor(const QAbstractItemView *view);
 
 // Records the title and text of a message box and presses `button`; NoButton presses its only
 // button, or rejects a box of several.

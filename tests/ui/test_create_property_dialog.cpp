@@ -12,6 +12,7 @@
 #include "sgcore/scene/sgnode.h"
 #include "sgcore/scene/sgscene.h"
 #include "sgcore/scene/sgskeleton.h"
+#include "sgcore/settings/sgpropertysettings.h"
 #include "sgcore/widgets/sgboolbutton.h"
 #include "sgcore/widgets/sgenumslider.h"
 #include "sgcore/widgets/sgfloatslider.h"
@@ -23,6 +24,7 @@
 
 #include <QCheckBox>
 #include <QComboBox>
+#include <QDomDocument>
 #include <QLineEdit>
 #include <QMouseEvent>
 #include <QPushButton>
@@ -392,14 +394,7 @@ public:
         QApplication::processEvents();
     }
 
-    // The open in-place editor, or null (closed editors linger until deleted).
-    QLineEdit *openEditor() const {
-        for (QLineEdit *editor : m_list->viewport()->findChildren<QLineEdit *>()) {
-            if (editor->isVisible())
-                return editor;
-        }
-        return nullptr;
-    }
+    QLineEdit *openEditor() const { return sgTestOpenEditor(m_list); }
 
     // Selects `row` and presses the up, down or delete button.
     void press(int row, const char *button) {
@@ -500,6 +495,37 @@ TEST_F(CreatePropertyDialog, EnumEditorKeepsRowsAndSlidersInStepAndCancelRestore
     EXPECT_FALSE(child<SgBoolButton>(*dialog, "SgPropertyHiddenAttrib")->isOn());
     editor.expect({"0:A", "1:D", "2:"}, __LINE__);
     EXPECT_EQ(editor.defaultSlider()->currentIndex(), 1);
+}
+
+// The exact round trip of a property's attributes through a configuration file is checked by
+// the loader's save-then-load test; here a partial or damaged set, as a file edited by hand.
+TEST(HostSettings, DamagedPropertyAttributesChangeOnlyWhatTheyCarry) {
+    SgFloatProperty target("other");
+    target.setMin(-3.0f);
+    target.lock(true);
+    target.setHidden(true);
+    SgPropertySettings partial;
+    partial.setValue("Max", 9.0f);
+    partial.setValue("Min", QString("not a number"));
+    partial.setValue("Hidden", 0);
+    partial.setValue("Locked", false);
+    target.setAttributes(partial);
+    EXPECT_EQ(target.getMax(), 9.0f);
+    EXPECT_EQ(target.getMin(), -3.0f);
+    EXPECT_TRUE(target.isHidden());
+    EXPECT_FALSE(target.isLocked());
+
+    // Children that are no setting, or carry no key, an unknown type or a bad value, are
+    // skipped; the rest is read.
+    QDomDocument bad;
+    ASSERT_TRUE(bad.setContent(QStringLiteral(
+        "<P><Setting Key='A' Type='Float' Value='nan'/><Setting Key='B' Type='Int' Value='x'/>"
+        "<Setting Type='Int' Value='1'/><Setting Key='C' Type='Blob' Value='1'/><Other/>"
+        "<Setting Key='D' Type='Int' Value='4'/></P>")));
+    SgPropertySettings back;
+    EXPECT_FALSE(back.fromDOM(bad.documentElement()));
+    EXPECT_EQ(back.keys(), QStringList({"D"}));
+    EXPECT_EQ(back.value("D").toInt(), 4);
 }
 
 } // namespace
