@@ -154,28 +154,24 @@ protected:
 } // namespace
 
 TEST_F(BridgeAction, CollectingSendsEachFigureOnceWithFollowersAndDescendants) {
-    auto *body = new SgSkeleton(QStringLiteral("Body"));
-    auto *hip = new SgBone(QStringLiteral("hip"));
-    auto *chest = new SgBone(QStringLiteral("chest"));
-    body->addBone(hip);
-    body->addBone(chest, hip);
-    sgTestProp(QStringLiteral("Hat"))->setParent(chest);
-    auto *shirt = new SgSkeleton(QStringLiteral("Shirt"));
-    auto *sleeve = new SgBone(QStringLiteral("sleeve"));
-    shirt->addBone(sleeve);
+    SgSkeleton *body = sgTestFigure(QStringLiteral("Body"), 2, 1);
+    const SgBoneList bones = body->getAllBones();
+    sgTestProp(QStringLiteral("Hat"))->setParent(bones[1]);
+    SgSkeleton *shirt = sgTestFigure(QStringLiteral("Shirt"), 1, 1);
+    SgBone *sleeve = shirt->getAllBones()[0];
     shirt->setFollowTarget(body);
     sgTestProp(QStringLiteral("Ring"))->setParent(sleeve);
     auto *empty = new SgNode(QStringLiteral("Empty"));
     sgTestProp(QStringLiteral("Spoon"))->setParent(empty);
-    for (SgNode *node : {static_cast<SgNode *>(body), static_cast<SgNode *>(shirt),
-                         sgTestProp(QStringLiteral("Cup")), empty})
+    SgNode *cup = sgTestProp(QStringLiteral("Cup"));
+    for (SgNode *node : {static_cast<SgNode *>(body), static_cast<SgNode *>(shirt), cup, empty})
         scene()->addNode(node);
 
     TestBridge bridge;
     // A bone and its figure selected together, a node without an object (whose child is not
     // visited) and a plain prop.
-    for (const char *label : {"chest", "Body", "Empty", "Cup", "hip"})
-        scene()->selectNode(scene()->findNodeByLabel(QString::fromLatin1(label)), true);
+    for (SgNode *node : QList<SgNode *>{bones[1], body, empty, cup, bones[0]})
+        scene()->selectNode(node, true);
     StandInModeler modeler;
     bridge.executeAction();
     EXPECT_EQ(labels(bridge.sendList()), (QStringList{"Body", "Shirt", "Ring", "Hat", "Cup"}));
@@ -495,7 +491,7 @@ TEST_F(BridgeAction, AReturnWhoseLockTheModelerKeepsCostsShortStepsAndIsGivenUp)
     data->remove(SgSharedMemory::kRemoveUnlocked);
 }
 
-TEST_F(BridgeAction, PropLabelsAreMadeUniqueAndCentredOnTheirGeometry) {
+TEST_F(BridgeAction, ReturnedPropsGetUniqueCentredLabelsAndFiguresTheirNamesakesDiffuse) {
     scene()->addNode(sgTestProp(QStringLiteral("Body")));
     scene()->addNode(sgTestProp(QStringLiteral("Body (1)")));
     TestBridge bridge;
@@ -506,41 +502,29 @@ TEST_F(BridgeAction, PropLabelsAreMadeUniqueAndCentredOnTheirGeometry) {
               (QStringList{"Body", "Body (1)", "Body (2)", "Body (3)", "Lamp"}));
     EXPECT_EQ(scene()->getNode(2)->getName(), QStringLiteral("Body (2)"));
     EXPECT_EQ(scene()->getNode(2)->getOrigin(), SgVec3(0, 3, 4));
-}
 
-TEST_F(BridgeAction, CopyingMaterialsTouchesOnlyNamesakesDiffuse) {
-    auto *figure = new SgSkeleton(QStringLiteral("Body"));
-    const auto bone = [](const char *name) {
-        return sgTestAttach(new SgBone(QString::fromLatin1(name)),
-                            sgTestShape(QString::fromLatin1(name), sgTestPolygon({{0, 0, 0}}),
-                                        {QStringLiteral("Skin"), QStringLiteral("Eyes")}));
-    };
-    SgBone *arm = bone("arm");
-    SgBone *leg = bone("leg");
-    figure->addBone(arm);
-    figure->addBone(leg);
+    // A returned figure's materials reach only the namesakes on its bones, and of those only
+    // the diffuse colour and map.
+    SgSkeleton *figure = sgTestFigure(QStringLiteral("Figure"), 2, 1);
     scene()->addNode(figure);
-
-    auto *returned = sgTestShape(QStringLiteral("Body"), sgTestPolygon({{0, 0, 0}}));
+    auto *returned = sgTestShape(QStringLiteral("Figure"), sgTestPolygon({{0, 0, 0}}));
     auto *skin = static_cast<SgDefaultMaterial *>(returned->getMaterial(0));
     skin->setDiffuseColor(QColor(255, 128, 0));
     skin->setSpecularColor(QColor(1, 2, 3));
     SgTexture texture(QStringLiteral("skin.png"));
     skin->setColorMap(&texture);
     returned->addMaterial(new SgDefaultMaterial(QStringLiteral("Nails")));
-
-    TestBridge bridge;
     bridge.copyMaterials(returned, figure);
     bridge.copyMaterials(nullptr, figure);
     bridge.copyMaterials(returned, nullptr);
-    for (SgBone *bone : {arm, leg}) {
+    for (SgBone *bone : figure->getAllBones()) {
         SgShape *shape = bone->getObject()->getCurrentShape();
         auto *target = static_cast<SgDefaultMaterial *>(shape->findMaterial("Skin"));
         EXPECT_EQ(target->getDiffuseColor(), QColor(255, 128, 0));
         EXPECT_EQ(target->getColorMap(), &texture);
         EXPECT_NE(target->getSpecularColor(), QColor(1, 2, 3));
-        auto *eyes = static_cast<SgDefaultMaterial *>(shape->findMaterial("Eyes"));
-        EXPECT_EQ(eyes->getDiffuseColor(), QColor(255, 255, 255));
+        auto *cloth = static_cast<SgDefaultMaterial *>(shape->findMaterial("Cloth"));
+        EXPECT_EQ(cloth->getDiffuseColor(), QColor(255, 255, 255));
         EXPECT_EQ(shape->findMaterial("Nails"), nullptr);
     }
     delete returned;
