@@ -122,6 +122,26 @@ TEST(HostObjReader, RejectsMalformedInputWithFileAndLine) {
         EXPECT_EQ(r.getMesh(), nullptr);
     }
 
+    // On the fast lines (files longer than their read-ahead), a line shaped like the one before
+    // it but for one byte or one index 0 still fails on its own line.
+    const std::string faces = "v 0 0 0\nv 0 0 0\nv 0 0 0\nvt 0 0\nusemtl m\nf 1/1 2/1 3/1\n";
+    const Case lookAlikes[] = {
+        {"v 1.5 2.5 3.5\nv 1.5 2.5 3-5\n", 2, "bad number"},
+        {"vt 0.25 0.75\nvt 0.25 0.7x\n", 2, "bad number"},
+        {"f 1/1 2/1 3/1\nf 1/1 2/1 3x1\n", 8, "bad face corner"},
+        {"f 1/1 2/1 3/1\nf 1/1 0/1 3/1\n", 8, "index 0"},
+    };
+    for (const Case &c : lookAlikes) {
+        const std::string text =
+            (c.line == 8 ? faces : std::string()) + c.text + std::string(100, '#') + "\n";
+        SgObjReader r;
+        EXPECT_FALSE(read(r, text)) << c.text;
+        EXPECT_TRUE(r.getErrorString().startsWith(QStringLiteral("t.obj:%1: ").arg(c.line)))
+            << r.getErrorString().toStdString();
+        EXPECT_TRUE(r.getErrorString().contains(QLatin1String(c.words)))
+            << r.getErrorString().toStdString();
+    }
+
     // A polygon of more than 255 corners cannot be stored.
     std::string big = "v 0 0 0\nf";
     for (int i = 0; i < 256; ++i)
