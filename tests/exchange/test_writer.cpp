@@ -30,12 +30,6 @@ using namespace exchangetest;
 
 namespace {
 
-// Maps the material's "Bump Strength" to `texture` through the property, as the host does.
-void mapBump(SgDefaultMaterial &material, SgTexture *texture) {
-    material.getBumpControl()->setMapValue(texture);
-    material.getBumpControl()->setMapped(true);
-}
-
 // A prop node with one polygon shape; the node owns everything.
 std::unique_ptr<SgNode> prop(const QString &label, SgPolyMesh *mesh,
                              const std::vector<SgMaterial *> &materials) {
@@ -235,7 +229,8 @@ TEST(ExchangeWriterTest, ImagesAreCopiedAsJpegOncePerImageFileUnderSafeUniqueMea
     first->setColorMap(wood);
     auto *second = new SgDefaultMaterial("second");
     second->setColorMap(wood);
-    mapBump(*second, otherWood);
+    second->getBumpControl()->setMapValue(otherWood); // mapped through the property
+    second->getBumpControl()->setMapped(true);
     auto node = prop("W", sgTestMesh({}), {first, second});
 
     const QString copy = SgMaterialBlockWriter::jpegCopyPath(wood);
@@ -293,7 +288,8 @@ TEST(ExchangeWriterTest, ImagesAreCopiedAsJpegOncePerImageFileUnderSafeUniqueMea
         writeImage(deep + "/" + QString(200, QLatin1Char('n')) + ".png", Qt::green));
     auto *material = new SgDefaultMaterial("long");
     material->setColorMap(longImage);
-    mapBump(*material, longImage);
+    material->getBumpControl()->setMapValue(longImage);
+    material->getBumpControl()->setMapped(true);
     auto longNode = prop("L", sgTestMesh({}), {material});
     SgExchangeWriter writer(longNode.get(), QString());
     QByteArray buffer(writer.getSize() + 16, '\x7f');

@@ -52,8 +52,7 @@ TEST(HostObjReader, KeepsVertexOrderPolygonsGroupsAndMaterials) {
                   {0, -1, -1}, {1, -1, -1}, {2, -1, -1}, {4, 1, 0}, {3, 0, 0}, {2, 0, 0}}));
     EXPECT_EQ(m->quadCorners(),
               (std::vector<SgFaceCorner>{{0, 0, -1}, {1, 1, -1}, {2, 0, -1}, {3, 1, -1}}));
-    EXPECT_EQ(m->getPolygonCorners(0)[0].uv, -1);
-    EXPECT_EQ(m->getPolygonCorners(0)[0].third, 0);
+    EXPECT_EQ(m->getPolygonCorners(0)[4], (SgFaceCorner{4, -1, 0}));
 
     // Faces before any usemtl use "default"; names are indexed in order of first use.
     EXPECT_EQ(r.getMaterialNames(), (QStringList{QStringLiteral("default"), QStringLiteral("Skin"),
