@@ -135,7 +135,8 @@ bool SgExchangeNodeReader::readFacets(SgExchangeNode &node) {
                                 .arg(f)
                                 .arg(corner.vertex)
                                 .arg(vertexCount));
-            if (uvCount > 0 && uint32_t(corner.uv) >= uvCount)
+            // -1 is the host's "no UV": a partly mapped mesh sends it beside a UV list.
+            if (uvCount > 0 && corner.uv != -1 && uint32_t(corner.uv) >= uvCount)
                 return fail(QStringLiteral("Facet %1 refers to UV %2 of %3.")
                                 .arg(f)
                                 .arg(corner.uv)

@@ -25,7 +25,7 @@ void buildMesh(const SgExchangeNode &node, SgPolyMesh &mesh) {
         mesh.startFace();
         for (uint32_t c = 0; c < facet.cornerCount; ++c) {
             const SgExchangeNode::Corner &corner = node.corners[facet.firstCorner + c];
-            mesh.addFaceEdge(corner.vertex, withUvs ? std::max(corner.uv, 0) : -1);
+            mesh.addFaceEdge(corner.vertex, withUvs ? corner.uv : -1);
         }
         mesh.finishFace();
     }

@@ -1,6 +1,7 @@
 // The application window with the real plug-in: it opens offscreen, the plug-in's action sits
 // in its category's menu and tool bar and its class reaches script engines, the tree drives the
-// scene's selection, the property panel sets values, and a screenshot is kept as a test artefact.
+// scene's selection, the property panel sets values, the preferences are kept, and a screenshot
+// is kept as a test artefact.
 
 #include "app/sgappwindow.h"
 #include "app/sglogpane.h"
@@ -85,7 +86,7 @@ SgFloatProperty *addMorph(SgSkeleton *figure) {
 
 } // namespace
 
-TEST(AppWindow, ShowsThePluginActionTheSceneAndItsProperties) {
+TEST(AppWindow, ShowsThePluginActionTheSceneItsPropertiesAndThePreferences) {
     SgPluginHost plugins;
     ASSERT_EQ(plugins.loadFolder(QStringLiteral(FACBRIDGE_PLUGIN_DIR)), 1)
         << sgApp->getMessageSink()->logLines().join('\n').toStdString();
@@ -132,9 +133,9 @@ TEST(AppWindow, ShowsThePluginActionTheSceneAndItsProperties) {
     EXPECT_EQ(scene->getPrimarySelection(), figure);
     EXPECT_EQ(scene->getSelectedNodes().size(), 1);
     // A selection made elsewhere shows in the tree.
-    scene->selectNode(scene->findNodeByLabel(QStringLiteral("Box")));
-    EXPECT_TRUE(
-        window.sceneTree()->itemOf(scene->findNodeByLabel(QStringLiteral("Box")))->isSelected());
+    SgNode *box = scene->findNodeByLabel(QStringLiteral("Box"));
+    scene->selectNode(box);
+    EXPECT_TRUE(window.sceneTree()->itemOf(box)->isSelected());
     EXPECT_FALSE(item->isSelected());
 
     // A control property on the figure shows in the panel and is set from it.
@@ -182,9 +183,31 @@ TEST(AppWindow, ShowsThePluginActionTheSceneAndItsProperties) {
     EXPECT_TRUE(window.grab().save(shot)) << shot.toStdString();
     EXPECT_EQ(sgCutTexts(&window), QStringList());
     scene->clear();
+
+    // The preferences hold the modeler's path and the road returns take.
+    SgTestModalAnswer answer(sgTestAs<SgPreferencesDlg>([](SgPreferencesDlg *dialog) {
+        EXPECT_EQ(sgCutTexts(dialog), QStringList());
+        dialog->installPathEdit()->setText(QStringLiteral("/opt/facetor"));
+        dialog->bridgeToolsBox()->setChecked(true);
+        dialog->accept();
+    }));
+    actionNamed(window, "SgPreferencesAction")->trigger();
+    SgAppSettings settings;
+    EXPECT_EQ(settings.getString(QStringLiteral("FacetorInstallPath")),
+              QStringLiteral("/opt/facetor"));
+    EXPECT_EQ(settings.getInt(QStringLiteral("FacetorBridgeTools")), 1);
+    // Shown again as stored; "Cancel" keeps them.
+    SgPreferencesDlg again(&window);
+    EXPECT_EQ(again.installPathEdit()->text(), QStringLiteral("/opt/facetor"));
+    EXPECT_TRUE(again.bridgeToolsBox()->isChecked());
+    again.bridgeToolsBox()->setChecked(false);
+    again.reject();
+    EXPECT_EQ(settings.getInt(QStringLiteral("FacetorBridgeTools")), 1);
+    settings.remove(QStringLiteral("FacetorBridgeTools"));
+    settings.remove(QStringLiteral("FacetorInstallPath"));
 }
 
-TEST(AppWindow, SavesReopensAndNeverLosesChangesSilently) {
+TEST(AppWindow, SavesReopensDeletesAndNeverLosesChangesSilently) {
     SgAppWindow window;
     window.show();
     SgScene *scene = sgApp->getScene();
@@ -253,9 +276,27 @@ TEST(AppWindow, SavesReopensAndNeverLosesChangesSilently) {
     EXPECT_EQ(reopened->getValue(), 1.0f);
 
     // Export writes the MTL beside the OBJ.
-    scene->selectNode(scene->findNodeByLabel(QStringLiteral("Box")));
+    SgNode *box = scene->findNodeByLabel(QStringLiteral("Box"));
+    scene->selectNode(box);
     ASSERT_TRUE(window.exportSelection(sgTestPath(QStringLiteral("session/box.obj")), true));
     EXPECT_TRUE(sgTestReadFile(sgTestPath(QStringLiteral("session/box.mtl"))).contains("newmtl "));
+
+    // "Delete" never removes a lone bone; a prop goes after the question, and the bone
+    // selected with it stays.
+    const int before = scene->getNodeCount();
+    SgNode *hip = scene->findNodeByLabel(QStringLiteral("hip"));
+    scene->selectNode(hip);
+    EXPECT_EQ(window.deleteSelection(false), 0);
+    scene->selectNode(box, true);
+    ASSERT_EQ(window.propertyPanel()->node(), box);
+    sgTestAnswering({sgTestPressButton(QMessageBox::Yes, nullptr, &question)},
+                    [&] { actionNamed(window, "SgDeleteAction")->trigger(); });
+    EXPECT_EQ(question, QStringLiteral("Delete Box?"));
+    EXPECT_EQ(scene->findNodeByLabel(QStringLiteral("Box")), nullptr);
+    EXPECT_EQ(window.sceneTree()->itemOf(box), nullptr);
+    EXPECT_EQ(window.propertyPanel()->node(), hip); // the primary selection now
+    EXPECT_EQ(scene->getNodeCount(), before - 1);
+    EXPECT_TRUE(window.isSceneModified());
 
     // Changed again, closing with "Save" saves to the current file and closes.
     window.propertyPanel()->setValue(reopened, -0.5);
@@ -263,64 +304,12 @@ TEST(AppWindow, SavesReopensAndNeverLosesChangesSilently) {
         sgTestAnswering({sgTestPressButton(QMessageBox::Save)}, [&] { return window.close(); }));
     SgScene check;
     ASSERT_TRUE(SgSceneFile().load(saved, &check));
+    SgNode *checked = check.findNodeByLabel(QStringLiteral("Blobby"));
     EXPECT_EQ(
-        static_cast<SgFloatProperty *>(
-            check.findNodeByLabel(QStringLiteral("Blobby"))->findProperty(QStringLiteral("Grow")))
-            ->getValue(),
+        static_cast<SgFloatProperty *>(checked->findProperty(QStringLiteral("Grow")))->getValue(),
         -0.5f);
-    scene->clear();
-}
-
-TEST(AppWindow, PreferencesHoldTheModelerPathAndTheImportRoad) {
-    SgAppWindow window;
-    SgTestModalAnswer answer(sgTestAs<SgPreferencesDlg>([](SgPreferencesDlg *dialog) {
-        EXPECT_EQ(sgCutTexts(dialog), QStringList());
-        dialog->installPathEdit()->setText(QStringLiteral("/opt/facetor"));
-        dialog->bridgeToolsBox()->setChecked(true);
-        dialog->accept();
-    }));
-    actionNamed(window, "SgPreferencesAction")->trigger();
-    SgAppSettings settings;
-    EXPECT_EQ(settings.getString(QStringLiteral("FacetorInstallPath")),
-              QStringLiteral("/opt/facetor"));
-    EXPECT_EQ(settings.getInt(QStringLiteral("FacetorBridgeTools")), 1);
-    // Shown again as stored; "Cancel" keeps them.
-    SgPreferencesDlg again(&window);
-    EXPECT_EQ(again.installPathEdit()->text(), QStringLiteral("/opt/facetor"));
-    EXPECT_TRUE(again.bridgeToolsBox()->isChecked());
-    again.bridgeToolsBox()->setChecked(false);
-    again.reject();
-    EXPECT_EQ(settings.getInt(QStringLiteral("FacetorBridgeTools")), 1);
-    settings.remove(QStringLiteral("FacetorBridgeTools"));
-    settings.remove(QStringLiteral("FacetorInstallPath"));
-}
-
-TEST(AppWindow, DeleteRemovesSelectedPropsAndFiguresButNoLoneBone) {
-    SgAppWindow window;
-    SgScene *scene = sgApp->getScene();
-    ASSERT_TRUE(window.openScene(QStringLiteral(SG_EXAMPLES_DIR "/demo/scene.json"), true));
-    const int nodes = scene->getNodeCount();
-    SgNode *box = scene->findNodeByLabel(QStringLiteral("Box"));
-    SgNode *hip = scene->findNodeByLabel(QStringLiteral("hip"));
-    scene->selectNode(hip);
-    EXPECT_EQ(window.deleteSelection(false), 0);
-    EXPECT_EQ(scene->getNodeCount(), nodes);
-
-    // The prop goes after the question; the bone selected with it stays.
-    scene->selectNode(box, true);
-    ASSERT_EQ(window.propertyPanel()->node(), box);
-    QString question;
-    sgTestAnswering({sgTestPressButton(QMessageBox::Yes, nullptr, &question)},
-                    [&] { actionNamed(window, "SgDeleteAction")->trigger(); });
-    EXPECT_EQ(question, QStringLiteral("Delete Box?"));
-    EXPECT_EQ(scene->findNodeByLabel(QStringLiteral("Box")), nullptr);
-    EXPECT_EQ(window.sceneTree()->itemOf(box), nullptr);
-    EXPECT_EQ(window.propertyPanel()->node(), hip); // the primary selection now
-    EXPECT_EQ(scene->getNodeCount(), nodes - 1);
-    EXPECT_TRUE(window.isSceneModified());
-
     // A figure goes with its bones.
-    scene->selectNode(scene->findNodeByLabel(QStringLiteral("Blobby")));
+    scene->selectNode(figure);
     scene->selectNode(hip, true);
     EXPECT_EQ(window.deleteSelection(false), 1);
     EXPECT_EQ(scene->getNodeCount(), 0);

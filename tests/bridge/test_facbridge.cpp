@@ -3,6 +3,7 @@
 // through a second view of the control segment, or by a stand-in program that only sleeps.
 
 #include "bridge/sgfacbridge.h"
+#include "tests/support/sgtestmain.h"
 #include "tests/support/sgtestmodal.h"
 #include "tests/support/sgtestprocess.h"
 #include "tests/support/sgtestscene.h"
@@ -56,9 +57,9 @@ public:
     SgControlRecord *live() { return m_record ? m_record : &m_scratch; }
     void post(SgModelerMessage code) { post(sgCodeByte(code)); }
     // A code as the byte it travels as.
-    void post(std::uint8_t code) {
+    void post(std::uint8_t code, std::int32_t parameter = 0) {
         live()->toHostCode = code;
-        live()->toHostParameter = 0;
+        live()->toHostParameter = parameter;
         live()->toHostFlag = 0;
     }
     // Takes the host's message: its code, or none when none waits.
@@ -82,12 +83,10 @@ class StandInModeler {
 public:
     StandInModeler() {
         static const QTemporaryDir folder;
-        QFile program(folder.filePath(QStringLiteral("Facetor")));
-        if (!program.exists()) {
-            program.open(QIODevice::WriteOnly);
-            program.write("#!/bin/sh\nexec sleep 10 </dev/null >/dev/null 2>&1\n");
-            program.close();
-            program.setPermissions(QFile::ReadOwner | QFile::WriteOwner | QFile::ExeOwner);
+        const QString program = folder.filePath(QStringLiteral("Facetor"));
+        if (!QFile::exists(program)) {
+            sgTestWriteFile(program, "#!/bin/sh\nexec sleep 10 </dev/null >/dev/null 2>&1\n");
+            QFile::setPermissions(program, QFile::ReadOwner | QFile::WriteOwner | QFile::ExeOwner);
         }
         qputenv("FACETOR_INSTALL_PATH", folder.path().toUtf8());
     }
@@ -103,6 +102,15 @@ protected:
     void TearDown() override { scene()->clear(); }
     static SgScene *scene() { return sgApp->getScene(); }
 
+    // Adds the nodes `names` to the selection (props made for those not in the scene).
+    static void selectProps(const QStringList &names) {
+        for (const QString &label : names) {
+            if (!scene()->findNodeByLabel(label))
+                scene()->addNode(sgTestProp(label));
+            scene()->selectNode(scene()->findNodeByLabel(label), true);
+        }
+    }
+
     template <typename List> static QStringList labels(const List &list) {
         QStringList out;
         for (SgNode *node : list)
@@ -110,17 +118,13 @@ protected:
         return out;
     }
 
-    // An active bridge linked through the stand-in modeler with the nodes `send` (props made
-    // for those not in the scene) selected and sent; the test steps its poll itself.
+    // An active bridge linked through the stand-in modeler with the nodes `send` selected and
+    // sent; the test steps its poll itself.
     static std::unique_ptr<TestBridge> linkedBridge(const QStringList &send = {"Cup"}) {
         StandInModeler modeler;
         auto bridge = std::make_unique<TestBridge>();
         scene()->clearSelection();
-        for (const QString &label : send) {
-            if (!scene()->findNodeByLabel(label))
-                scene()->addNode(sgTestProp(label));
-            scene()->selectNode(scene()->findNodeByLabel(label), true);
-        }
+        selectProps(send);
         bridge->executeAction();
         bridge->pollTimer()->stop();
         return bridge;
@@ -209,10 +213,7 @@ TEST_F(BridgeAction, NothingSelectedAsksBeforeLaunching) {
 
     // Triggered again while linked, it appends the selection: no question, no launch.
     const qint64 pid = bridge.modelerProcessId();
-    for (const char *label : {"Cup", "Plate"}) {
-        scene()->addNode(sgTestProp(QString::fromLatin1(label)));
-        scene()->selectNode(scene()->findNodeByLabel(QString::fromLatin1(label)), true);
-    }
+    selectProps({"Cup", "Plate"});
     bridge.executeAction();
     EXPECT_EQ(answer.titles().size(), 1);
     EXPECT_EQ(bridge.modelerProcessId(), pid);
@@ -222,10 +223,7 @@ TEST_F(BridgeAction, NothingSelectedAsksBeforeLaunching) {
 TEST_F(BridgeAction, AMissingModelerIsLoggedAndRemovedNodesLeaveTheSendList) {
     qputenv("FACETOR_INSTALL_PATH", "/nonexistent/facetor");
     TestBridge bridge;
-    for (const char *label : {"Cup", "Plate", "Fork"}) {
-        scene()->addNode(sgTestProp(QString::fromLatin1(label)));
-        scene()->selectNode(scene()->getNode(scene()->getNodeCount() - 1), true);
-    }
+    selectProps({"Cup", "Plate", "Fork"});
     bridge.executeAction();
     qunsetenv("FACETOR_INSTALL_PATH");
     EXPECT_TRUE(
@@ -244,8 +242,7 @@ TEST_F(BridgeAction, AMissingModelerIsLoggedAndRemovedNodesLeaveTheSendList) {
     // While another host holds the link the user is told, and no modeler starts.
     SgTestSegment otherHost(kSgHostLinkKey);
     ASSERT_TRUE(otherHost.create(8));
-    scene()->addNode(sgTestProp(QStringLiteral("Cup")));
-    scene()->selectNode(scene()->findNodeByLabel(QStringLiteral("Cup")));
+    selectProps({"Cup"});
     StandInModeler modeler;
     TestBridge second;
     second.executeAction();
@@ -274,9 +271,7 @@ TEST_F(BridgeAction, MessagesWaitForTheirSlot) {
     EXPECT_FALSE(bridge->postMessage(SgHostMessage::NodeWritten, 9));
     EXPECT_EQ(std::memcmp(&before, peer.live(), sizeof before), 0);
 
-    peer.live()->toHostParameter = -3;
-    peer.live()->toHostCode = 200;
-    peer.live()->toHostFlag = 0;
+    peer.post(200, -3);
     EXPECT_EQ(sgCodeByte(bridge->readMessage(value)), 200);
     EXPECT_EQ(value, -3);
     EXPECT_EQ(peer.live()->toHostFlag, 1);
@@ -288,8 +283,11 @@ TEST_F(BridgeAction, MessagesWaitForTheirSlot) {
     EXPECT_EQ(peer.take(), SgHostMessage::ShuttingDown);
 }
 
-TEST_F(BridgeAction, ThePollCountsIdlePollsAndRetriesBeforeNotices) {
-    auto bridge = linkedBridge();
+TEST_F(BridgeAction, ThePollCountsIdlePollsRetriesBeforeNoticesAndSendsWhatItCan) {
+    // A node whose shape has no geometry, sent before a plain prop.
+    scene()->addNode(sgTestAttach(new SgNode(QStringLiteral("Hollow")),
+                                  new SgPolyShape(QStringLiteral("Hollow"))));
+    auto bridge = linkedBridge({"Hollow", "Cup"});
     Peer peer;
     for (int i = 1; i <= 10; ++i) {
         bridge->checkSharedMap();
@@ -313,14 +311,34 @@ TEST_F(BridgeAction, ThePollCountsIdlePollsAndRetriesBeforeNotices) {
     EXPECT_EQ(bridge->idlePolls(), 0);
     EXPECT_EQ(bridge->retryQueue().size(), 1);
     EXPECT_EQ(peer.take(), SgHostMessage::Idle);
+    // While the modeler holds the control lock a step waits for it once, posts nothing and
+    // counts as idle.
+    {
+        SgTestSegment modeler(kSgControlSegmentKey);
+        ASSERT_TRUE(modeler.attach(SgSharedMemory::kReadWrite));
+        ASSERT_TRUE(modeler.tryLock(0));
+        QElapsedTimer clock;
+        clock.start();
+        bridge->checkSharedMap();
+        EXPECT_GE(clock.elapsed(), 24);
+        EXPECT_LT(clock.elapsed(), 45);
+        EXPECT_EQ(bridge->retryQueue().size(), 1);
+        EXPECT_EQ(bridge->idlePolls(), 1);
+        modeler.unlock();
+        modeler.detach();
+        modeler.remove(SgSharedMemory::kRemoveUnlocked);
+    }
     bridge->checkSharedMap();
     EXPECT_TRUE(bridge->retryQueue().isEmpty());
     EXPECT_EQ(peer.take(), SgHostMessage::GeometryRead);
-    EXPECT_EQ(bridge->idlePolls(), 0);
+    EXPECT_EQ(bridge->idlePolls(), 1);
 
-    // The modeler asks: the first node goes out in a data segment of its own.
+    // The modeler asks: the node that cannot be written is reported, and only the whole record
+    // of the next goes out, in a data segment of its own.
     peer.post(SgModelerMessage::SendSelection);
     bridge->checkSharedMap();
+    EXPECT_TRUE(sgApp->getMessageSink()->logLines().contains(
+        QStringLiteral("Could not send Hollow to Facetor.")));
     EXPECT_TRUE(bridge->isExchangeBusy());
     EXPECT_EQ(bridge->sendList().count(), 0);
     EXPECT_EQ(peer.take(), SgHostMessage::NodeWritten);
@@ -336,34 +354,9 @@ TEST_F(BridgeAction, ThePollCountsIdlePollsAndRetriesBeforeNotices) {
     EXPECT_FALSE(sgTestSegmentExists(kSgDataSegmentKey));
 }
 
-TEST_F(BridgeAction, AHeldLockCostsOneWaitAndALostRecordEndsTheExchange) {
+TEST_F(BridgeAction, ALostRecordEndsTheExchangeAndAQuitEndsTheLink) {
     auto bridge = linkedBridge();
     Peer peer;
-    // An acknowledgement waits in the retry queue while the slot is taken.
-    ASSERT_TRUE(bridge->postMessage(SgHostMessage::SegmentBusy, 0));
-    peer.post(SgModelerMessage::GeometryWritten);
-    bridge->checkSharedMap();
-    ASSERT_EQ(bridge->retryQueue().size(), 1);
-    EXPECT_EQ(peer.take(), SgHostMessage::SegmentBusy);
-
-    // While the modeler holds the control lock a step waits for it once and posts nothing.
-    {
-        SgTestSegment modeler(kSgControlSegmentKey);
-        ASSERT_TRUE(modeler.attach(SgSharedMemory::kReadWrite));
-        ASSERT_TRUE(modeler.tryLock(0));
-        QElapsedTimer clock;
-        clock.start();
-        bridge->checkSharedMap();
-        EXPECT_GE(clock.elapsed(), 24);
-        EXPECT_LT(clock.elapsed(), 45);
-        EXPECT_EQ(bridge->retryQueue().size(), 1);
-        modeler.unlock();
-        modeler.detach();
-        modeler.remove(SgSharedMemory::kRemoveUnlocked);
-    }
-    bridge->checkSharedMap();
-    EXPECT_EQ(peer.take(), SgHostMessage::GeometryRead);
-
     // The modeler takes the node record and asks again without acknowledging it: the same
     // modeler is still at work; one that has linked since has lost the record.
     peer.post(SgModelerMessage::SendSelection);
@@ -381,8 +374,8 @@ TEST_F(BridgeAction, AHeldLockCostsOneWaitAndALostRecordEndsTheExchange) {
     EXPECT_FALSE(sgTestSegmentExists(kSgDataSegmentKey));
 
     // A modeler that quits ends a busy exchange, drops the queued messages and stops the poll.
-    scene()->addNode(sgTestProp(QStringLiteral("Plate")));
-    scene()->selectNode(scene()->findNodeByLabel(QStringLiteral("Plate")));
+    scene()->clearSelection();
+    selectProps({"Plate"});
     bridge->executeAction();
     peer.post(SgModelerMessage::SendSelection);
     bridge->checkSharedMap();
@@ -454,9 +447,8 @@ TEST_F(BridgeAction, ReturnsAreAcknowledgedFirstThenImportedOrRefused) {
     SgNode *prop = scene()->findNodeByLabel(QStringLiteral("Gizmo"));
     ASSERT_NE(prop, nullptr);
     // Host units are ten times the modeler's; the origin is the centre of the bounding box.
-    EXPECT_FLOAT_EQ(prop->getOrigin().x, 10.0f);
-    EXPECT_FLOAT_EQ(prop->getOrigin().y, 20.0f);
-    EXPECT_EQ(prop->getObject()->getCurrentShape()->getGeometry()->getVertexCount(), 3);
+    EXPECT_EQ(prop->getOrigin(), SgVec3(10, 20, 0));
+    EXPECT_EQ(sgTestGeometry(prop)->getVertexCount(), 3);
 
     // A label outside 8 bits travels as "Kiste?A" and comes back to its node as a morph.
     returnShape("Kiste?A", {0, 0, 0, 1, 0.5f, 0, 0, 1, 0});
@@ -501,24 +493,6 @@ TEST_F(BridgeAction, AReturnWhoseLockTheModelerKeepsCostsShortStepsAndIsGivenUp)
     data->unlock();
     data->detach();
     data->remove(SgSharedMemory::kRemoveUnlocked);
-}
-
-TEST_F(BridgeAction, ANodeThatCannotBeWrittenIsReportedAndTheNextGoesOut) {
-    auto *hollow = new SgNode(QStringLiteral("Hollow"));
-    auto *object = new SgObject(QStringLiteral("Hollow"));
-    object->addShape(new SgPolyShape(QStringLiteral("Hollow"))); // a shape without geometry
-    hollow->setObject(object);
-    scene()->addNode(hollow);
-    auto bridge = linkedBridge({"Hollow", "Cup"});
-    Peer peer;
-    peer.post(SgModelerMessage::SendSelection);
-    bridge->checkSharedMap();
-    EXPECT_TRUE(sgApp->getMessageSink()->logLines().contains(
-        QStringLiteral("Could not send Hollow to Facetor.")));
-    // Only the whole record of the next node is announced.
-    EXPECT_EQ(peer.take(), SgHostMessage::NodeWritten);
-    EXPECT_TRUE(bridge->isExchangeBusy());
-    EXPECT_EQ(bridge->sendList().count(), 0);
 }
 
 TEST_F(BridgeAction, PropLabelsAreMadeUniqueAndCentredOnTheirGeometry) {

@@ -95,8 +95,9 @@ TEST(HeadlessDemo, RoundTripMakesMorphsAndExportsTheFigureAtValueOne) {
     EXPECT_TRUE(sgTestLeftovers().isEmpty()) << sgTestLeftovers().join(' ').toStdString();
 }
 
-TEST(HeadlessDemo, ScriptFailuresAndArguments) {
-    const Scenara scenara;
+TEST(HeadlessDemo, ScriptFailuresArgumentsAndADeclinedReturn) {
+    // The modeler returns the prop with a vertex more: no morph can be made.
+    const Scenara scenara("extra=0,0,5");
     // A script that throws ends with a non-zero status and names its line; so do a syntax
     // error, an exception inside a waited-for callback, and a missing file.
     for (const auto &[name, text, says] :
@@ -124,12 +125,9 @@ TEST(HeadlessDemo, ScriptFailuresAndArguments) {
     EXPECT_TRUE(args.out.contains(QStringLiteral(",-facbridge\n")));
     EXPECT_TRUE(args.out.contains(QStringLiteral("script=one,two\n")));
     EXPECT_TRUE(args.out.contains(QStringLiteral("classes=function\n")));
-}
 
-TEST(HeadlessDemo, AClosedBoxDoesNotEndTheScriptAndADeclinedReturnSaysSo) {
-    // The modeler returns the prop with a vertex more: no morph can be made, and the script
-    // declines the prop that the host offers instead.
-    const Scenara scenara("extra=0,0,5");
+    // A closed box does not end the script; it declines the prop that the host offers instead
+    // of a morph, and learns so.
     const ScenaraRun run = scenara.run(
         {QStringLiteral("--script"),
          scenara.script("declined.js",

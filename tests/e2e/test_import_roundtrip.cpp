@@ -9,9 +9,7 @@
 #include "tests/support/sgtestscene.h"
 
 #include "sgcore/app/sgappsettings.h"
-#include "sgcore/app/sgmessagesink.h"
 #include "sgcore/geometry/sgobject.h"
-#include "sgcore/geometry/sgpolymesh.h"
 #include "sgcore/materials/sgdefaultmaterial.h"
 #include "sgcore/morph/sgmorph.h"
 #include "sgcore/morph/sgmorphdeltas.h"

@@ -7,7 +7,6 @@
 #include "tests/support/sgtestprocess.h"
 #include "tests/support/sgtestscene.h"
 
-#include "exchange/shm/sgcontrolrecord.h"
 #include "sgcore/app/sgmessagesink.h"
 #include "sgcore/geometry/sgobject.h"
 #include "sgcore/morph/sgmorph.h"

@@ -50,31 +50,20 @@ int morphsMade() {
 
 // Everything the modeler needs, in its settings file under a private configuration folder.
 // The environment names that folder, and a workspace of its own, which wins over the file's.
-class SettingsRun {
+class SettingsRun : public SgTestModeler {
 public:
-    SettingsRun() {
-        sgTestWriteFile(m_dir.filePath(QStringLiteral("config/Facetor/Facetor.ini")),
+    SettingsRun() : SgTestModeler(FACETOR_BIN_DIR) {
+        sgTestWriteFile(path(QStringLiteral("config/Facetor/Facetor.ini")),
                         QStringLiteral("[General]\nworkspace=%1\nwatch=true\nsettleTime=%2\n"
                                        "log=%3\nhostTimeout=10000\n")
                             .arg(fileWorkspace())
                             .arg(kSettleMs)
-                            .arg(logPath())
+                            .arg(newLog())
                             .toUtf8());
-        qputenv("XDG_CONFIG_HOME", m_dir.filePath(QStringLiteral("config")).toUtf8());
-        qputenv("FACETOR_INSTALL_PATH", FACETOR_BIN_DIR);
-        qputenv("FACETOR_WORKSPACE", workspace().toUtf8());
+        set("FACETOR_LOG", {}); // the file names the log
+        set("XDG_CONFIG_HOME", path(QStringLiteral("config")).toUtf8());
     }
-    ~SettingsRun() {
-        for (const char *name : {"XDG_CONFIG_HOME", "FACETOR_INSTALL_PATH", "FACETOR_WORKSPACE"})
-            qunsetenv(name);
-    }
-    QString workspace() const { return m_dir.filePath(QStringLiteral("workspace")); }
-    QString fileWorkspace() const { return m_dir.filePath(QStringLiteral("file-workspace")); }
-    QString logPath() const { return m_dir.filePath(QStringLiteral("facetor.log")); }
-    QString log() const { return QString::fromUtf8(sgTestReadFile(logPath())); }
-
-private:
-    QTemporaryDir m_dir;
+    QString fileWorkspace() const { return path(QStringLiteral("file-workspace")); }
 };
 
 class ModelerSaves : public ::testing::Test {
@@ -163,8 +152,9 @@ TEST_F(ModelerSaves, EverySaveStyleGivesExactlyOneCompleteReturn) {
         << run.log().toStdString();
 }
 
-// The test plays the host by hand: it takes the modeler's return announcement (code 1) and
-// answers with code 4, as a host that needs the data segment for a node of its own does.
+// The test steps the host's side by hand with the bridge's own message calls: it takes the
+// modeler's return announcement (code 1) and answers with code 4, as a host that needs the data
+// segment for a node of its own does.
 TEST(ModelerRelease, AReturnReleasedInFlightComesAgain) {
     QTemporaryDir dir;
     const QString returned = sgTestWriteFile(dir.filePath(QStringLiteral("shape.obj")),
@@ -175,38 +165,21 @@ TEST(ModelerRelease, AReturnReleasedInFlightComesAgain) {
     ASSERT_TRUE(control.attach(SgSharedMemory::kReadWrite));
     const SgControlRecord fresh = SgControlRecord::fresh();
     std::memcpy(control.data(), &fresh, sizeof fresh);
-    auto *record = reinterpret_cast<SgControlRecord *>(control.data());
-    // The modeler's waiting message (NoMessage when none waits), taken under the lock.
-    auto take = [&] {
-        auto code = SgModelerMessage::NoMessage;
-        if (control.tryLock(25)) {
-            if (record->toHostFlag == 0) {
-                code = SgModelerMessage(record->toHostCode);
-                record->toHostFlag = 1;
-            }
-            control.unlock();
-        }
-        return code;
-    };
-    // Posts `code` once the modeler has taken the host's last message.
-    auto post = [&](SgHostMessage code) {
-        if (!control.tryLock(25))
-            return false;
-        const bool free = record->toModelerFlag == 1;
-        if (free) {
-            record->toModelerCode = sgCodeByte(code);
-            record->toModelerFlag = 0;
-        }
-        control.unlock();
-        return free;
+    // Linked as a host that the modeler started, with the poll left off.
+    sgApp->setCommandArguments({QStringLiteral("-facbridge")});
+    E2eBridge host;
+    sgApp->setCommandArguments({});
+    host.pollTimer()->stop();
+    const auto post = [&host](SgHostMessage code) {
+        while (!host.postMessage(code, 0))
+            QThread::msleep(5);
     };
 
     QProcess modeler;
-    modeler.setProgram(QStringLiteral(FACETOR_BIN_DIR "/Facetor"));
-    modeler.setArguments({QStringLiteral("-sgl"), QStringLiteral("--return"), returned,
-                          QStringLiteral("--workspace"), dir.filePath(QStringLiteral("ws")),
-                          QStringLiteral("--log"), dir.filePath(QStringLiteral("log"))});
-    modeler.start();
+    modeler.start(QStringLiteral(FACETOR_BIN_DIR "/Facetor"),
+                  {QStringLiteral("-sgl"), QStringLiteral("--return"), returned,
+                   QStringLiteral("--workspace"), dir.filePath(QStringLiteral("ws")),
+                   QStringLiteral("--log"), dir.filePath(QStringLiteral("log"))});
     ASSERT_TRUE(modeler.waitForStarted());
 
     // Idle notices until the return is announced (the selection is empty).
@@ -214,12 +187,12 @@ TEST(ModelerRelease, AReturnReleasedInFlightComesAgain) {
     int vertices = 0;
     QElapsedTimer clock;
     clock.start();
+    int value = 0;
     while (vertices == 0 && clock.elapsed() < 15000) {
-        if (take() == SgModelerMessage::GeometryWritten) {
+        if (host.readMessage(value) == SgModelerMessage::GeometryWritten) {
             if (++announcements == 1) {
                 // The first announcement is answered by asking the modeler to let go.
-                while (!post(SgHostMessage::SegmentBusy))
-                    QThread::msleep(5);
+                post(SgHostMessage::SegmentBusy);
                 continue;
             }
             SgTestSegment data(kSgDataSegmentKey);
@@ -232,10 +205,9 @@ TEST(ModelerRelease, AReturnReleasedInFlightComesAgain) {
             data.detach();
             ASSERT_NE(read, nullptr);
             vertices = read->getGeometry()->getVertexCount();
-            while (!post(SgHostMessage::GeometryRead))
-                QThread::msleep(5);
+            post(SgHostMessage::GeometryRead);
         }
-        post(SgHostMessage::Idle);
+        host.postMessage(SgHostMessage::Idle, 0);
         QThread::msleep(20);
     }
     EXPECT_EQ(announcements, 2)

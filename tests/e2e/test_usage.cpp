@@ -41,9 +41,7 @@
 #include <chrono>
 #include <csignal>
 #include <cstdio>
-#include <deque>
 #include <functional>
-#include <mutex>
 #include <random>
 #include <thread>
 #include <utility>
@@ -59,14 +57,10 @@ constexpr qint64 kBlockLimitMs = 100;
 constexpr int kModelerHostTimeoutMs = 2000;
 constexpr int kHeldDialogMs = 2600; // past the modeler's host time-out
 
-qint64 nowMs() {
-    using namespace std::chrono;
-    return duration_cast<milliseconds>(steady_clock::now().time_since_epoch()).count();
-}
-
-// A second thread of this process that wakes every 2 ms and notes when it could not. A stall
-// that it saw as well is the machine's (the process was not scheduled), not a block of the GUI
-// thread: only what is left of a GUI stall after the witness's own stall counts against the host.
+// A second thread of this process that wakes every 2 ms and adds up the time it could not. A
+// stall that it saw as well is the machine's (the process was not scheduled), not a block of the
+// GUI thread: only what is left of a GUI stall after the witness's stalls meanwhile counts
+// against the host.
 class StallWitness {
 public:
     StallWitness() : m_thread([this] { run(); }) {}
@@ -74,33 +68,23 @@ public:
         m_stop = true;
         m_thread.join();
     }
-    // How much of [from, to] (ms of nowMs()) the witness itself stood still.
-    qint64 stalledWithin(qint64 from, qint64 to) const {
-        std::lock_guard guard(m_mutex);
-        qint64 stalled = 0;
-        for (const auto &[start, end] : m_stalls)
-            stalled += std::max<qint64>(0, std::min(end, to) - std::max(start, from));
-        return stalled;
-    }
+    // How long the witness has stood still so far, in ms.
+    qint64 stalledMs() const { return m_stalledMs; }
 
 private:
     void run() {
-        qint64 last = nowMs();
-        while (!m_stop) {
+        QElapsedTimer clock;
+        clock.start();
+        for (qint64 last = 0; !m_stop;) {
             std::this_thread::sleep_for(std::chrono::milliseconds(2));
-            const qint64 now = nowMs();
-            if (now - last > 20) {
-                std::lock_guard guard(m_mutex);
-                m_stalls.emplace_back(last, now);
-                if (m_stalls.size() > 512)
-                    m_stalls.pop_front();
-            }
+            const qint64 now = clock.elapsed();
+            if (now - last > 20)
+                m_stalledMs += now - last;
             last = now;
         }
     }
 
-    mutable std::mutex m_mutex;
-    std::deque<std::pair<qint64, qint64>> m_stalls;
+    std::atomic<qint64> m_stalledMs{0};
     std::atomic<bool> m_stop{false};
     std::thread m_thread;
 };
@@ -129,7 +113,6 @@ public:
         m_beatClock.start();
     }
     QString modelerLog() const { return m_modeler.log(); }
-    E2eBridge &bridge() { return m_bridge; }
     QStringList &faults() { return m_faults; }
 
     // One random step: an action from the table, then a short while of the event loop.
@@ -140,7 +123,11 @@ public:
             std::function<void()> run;
         };
         const std::vector<Action> actions = {
-            {"send", 30, [this] { send(); }},
+            {"send", 30,
+             [this] {
+                 selectSome();
+                 sendSelection();
+             }},
             {"select", 10, [this] { selectSome(); }},
             {"reload", 4, [this] { reload(); }},
             {"remove", 6, [this] { removeSome(); }},
@@ -160,6 +147,7 @@ public:
         action.run();
         // The driver's own work is not the event loop standing still.
         m_beatClock.restart();
+        m_witnessAtBeat = m_witness.stalledMs();
         sgTestIdle(pick(20, 150));
         check();
     }
@@ -223,10 +211,10 @@ private:
             m_faults << QStringLiteral("%1: %2").arg(m_step, what);
     }
 
-    // The part of a stall of the GUI thread that ended now that the machine does not explain.
+    // The part of a stall of the GUI thread since the last heartbeat that the machine does not
+    // explain.
     qint64 ownStall(qint64 stallMs) {
-        const qint64 now = nowMs();
-        const qint64 machine = m_witness.stalledWithin(now - stallMs, now);
+        const qint64 machine = m_witness.stalledMs() - m_witnessAtBeat;
         m_worstMachineStallMs = std::max(m_worstMachineStallMs, machine);
         return stallMs - machine;
     }
@@ -241,12 +229,13 @@ private:
     void beat() {
         const qint64 gap = m_beatClock.restart();
         m_worstGapMs = std::max(m_worstGapMs, gap);
-        if (QApplication::activeModalWidget() == nullptr)
-            return;
-        m_worstDialogGapMs = std::max(m_worstDialogGapMs, gap);
-        if (gap > kBlockLimitMs && ownStall(gap) > kBlockLimitMs)
-            fault(
-                QStringLiteral("the event loop stood still %1 ms while a dialog waited").arg(gap));
+        if (QApplication::activeModalWidget() != nullptr) {
+            m_worstDialogGapMs = std::max(m_worstDialogGapMs, gap);
+            if (gap > kBlockLimitMs && ownStall(gap) > kBlockLimitMs)
+                fault(QStringLiteral("the event loop stood still %1 ms while a dialog waited")
+                          .arg(gap));
+        }
+        m_witnessAtBeat = m_witness.stalledMs();
     }
 
     // ---- actions -----------------------------------------------------------------------
@@ -271,12 +260,8 @@ private:
         updatePending();
         for (SgNode *node : m_bridge.sendList())
             if (!before.contains(node) && !m_pending.contains(node->getLabel()))
-                m_pending.insert(node->getLabel(), {receivedCount(node->getLabel()), -1, {}});
-    }
-
-    void send() {
-        selectSome();
-        sendSelection();
+                m_pending.insert(node->getLabel(),
+                                 {receivedCount(node->getLabel(), modelerLog()), -1, {}});
     }
 
     void removeSome() {
@@ -360,11 +345,10 @@ private:
 
     // How often a modeler has received the node labelled `label` (named as it travelled, in
     // 8 bits).
-    int receivedCount(const QString &label, const QString &log) const {
+    static int receivedCount(const QString &label, const QString &log) {
         const QString travelled = QString::fromLatin1(label.toLatin1());
         return int(log.count(QStringLiteral(" received %1 vertices=").arg(travelled)));
     }
-    int receivedCount(const QString &label) const { return receivedCount(label, modelerLog()); }
 
     // A pending label is done once a modeler has received it again, or the host has said that
     // it could not be sent. One that the same live modeler has not received for a while is a
@@ -424,6 +408,7 @@ private:
     }
 
     StallWitness m_witness;
+    qint64 m_witnessAtBeat = 0;
     qint64 m_worstMachineStallMs = 0;
     SgTestModeler m_modeler;
     QRandomGenerator m_random;

@@ -24,15 +24,13 @@ public:
 
 } // namespace
 
-class GeometryImport : public EngineTest {
-protected:
-    QTemporaryDir dir;
-    QString writeFile(const QString &name, const QByteArray &text) {
-        return sgTestWriteFile(dir.filePath(name), text);
-    }
-};
+class GeometryImport : public EngineTest {};
 
 TEST_F(GeometryImport, FileLoadsMakeMorphsOrReportWhyNot) {
+    QTemporaryDir dir;
+    const auto writeFile = [&](const QString &name, const QByteArray &text) {
+        return sgTestWriteFile(dir.filePath(name), text);
+    };
     auto *node = sgTestNode("Head", sgTestRowMesh(12));
     scene()->addNode(node);
     SgMorphLoader loader;

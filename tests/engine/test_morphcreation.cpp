@@ -4,12 +4,15 @@
 #include "sgcore/morph/sgmorph.h"
 #include "sgcore/morph/sgmorphdeltas.h"
 #include "sgcore/properties/sgfloatproperty.h"
+#include "sgcore/properties/sgintproperty.h"
 #include "sgcore/scene/sgfigurewelder.h"
 #include "sharedsource/engine/sgfacegroupcache.h"
 #include "sharedsource/engine/sgmorphloader.h"
 #include "sharedsource/engine/sgmorphloadlog.h"
 
 #include "tests/support/sgtestmodal.h"
+
+#include <QSignalSpy>
 
 #include <limits>
 #include <memory>
@@ -174,14 +177,17 @@ TEST_F(MorphCreation, OrphanCleanUpRemovesOnlyUnlinkedMorphsOfNodesARunLeftOut) 
     // Box moves in the target and Other does not; Other carries a "Smile" from before, which
     // the run leaves out. It goes only with clean-up on, when the run replaces morphs, and when
     // nothing keeps it: a link, being the loader's control property, or Other being the control
-    // node of a run that makes links or keeps the old ones.
+    // node of a run that makes links or keeps the old ones. A run that makes no morph (a target
+    // that moves nothing, or one of the wrong size) removes nothing.
     using L = SgMorphLoader;
+    enum Target { Moved, Unmoved, WrongSize };
     const struct Case {
         const char *what;
         bool cleanUp;
         int override;
         bool linked, ownControl, controlNode, createControl;
         bool removed;
+        Target target = Moved;
     } cases[] = {
         {"an orphan", true, L::DeltasAndLinks, false, false, false, false, true},
         {"deltas only", true, L::DeltasOnly, false, false, false, false, true},
@@ -192,6 +198,8 @@ TEST_F(MorphCreation, OrphanCleanUpRemovesOnlyUnlinkedMorphsOfNodesARunLeftOut) 
         {"control node, links remade", true, L::DeltasAndLinks, false, false, true, false, true},
         {"control node, deltas only", true, L::DeltasOnly, false, false, true, false, false},
         {"control node, control made", true, L::DeltasAndLinks, false, false, true, true, false},
+        {"no motion", true, L::DeltasAndLinks, false, false, false, false, false, Unmoved},
+        {"wrong size", true, L::DeltasAndLinks, false, false, false, false, false, WrongSize},
     };
     SgFloatProperty dial("Dial");
     for (const Case &c : cases) {
@@ -216,7 +224,9 @@ TEST_F(MorphCreation, OrphanCleanUpRemovesOnlyUnlinkedMorphsOfNodesARunLeftOut) 
         if (c.ownControl)
             prop.loader.setControlProperty(orphan->getValueChannel());
 
-        const auto target = hold(prop.target(4, SgVec3(0, 0, 1)));
+        const auto target = hold(
+            c.target == WrongSize ? sgTestRowMesh(10)
+                                  : prop.target(4, SgVec3(0, 0, c.target == Moved ? 1.0f : 0.0f)));
         sgTestGeometry(other)->setVertex(4, target->getVertex(4)); // Other sees no motion
         SgMorphLoadLog log;
         prop.loader.createMorphForNodes(target.get(), {prop.node, other}, log);
@@ -224,22 +234,6 @@ TEST_F(MorphCreation, OrphanCleanUpRemovesOnlyUnlinkedMorphsOfNodesARunLeftOut) 
         EXPECT_EQ(morphOn(other, "Smile") == nullptr, c.removed);
         EXPECT_EQ(log.toHtml().contains("Removed orphaned morph Smile from Other."), c.removed);
         prop.loader.setControlProperty(nullptr);
-    }
-
-    // A run that makes no morph removes nothing: a target that moves nothing, or one of the
-    // wrong size.
-    scene()->clear();
-    Prop prop;
-    prop.create(prop.target(1, SgVec3(1, 0, 0)));
-    auto *other = sgTestNode("Other", sgTestRowMesh(12));
-    scene()->addNode(other);
-    other->getObject()->addModifier(new SgMorph("Smile"));
-    prop.loader.setOverride(SgMorphLoader::DeltasAndLinks);
-    for (SgPolyMesh *target : {sgTestCopyVertices(*sgTestGeometry(prop.node)), sgTestRowMesh(10)}) {
-        SgMorphLoadLog log;
-        prop.loader.createMorphForNodes(hold(target).get(), {prop.node, other}, log);
-        EXPECT_TRUE(log.toHtml().contains("morphs created.")) << log.toHtml().toStdString();
-        EXPECT_TRUE(morphOn(prop.node, "Smile") && morphOn(other, "Smile"));
     }
 }
 
@@ -263,7 +257,7 @@ struct TwoBones {
         sgApp->getScene()->addNode(figure);
         regroup(false);
     }
-    // Rebuilds the target; `swapped` gives group "a" the second half and "b" the first.
+    // Rebuilds the target (or `mesh`); `swapped` gives group "a" the second half, "b" the first.
     void regroup(bool swapped) { fill(target, swapped); }
     void fill(SgPolyMesh *mesh, bool swapped) {
         mesh->beginEdit(true);
@@ -295,7 +289,7 @@ struct TwoBones {
 
 } // namespace
 
-TEST_F(MorphCreation, BonesTakeTheGroupOfTheirNameOrLabelAndFiguresTheBody) {
+TEST_F(MorphCreation, BonesTakeTheGroupOfTheirNameOrLabelGatheredForEachRunAndFiguresTheBody) {
     TwoBones bones;
     bones.target->setVertex(3, bones.target->getVertex(3) + SgVec3(0, 1, 0));
     bones.target->setVertex(TwoBones::count + 2,
@@ -315,6 +309,17 @@ TEST_F(MorphCreation, BonesTakeTheGroupOfTheirNameOrLabelAndFiguresTheBody) {
     EXPECT_EQ(a->getDeltas()->getDelta(0), SgVec3(0, 1, 0));
     EXPECT_EQ(b->getDeltas()->getVertex(0), 2);
 
+    // The groups are gathered again for every run: the same mesh object regrouped, the first
+    // half now b's, moves only b.
+    bones.regroup(true);
+    bones.target->setVertex(7, bones.target->getVertex(7) + SgVec3(0, 0, 2));
+    loader.setMorphName("Second");
+    loader.createMorphForNodes(bones.target, {bones.a, bones.b}, log);
+    EXPECT_FALSE(morphOn(bones.a, "Second"));
+    ASSERT_TRUE(morphOn(bones.b, "Second"));
+    EXPECT_EQ(morphOn(bones.b, "Second")->getDeltas()->getVertex(0), 7);
+    EXPECT_FALSE(log.hasProblems()) << log.toHtml().toStdString();
+
     // A figure takes the group "BODY".
     auto *body = sgTestNode<SgSkeleton>("Body", sgTestRowMesh(3));
     scene()->addNode(body);
@@ -323,6 +328,19 @@ TEST_F(MorphCreation, BonesTakeTheGroupOfTheirNameOrLabelAndFiguresTheBody) {
     ASSERT_EQ(group->getVertexCount(), 3);
     EXPECT_EQ(group->getVertex(2), bones.target->getVertex(2));
     group.release()->unref();
+
+    // A mesh its caller owns directly (reference count 0, here on the stack) is borrowed, never
+    // freed, by the group lookups, with a run's cache or without one.
+    SgPolyMesh owned;
+    bones.fill(&owned, false);
+    SgFaceGroupCache run;
+    for (SgFaceGroupCache *cache : {&run, static_cast<SgFaceGroupCache *>(nullptr)}) {
+        SgVertexMesh *found = loader.groupGeometry(bones.a, &owned, cache);
+        ASSERT_TRUE(found);
+        EXPECT_EQ(found->getVertexCount(), TwoBones::count);
+        found->unref();
+        EXPECT_EQ(owned.getRefCount(), 0);
+    }
 
     // A bone without a group of its name gets nothing, and the log says so.
     auto *tail = sgTestNode<SgBone>("tail", sgTestRowMesh(4));
@@ -389,43 +407,6 @@ TEST_F(MorphCreation, ATargetThatFailsOnOneBoneMakesNoMorphOnAny) {
     EXPECT_EQ(bones.a->getObject()->getModifierCount(), 0);
 }
 
-TEST_F(MorphCreation, FaceGroupsAreGatheredAgainForEveryRun) {
-    // The same mesh object regrouped between two runs: the second run must not use the groups
-    // of the first.
-    TwoBones bones;
-    SgMorphLoader loader;
-    loader.setMorphName("First");
-    loader.setCreateControl(false);
-    const int moved = 7; // vertex 7 of the first half
-    bones.target->setVertex(moved, bones.target->getVertex(moved) + SgVec3(0, 0, 2));
-    SgMorphLoadLog log;
-    loader.createMorphForNodes(bones.target, {bones.a, bones.b}, log);
-    ASSERT_TRUE(morphOn(bones.a, "First"));
-    EXPECT_FALSE(morphOn(bones.b, "First"));
-
-    bones.regroup(true); // now the first half is b's
-    bones.target->setVertex(moved, bones.target->getVertex(moved) + SgVec3(0, 0, 2));
-    loader.setMorphName("Second");
-    loader.createMorphForNodes(bones.target, {bones.a, bones.b}, log);
-    EXPECT_FALSE(morphOn(bones.a, "Second"));
-    ASSERT_TRUE(morphOn(bones.b, "Second"));
-    EXPECT_EQ(morphOn(bones.b, "Second")->getDeltas()->getVertex(0), moved);
-    EXPECT_FALSE(log.hasProblems()) << log.toHtml().toStdString();
-
-    // A mesh its caller owns directly (reference count 0, here on the stack) is borrowed, never
-    // freed, by the group lookups, with a run's cache or without one.
-    SgPolyMesh owned;
-    bones.fill(&owned, false);
-    SgFaceGroupCache run;
-    for (SgFaceGroupCache *cache : {&run, static_cast<SgFaceGroupCache *>(nullptr)}) {
-        SgVertexMesh *group = loader.groupGeometry(bones.a, &owned, cache);
-        ASSERT_TRUE(group);
-        EXPECT_EQ(group->getVertexCount(), TwoBones::count);
-        group->unref();
-        EXPECT_EQ(owned.getRefCount(), 0);
-    }
-}
-
 TEST_F(MorphCreation, WeldedFigureTargetsBecomeOneLinkedMorphPerMovedBone) {
     SgSkeleton *figure = sgTestFigure("Fig", 3, 2);
     scene()->addNode(figure);
@@ -469,4 +450,158 @@ TEST_F(MorphCreation, WeldedFigureTargetsBecomeOneLinkedMorphPerMovedBone) {
         ASSERT_TRUE(link);
         EXPECT_EQ(link->getProperty(), control);
     }
+}
+
+namespace {
+
+SgERCLink *onlyLink(SgNumericProperty *channel) {
+    return channel->getControllerCount() == 1 ? dynamic_cast<SgERCLink *>(channel->getController(0))
+                                              : nullptr;
+}
+
+SgNumericProperty *channelOf(SgNode *node, const QString &morph) {
+    auto *m = dynamic_cast<SgMorph *>(node->getObject()->findModifier(morph));
+    return m ? m->getValueChannel() : nullptr;
+}
+
+// Two props that each move one vertex in the target, and a loader for the morph "Smile".
+struct TwoProps {
+    SgNode *a = sgTestNode("A", sgTestRowMesh(8));
+    SgNode *b = sgTestNode("B", sgTestRowMesh(8));
+    const std::unique_ptr<SgPolyMesh, Unref> target = hold(sgTestCopyVertices(*sgTestGeometry(a)));
+    SgMorphLoader loader;
+    SgMorphLoadLog log;
+
+    TwoProps() {
+        sgApp->getScene()->addNode(a);
+        sgApp->getScene()->addNode(b);
+        target->setVertex(5, target->getVertex(5) + SgVec3(0, 2, 0));
+        loader.setMorphName("Smile");
+        loader.setMorphGroup("Morphs");
+    }
+    void run() { loader.createMorphForNodes(target.get(), {a, b}, log); }
+};
+
+} // namespace
+
+class ControlProperty : public EngineTest {};
+
+TEST_F(ControlProperty, FirstMorphOnTheControlNodeDrivesTheOthers) {
+    TwoProps props;
+    QSignalSpy spy(&props.loader, &SgMorphLoader::controlPropertyChanged);
+    props.loader.setControlNode(props.a);
+    props.run();
+    SgNumericProperty *control = channelOf(props.a, "Smile");
+    ASSERT_TRUE(control);
+    EXPECT_EQ(props.loader.controlProperty(), control);
+    EXPECT_EQ(spy.count(), 1);
+    EXPECT_EQ(control->getControllerCount(), 0);
+    SgERCLink *link = onlyLink(channelOf(props.b, "Smile"));
+    ASSERT_TRUE(link);
+    EXPECT_EQ(link->getProperty(), control);
+
+    // Driving the control moves the other node's morph through the link.
+    control->setValue(0.5f);
+    EXPECT_NEAR(props.b->getObject()->getCachedGeom()->getVertex(5).y,
+                sgTestGeometry(props.b)->getVertex(5).y + 1.0f, 1e-5);
+}
+
+TEST_F(ControlProperty, AFloatNamesakeOnTheControlNodeIsReusedAndLinksCarryTypeScaleAndLabel) {
+    TwoProps props;
+    auto *controls = new SgNode("Controls");
+    scene()->addNode(controls);
+    auto *namesake = new SgFloatProperty("Smile");
+    controls->addProperty(namesake);
+    props.loader.setControlNode(controls);
+    props.loader.setUseCustomValue(true);
+    props.loader.setCustomValue(0.5f);
+    props.loader.setHideSecondary(true);
+    props.loader.setUseCustomLabel(true);
+    props.loader.setCustomLabel("p_Smile");
+    props.run();
+    EXPECT_EQ(props.loader.controlProperty(), namesake);
+    EXPECT_EQ(controls->getPropertyCount(), 1);
+    for (SgNode *node : {props.a, props.b}) {
+        SgNumericProperty *channel = channelOf(node, "Smile");
+        SgERCLink *link = onlyLink(channel);
+        ASSERT_TRUE(link);
+        EXPECT_EQ(link->getTypeName(), QString("ERC[DeltaAdd]"));
+        EXPECT_FLOAT_EQ(link->getScale(), 0.5f);
+        EXPECT_FLOAT_EQ(link->getOffset(), 0.0f);
+        EXPECT_TRUE(channel->isHidden());
+        EXPECT_EQ(channel->getLabel(), QString("p_Smile"));
+    }
+
+    // Another type ignores the custom value only when it is switched off.
+    TwoProps second;
+    second.loader.setMorphName("Frown");
+    second.loader.setControlNode(controls);
+    second.loader.setErcType(SgERCLink::Multiply);
+    second.run();
+    auto *created = dynamic_cast<SgFloatProperty *>(controls->findProperty("Frown"));
+    ASSERT_TRUE(created);
+    EXPECT_EQ(created->getPath(), QString("Morphs"));
+    SgERCLink *link = onlyLink(channelOf(second.a, "Frown"));
+    ASSERT_TRUE(link);
+    EXPECT_EQ(link->getTypeName(), QString("ERC[Multiply]"));
+    EXPECT_FLOAT_EQ(link->getScale(), 1.0f);
+    EXPECT_FALSE(channelOf(second.a, "Frown")->isHidden());
+
+    // A namesake that is no float property: no link, and the log says so.
+    TwoProps third;
+    third.loader.setMorphName("Count");
+    controls->addProperty(new SgIntProperty("Count"));
+    third.loader.setControlNode(controls);
+    third.run();
+    ASSERT_TRUE(channelOf(third.a, "Count") && channelOf(third.b, "Count"));
+    EXPECT_EQ(channelOf(third.a, "Count")->getControllerCount(), 0);
+    EXPECT_EQ(third.loader.controlProperty(), nullptr);
+    EXPECT_TRUE(third.log.toHtml().contains("Warning: </FONT>The property Count on Controls is "
+                                            "not a float property: the morph is not linked to a "
+                                            "control property.<BR>\n</BODY>"))
+        << third.log.toHtml().toStdString();
+}
+
+TEST_F(ControlProperty, UnplacedPropertiesArePlacedOrDiscarded) {
+    auto *controls = new SgNode("Controls");
+    scene()->addNode(controls);
+    // Prepares `property` as the control of a loader for `node`; returns what the loader holds
+    // then, before it ends.
+    const auto prepare = [&](SgNumericProperty *property, SgNode *node) {
+        SgMorphLoader loader;
+        loader.setControlProperty(property);
+        loader.setControlNode(node);
+        loader.prepareControlProperty();
+        return loader.controlProperty();
+    };
+    // A free property is placed on the control node, where the loader leaves it; a free
+    // namesake is dropped for the node's own property; a control morph goes onto the node's
+    // object, made for it when missing.
+    auto *dial = new SgFloatProperty("Dial");
+    EXPECT_EQ(prepare(dial, controls), dial);
+    EXPECT_EQ(controls->findProperty("Dial"), dial);
+    auto *namesake = new SgFloatProperty("Dial");
+    std::weak_ptr<const void> lives[] = {namesake->getLifeToken(), {}, {}, {}};
+    EXPECT_EQ(prepare(namesake, controls), dial);
+    auto *morph = new SgMorph("Ctrl");
+    prepare(morph->getValueChannel(), controls);
+    ASSERT_TRUE(controls->getObject());
+    EXPECT_EQ(controls->getObject()->findModifier("Ctrl"), morph);
+
+    // Without a control node, replaced, or left at the end: an unplaced property is deleted.
+    auto *lost = new SgFloatProperty("One");
+    lives[1] = lost->getLifeToken();
+    EXPECT_EQ(prepare(lost, nullptr), nullptr);
+    {
+        SgMorphLoader loader;
+        auto *two = new SgMorph("Two");
+        lives[2] = two->getValueChannel()->getLifeToken();
+        loader.setControlProperty(two->getValueChannel());
+        auto *three = new SgIntProperty("Three");
+        lives[3] = three->getLifeToken();
+        loader.setControlProperty(three);
+        EXPECT_TRUE(lives[2].expired());
+    }
+    for (const auto &life : lives)
+        EXPECT_TRUE(life.expired());
 }

@@ -143,13 +143,14 @@ TEST(ExchangeReaderTest, EmptyBlocksAndUnknownFacetTypes) {
 
 TEST(ExchangeReaderTest, FigureRoundTripKeepsVerticesUVsAndFacetOrder) {
     SgAppSettings().setInt("FacetorBridgeTools", 1); // weld the base geometry
-    // Two bones that share a seam, each with quads of one material and a triangle of the other.
+    // Two bones that share a seam, each with quads of one material and a triangle of the other,
+    // partly mapped (-1 is "no UV").
     std::unique_ptr<SgSkeleton> figure(sgTestFigure("Body", 2, 2));
     figure->setLabel("Body");
     const SgBoneList bones = figure->getAllBones();
     for (int b = 0; b < 2; ++b)
         sgTestAddFacet(*static_cast<SgPolyMesh *>(sgTestGeometry(bones[b])), 1 - b,
-                       {{0, 0}, {4, 4}, {1, 1}});
+                       {{0, 0}, {4, -1}, {1, 1}});
 
     SgExchangeWriter writer(figure.get(), QString());
     ASSERT_GT(writer.getSize(), 0);

@@ -125,21 +125,28 @@ TEST_F(FigureScene, ModesZeroAndTwoChooseTheSelectedFigureOrThePrimarySelection)
     EXPECT_EQ(lastProgress().total, 2);
 }
 
-TEST_F(FigureScene, ModeOneRunsSourcesTopDownOnTheSelectionAndSkipsOnAFailedPose) {
+TEST_F(FigureScene, ModeOneRunsSourcesTopDownOnTheSelectionAndAsksOnAFailedPose) {
     list.addFile(writeFile("first.obj", figureTarget(0, 0.5)));
     list.addFile(writeFile("second.obj", figureTarget(0, 0.25)));
     list.addFile(writeFile("third.obj", figureTarget(0, 0.75)));
-    // "third" is on top; its pose cannot load and the user declines to go on without it.
-    auto *third = static_cast<SgMorphFileItem *>(list.topLevelItem(0));
-    third->loader().setReverseModifiers(true);
-    third->loader().setPoseFile(dir.filePath("missing.sgs"));
-    scene->selectNode(neck);
-
-    {
-        SgTestModalAnswer answer(sgTestPressButton(QMessageBox::No));
-        list.createMorphs(options, 1, log);
-        EXPECT_EQ(answer.titles(), QStringList{"Pose File Error"});
+    // The poses of "third" (on top) and "first" cannot load: the user declines to go on
+    // without it for "third" and goes on for "first".
+    const QString missing = dir.filePath("missing.sgs");
+    for (int row : {0, 2}) {
+        SgMorphLoader &loader = static_cast<SgMorphFileItem *>(list.topLevelItem(row))->loader();
+        loader.setReverseModifiers(true);
+        loader.setPoseFile(missing);
     }
+    scene->selectNode(neck);
+    QString text;
+    {
+        SgTestModalAnswer answer({sgTestPressButton(QMessageBox::No, nullptr, &text),
+                                  sgTestPressButton(QMessageBox::Ok)});
+        list.createMorphs(options, 1, log);
+        EXPECT_EQ(answer.titles(), QStringList({"Pose File Error", "Pose File Error"}));
+    }
+    EXPECT_EQ(text, "Failed to load the pose file: \n" + missing +
+                        "\nFor the morph: third\n\nDo you wish to continue loading this morph?");
     const QString html = log.toHtml();
     EXPECT_FALSE(html.contains("Loading morph third..."));
     EXPECT_LT(html.indexOf("Loading morph second..."), html.indexOf("Loading morph first..."));
@@ -161,9 +168,14 @@ TEST_F(FigureScene, TheInMemorySourceTargetsItsOwnFiguresBones) {
     list.addFile(writeFile("lift.obj", figureTarget(0.5, 0)));
     SgMorphMeshItem *source = list.addMesh(mesh, figure);
     mesh->unref(); // the row keeps its own reference
-    // The returned mesh is not a welded export here: take its groups as they are.
-    source->loader().setScenaraExported(false);
-    source->loader().setReverseModifiers(false);
+    // The row starts on a welded export with reverse deformations, so that a returned figure
+    // maps onto its bones; this mesh is not welded: its groups are taken as they are.
+    SgMorphLoader &loader = source->loader();
+    EXPECT_TRUE(loader.scenaraExported() && loader.weldedGeometry() &&
+                loader.removedUnusedVertices() && loader.reverseModifiers());
+    EXPECT_FALSE(loader.ignoredInvisibleNodes());
+    loader.setScenaraExported(false);
+    loader.setReverseModifiers(false);
     scene->selectNode(prop);
 
     list.createMorphs(options, 1, log);
@@ -202,10 +214,8 @@ TEST_F(FigureScene, NodeGroupAndPropertyRowsFollowTheSceneAndTheirMenus) {
     EXPECT_EQ(node->text(1), "- none -");
     EXPECT_EQ(loader.controlNode(), figure);
 
-    EXPECT_EQ(choose("Property Group:", "Morphs/Face"),
-              QStringList({"Create...", "-", "Morphs", "Morphs/Face"}));
+    choose("Property Group:", "Morphs/Face"); // the menu's entries: test_property_menus
     EXPECT_EQ(loader.morphGroup(), "Morphs/Face");
-    EXPECT_EQ(row("Property Group:")->text(1), "Morphs/Face");
 
     loader.setControlProperty(smile);
     EXPECT_EQ(row("Property:")->text(1), "Smile");

@@ -205,9 +205,11 @@ TEST_F(MorphLoaderDlgTest, BrokenFilesEndInLoadErrors) {
         // Nesting up to 64 elements is read; deeper is refused before the document is built.
         {nested(64), "deep64.scx", "XML Parse error, Improper Configuration type."},
         {nested(65), "deep65.scx", "Error: Document could not set as xml."},
+        {{}, "absent.scx", "Error: Could not open file"},
     };
     for (const auto &entry : cases) {
-        sgTestWriteFile(path(entry.file), entry.bytes);
+        if (!entry.bytes.isNull())
+            sgTestWriteFile(path(entry.file), entry.bytes);
         SgMorphLoaderDlg dialog(nullptr, true, nullptr, nullptr);
         QString text;
         SgTestModalAnswer script(sgTestPressButton(QMessageBox::NoButton, nullptr, &text));
@@ -216,32 +218,6 @@ TEST_F(MorphLoaderDlgTest, BrokenFilesEndInLoadErrors) {
         EXPECT_EQ(text, entry.message);
         EXPECT_EQ(dialog.sourceList()->topLevelItemCount(), 0);
     }
-    SgMorphLoaderDlg dialog(nullptr, true, nullptr, nullptr);
-    QString text;
-    SgTestModalAnswer script(sgTestPressButton(QMessageBox::NoButton, nullptr, &text));
-    dialog.loadConfigurationFile(path("absent.scx"), m_dir.path());
-    EXPECT_EQ(text, "Error: Could not open file");
-}
-
-TEST_F(MorphLoaderDlgTest, ObjectValuesLoadAsTheRowsRead) {
-    sgTestWriteFile(path("head.obj"), TriangleObj);
-    SgMorphLoaderDlg dialog(nullptr, true, nullptr, nullptr);
-    dialog.sourceList()->addFile(path("head.obj"));
-    SgMorphFileItem *source = topSource(dialog);
-    findRow(source, "UpdateOverrideExisting")->setValueText("Deltas Only");
-    sgTestWriteFile(path("head.obj.scx"),
-                    "<VarnTargetImporter Version=\"1\"><FileType Type=\"Object\">"
-                    "<ReverseDeformations Value=\"True\"/>"
-                    "</FileType></VarnTargetImporter>");
-    SgTestModalAnswer script(QList<SgTestHandler>{});
-    dialog.loadConfigurationFile(path("head.obj.scx"), m_dir.path());
-    // The file's geometry was listed already: its settings go to that row, with no warning;
-    // what the file leaves out goes back to its default.
-    EXPECT_TRUE(script.titles().isEmpty());
-    ASSERT_EQ(dialog.sourceList()->topLevelItemCount(), 1);
-    EXPECT_EQ(value(source, "UpdateOverrideExisting"), "Make Unique");
-    EXPECT_EQ(value(source, "Name"), "");
-    EXPECT_EQ(value(source, "ReverseDeformations"), "True");
 }
 
 TEST_F(MorphLoaderDlgTest, SaveThenLoadReproducesEveryRowAndTheControlProperty) {
@@ -322,12 +298,38 @@ TEST_F(MorphLoaderDlgTest, SaveThenLoadReproducesEveryRowAndTheControlProperty) 
     ASSERT_TRUE(loaded && loaded != existing);
     EXPECT_EQ(loaded->getOwner(), nullptr);
     EXPECT_EQ(loaded->getLabel(), QString("Smile <Control> & \"more\""));
+
+    // The file's geometry is listed already: its settings go to that row, with no warning;
+    // what the file leaves out goes back to its default.
+    sgTestWriteFile(path("head.obj.scx"), "<VarnTargetImporter Version=\"1\"><FileType "
+                                          "Type=\"Object\"><Name Value=\"x\"/></FileType>"
+                                          "</VarnTargetImporter>");
+    SgTestModalAnswer script(QList<SgTestHandler>{});
+    dialog.loadConfigurationFile(path("head.obj.scx"), m_dir.path());
+    EXPECT_TRUE(script.titles().isEmpty());
+    ASSERT_EQ(dialog.sourceList()->topLevelItemCount(), 1);
+    EXPECT_EQ(QStringList({value(topSource(dialog), "Name"),
+                           value(topSource(dialog), "UpdateOverrideExisting")}),
+              QStringList({"x", "Make Unique"}));
 }
 
-TEST_F(MorphLoaderDlgTest, SaveOptionsCancelAbsoluteAndWithoutObjects) {
+TEST_F(MorphLoaderDlgTest, ChooseFilesThenSaveOptionsCancelAbsoluteAndWithoutObjects) {
+    const QString documents = path("docs");
+    QDir().mkpath(documents);
+    sgApp->setDocumentsPath(documents);
     sgTestWriteFile(path("geo/a.obj"), TriangleObj);
     SgMorphLoaderDlg dialog(nullptr, true, nullptr, nullptr);
-    dialog.sourceList()->addFile(path("geo/a.obj"));
+    auto *browse = dialog.findChild<QPushButton *>("MorphLoaderBrowseBtn");
+    QString directory;
+    {
+        // Files are first chosen in the documents folder; the folder of the choice is kept.
+        SgTestModalAnswer script(sgTestChooseFile(path("geo/a.obj"), &directory));
+        browse->click();
+        EXPECT_EQ(directory, documents);
+        EXPECT_EQ(rowPaths(*dialog.sourceList()), QStringList{path("geo/a.obj")});
+        EXPECT_EQ(SgAppSettings("TargetImporter").getString("LastDirectory"), path("geo"));
+    }
+    // Configurations are saved in a folder of their own, kept apart from the files' folder.
     auto *save = dialog.findChild<QPushButton *>("MorphLoaderSaveConfigurationBtn");
     dialog.configuration().setRelativePaths(false);
     {
@@ -348,11 +350,10 @@ TEST_F(MorphLoaderDlgTest, SaveOptionsCancelAbsoluteAndWithoutObjects) {
                         .contains("Path=\"" + path("geo/a.obj").toUtf8() + "\""));
         EXPECT_TRUE(QFile::exists(path("geo/a.obj.scx")));
         EXPECT_EQ(SgAppSettings().getString("LastDirectory"), path("projects"));
-        EXPECT_EQ(SgAppSettings("TargetImporter").getString("LastDirectory"), "");
+        EXPECT_EQ(SgAppSettings("TargetImporter").getString("LastDirectory"), path("geo"));
     }
     QFile::remove(path("geo/a.obj.scx"));
     {
-        QString directory;
         SgTestModalAnswer script(
             {saveOptions(false, true), sgTestChooseFile(path("geo/only.scx"), &directory)});
         save->click();
@@ -360,6 +361,13 @@ TEST_F(MorphLoaderDlgTest, SaveOptionsCancelAbsoluteAndWithoutObjects) {
         EXPECT_TRUE(sgTestReadFile(path("geo/only.scx")).contains("Path=\"/a.obj\""));
         EXPECT_FALSE(QFile::exists(path("geo/a.obj.scx")));
     }
+    // A kept folder that is gone opens its nearest existing parent, with no name typed.
+    SgAppSettings("TargetImporter").setString("LastDirectory", path("geo/gone/Scenara"));
+    QString typed = "unset";
+    SgTestModalAnswer script(sgTestChooseFile(QString(), &directory, &typed));
+    browse->click();
+    EXPECT_EQ(directory, path("geo"));
+    EXPECT_EQ(typed, "");
 }
 
 TEST_F(MorphLoaderDlgTest, RunThenSecondOkAcceptsOnlyWithoutProblems) {
@@ -383,37 +391,11 @@ TEST_F(MorphLoaderDlgTest, RunThenSecondOkAcceptsOnlyWithoutProblems) {
         EXPECT_FALSE(dialog.isVisible());
         EXPECT_EQ(dialog.result(), QDialog::Rejected);
     }
-    {
-        // Before the run Escape cancels.
-        SgMorphLoaderDlg dialog(nullptr, true, nullptr, nullptr);
-        dialog.show();
-        QTest::keyClick(&dialog, Qt::Key_Escape);
-        EXPECT_FALSE(dialog.isVisible());
-        EXPECT_EQ(dialog.result(), QDialog::Rejected);
-    }
-    // The stored index comes back.
+    // The stored index comes back; before a run Escape cancels.
     SgMorphLoaderDlg offered(nullptr, true, nullptr, nullptr);
     EXPECT_EQ(offered.findChild<QComboBox *>("MorphLoaderNodes")->currentIndex(), 1);
-}
-
-TEST_F(MorphLoaderDlgTest, ChooseFilesStartsInDocumentsAndRemembersFolder) {
-    const QString documents = path("docs");
-    QDir().mkpath(documents);
-    sgApp->setDocumentsPath(documents);
-    sgTestWriteFile(path("geo/a.obj"), TriangleObj);
-    SgMorphLoaderDlg dialog(nullptr, true, nullptr, nullptr);
-    QString directory;
-    SgTestModalAnswer script(sgTestChooseFile(path("geo/a.obj"), &directory));
-    dialog.findChild<QPushButton *>("MorphLoaderBrowseBtn")->click();
-    EXPECT_EQ(directory, documents);
-    EXPECT_EQ(rowPaths(*dialog.sourceList()), QStringList{path("geo/a.obj")});
-    EXPECT_EQ(SgAppSettings("TargetImporter").getString("LastDirectory"), path("geo"));
-
-    // A remembered folder that is gone opens its nearest existing parent, with no name typed.
-    SgAppSettings("TargetImporter").setString("LastDirectory", path("geo/gone/Scenara"));
-    QString typed = "unset";
-    SgTestModalAnswer again(sgTestChooseFile(QString(), &directory, &typed));
-    dialog.findChild<QPushButton *>("MorphLoaderBrowseBtn")->click();
-    EXPECT_EQ(directory, path("geo"));
-    EXPECT_EQ(typed, "");
+    offered.show();
+    QTest::keyClick(&offered, Qt::Key_Escape);
+    EXPECT_FALSE(offered.isVisible());
+    EXPECT_EQ(offered.result(), QDialog::Rejected);
 }

@@ -4,7 +4,6 @@
 
 #include "sharedsource/engine/sgmorphloader.h"
 #include "sharedsource/loaderui/sgmorphfileitem.h"
-#include "sharedsource/loaderui/sgmorphmeshitem.h"
 #include "sharedsource/loaderui/sgmorphposeitem.h"
 #include "sharedsource/loaderui/sgmorphsourceboolitem.h"
 
@@ -93,8 +92,6 @@ TEST_F(SourceItems, CreateControlAndErcTypeSwitchTheirDependents) {
         editWithPopup(list, useCustom, "yes");
         EXPECT_EQ(editWithPopup(list, erc, types[code]), types);
         EXPECT_EQ(head->loader().ercType(), code);
-        EXPECT_EQ(erc->valueText(), QString::number(code));
-        EXPECT_EQ(useCustom->text(1), "no");
         EXPECT_FALSE(head->loader().useCustomValue());
         editWithPopup(list, control, "no");
         editWithPopup(list, control, "yes");
@@ -112,24 +109,6 @@ TEST_F(SourceItems, CreateControlAndErcTypeSwitchTheirDependents) {
     EXPECT_EQ(head->loader().ercType(), 5);
     editWithPopup(list, control, "");
     EXPECT_EQ(control->text(1), "no");
-}
-
-TEST_F(SourceItems, ReverseDeformationsEnablesThePoseRow) {
-    auto *reverse = boolRow(head, "Reverse Deformations:");
-    auto *pose = static_cast<SgMorphPoseItem *>(findRow(head, "Pose:"));
-    editWithPopup(list, reverse, "yes");
-    EXPECT_TRUE(head->loader().reverseModifiers());
-    EXPECT_TRUE(pose->isEnabled() && pose->dragEnabled());
-    editWithPopup(list, reverse, "no");
-    EXPECT_FALSE(pose->isEnabled());
-
-    // "None" in the pose popup clears a chosen pose.
-    editWithPopup(list, reverse, "yes");
-    pose->setValueText("/poses/sit.sgs");
-    EXPECT_EQ(head->loader().poseFile(), "/poses/sit.sgs");
-    EXPECT_EQ(editWithPopup(list, pose, "None"), QStringList({"None", "-", "Browse..."}));
-    EXPECT_EQ(pose->text(1), "None");
-    EXPECT_EQ(head->loader().poseFile(), "None");
 }
 
 // Every row's text round trip and its value in the loader is checked through a saved and
@@ -217,20 +196,6 @@ TEST_F(SourceItems, InPlaceEditsFollowTheMorphNameAndRevertBadNumbers) {
     EXPECT_EQ(openEditor(list), nullptr);
     QTest::mouseClick(list.viewport(), Qt::LeftButton, {}, at);
     EXPECT_NE(openEditor(list), nullptr);
-}
-
-// The in-memory row of a returned mesh starts on a welded export with reverse deformations,
-// expanded, so that a returned figure maps onto its bones.
-TEST_F(SourceItems, TheMeshRowStartsOnAWeldedExport) {
-    auto *item = list.addMesh(nullptr, nullptr);
-    const SgMorphLoader &loader = item->loader();
-    EXPECT_EQ(loader.morphName(), "FacMorph");
-    EXPECT_TRUE(item->isExpanded());
-    EXPECT_TRUE(loader.scenaraExported() && loader.weldedGeometry() &&
-                loader.removedUnusedVertices() && loader.reverseModifiers());
-    EXPECT_FALSE(loader.ignoredInvisibleNodes());
-    EXPECT_TRUE(findRow(item, "Used Bone Welds:")->isEnabled());
-    EXPECT_TRUE(findRow(item, "Pose:")->isEnabled());
 }
 
 } // namespace

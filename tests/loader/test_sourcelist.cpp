@@ -144,7 +144,7 @@ TEST_F(SourceList, ContextMenusForwardToRowsAndOfferSavingOnFileRows) {
     EXPECT_TRUE(static_cast<SgMorphFileItem *>(file)->loader().applyAfterJoint());
 }
 
-TEST_F(SourceList, DropsAddGeometryFilesAndSetPoses) {
+TEST_F(SourceList, DropsAddGeometryFilesAndSetOrClearPoses) {
     // Drops `files` at `point`; returns the text of the box that came, or "" when none did.
     const auto dropAt = [&](const QStringList &files, QPoint point) {
         QString text;
@@ -168,15 +168,21 @@ TEST_F(SourceList, DropsAddGeometryFilesAndSetPoses) {
     const QPoint onPose = list.visualItemRect(pose).center();
     EXPECT_EQ(dropAt({script}, onPose), failed + ":\n\t" + script);
     EXPECT_EQ(pose->text(1), "None");
-    static_cast<SgMorphSourceBoolItem *>(findRow(file, "Reverse Deformations:"))->setValue(true);
+    auto *reverse = static_cast<SgMorphSourceBoolItem *>(findRow(file, "Reverse Deformations:"));
+    reverse->setValue(true);
     EXPECT_EQ(dropAt({script}, onPose), ": ");
     EXPECT_EQ(pose->text(1), script);
     EXPECT_EQ(static_cast<SgMorphFileItem *>(file)->loader().poseFile(), script);
 
-    // Anything else onto the pose row is refused with the pose kept.
+    // Anything else onto the pose row is refused with the pose kept; "None" in the pose popup
+    // clears it.
     EXPECT_EQ(dropAt({"/m/d.obj"}, onPose), failed + " as Pose files:\n\t/m/d.obj");
     EXPECT_EQ(pose->text(1), script);
     EXPECT_EQ(list.topLevelItemCount(), 2);
+    EXPECT_EQ(editWithPopup(list, pose, "None"), QStringList({"None", "-", "Browse..."}));
+    EXPECT_EQ(static_cast<SgMorphFileItem *>(file)->loader().poseFile(), "None");
+    reverse->setValue(false);
+    EXPECT_FALSE(pose->isEnabled());
 }
 
 } // namespace

@@ -63,13 +63,7 @@ QStringList sgTestMenuEntries(const QMenu *menu, bool withData) {
 }
 
 SgTestHandler sgTestPressButton(QMessageBox::StandardButton button, QString *title, QString *text) {
-    return [button, title, text](QWidget *widget) {
-        auto *box = qobject_cast<QMessageBox *>(widget);
-        if (!box) {
-            ADD_FAILURE() << "not a message box: " << widget->windowTitle().toStdString();
-            widget->close();
-            return;
-        }
+    return sgTestAs<QMessageBox>([button, title, text](QMessageBox *box) {
         if (title)
             *title = box->windowTitle();
         if (text)
@@ -82,19 +76,13 @@ SgTestHandler sgTestPressButton(QMessageBox::StandardButton button, QString *tit
             pressed->click();
         else
             box->reject();
-    };
+    });
 }
 
 SgTestHandler sgTestChooseFile(const QString &path, QString *folder, QString *typed) {
-    return [path, folder, typed](QWidget *widget) {
-        auto *dialog = qobject_cast<QFileDialog *>(widget);
-        auto *name =
-            dialog ? dialog->findChild<QLineEdit *>(QStringLiteral("fileNameEdit")) : nullptr;
-        if (!name) {
-            ADD_FAILURE() << "not a file dialog: " << widget->windowTitle().toStdString();
-            widget->close();
-            return;
-        }
+    return sgTestAs<QFileDialog>([path, folder, typed](QFileDialog *dialog) {
+        auto *name = dialog->findChild<QLineEdit *>(QStringLiteral("fileNameEdit"));
+        ASSERT_NE(name, nullptr) << "a file dialog without its name field";
         if (folder)
             *folder = dialog->directory().absolutePath();
         if (typed)
@@ -107,5 +95,5 @@ SgTestHandler sgTestChooseFile(const QString &path, QString *folder, QString *ty
         dialog->setDirectory(QFileInfo(path).absolutePath());
         name->setText(QFileInfo(path).fileName());
         static_cast<QDialog *>(dialog)->accept();
-    };
+    });
 }

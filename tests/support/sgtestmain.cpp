@@ -39,25 +39,22 @@ public:
 private:
     void check() {
         QWidget *w = QApplication::activeModalWidget();
-        if (!w) {
+        if (!w)
             w = QApplication::activePopupWidget();
-        }
         if (w != m_watched) {
             m_watched = w;
             m_since.restart();
             return;
         }
-        if (!w || m_since.elapsed() < g_modalTimeoutMs) {
+        if (!w || m_since.elapsed() < g_modalTimeoutMs)
             return;
-        }
         ADD_FAILURE() << "A modal window stayed open for more than " << g_modalTimeoutMs
                       << " ms and was closed: \"" << w->windowTitle().toStdString() << "\" ("
                       << w->metaObject()->className() << ")";
-        if (auto *dialog = qobject_cast<QDialog *>(w)) {
+        if (auto *dialog = qobject_cast<QDialog *>(w))
             dialog->reject();
-        } else {
+        else
             w->close();
-        }
         m_watched = nullptr;
     }
 
@@ -141,12 +138,10 @@ QByteArray sgTestReadFile(const QString &path) {
 }
 
 int main(int argc, char **argv) {
-    if (qEnvironmentVariableIsEmpty("QT_QPA_PLATFORM")) {
+    if (qEnvironmentVariableIsEmpty("QT_QPA_PLATFORM"))
         qputenv("QT_QPA_PLATFORM", "offscreen");
-    }
-    if (const char *t = std::getenv("SG_TEST_MODAL_TIMEOUT_MS")) {
+    if (const char *t = std::getenv("SG_TEST_MODAL_TIMEOUT_MS"))
         g_modalTimeoutMs = std::max(100, std::atoi(t));
-    }
     ::testing::InitGoogleTest(&argc, argv);
     const char *stuck = std::getenv("SG_TEST_STUCK_SECONDS");
     g_watchdog = new StuckTestWatchdog(stuck ? std::atoi(stuck) : 30);

@@ -98,6 +98,5 @@ QString SgTestModeler::newLog() {
 }
 
 QString SgTestModeler::log() const {
-    QFile file(m_log);
-    return file.open(QIODevice::ReadOnly) ? QString::fromUtf8(file.readAll()) : QString();
+    return QString::fromUtf8(sgTestReadFile(m_log));
 }

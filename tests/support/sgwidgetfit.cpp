@@ -19,30 +19,28 @@ QString nameOf(const QObject *object) {
                                           : object->objectName();
 }
 
+// `dimension` is "" for a width, " high" for a height.
 void report(QStringList &out, const char *what, const QObject *object, const QString &text,
-            int needed, int available) {
+            int needed, int available, const char *dimension = "") {
     if (needed <= available)
         return;
-    out << QStringLiteral("%1 %2 \"%3\": needs %4 px, has %5 px")
+    out << QStringLiteral("%1 %2 \"%3\": needs %4 px%5, has %6 px")
                .arg(QLatin1String(what), nameOf(object), text)
                .arg(needed)
+               .arg(QLatin1String(dimension))
                .arg(available);
 }
 
+// A word-wrapped label does not fit when its wrapped text is taller than the label.
 void checkLabel(QStringList &out, const QLabel *label) {
-    if (label->text().isEmpty())
-        return;
     const QString text = label->text().simplified();
-    if (label->wordWrap()) {
-        const int height = label->heightForWidth(label->width());
-        if (height > label->height())
-            out << QStringLiteral("label %1 \"%2\": needs %3 px high, has %4 px")
-                       .arg(nameOf(label), text)
-                       .arg(height)
-                       .arg(label->height());
+    if (text.isEmpty())
         return;
-    }
-    report(out, "label", label, text, label->sizeHint().width(), label->width());
+    if (label->wordWrap())
+        report(out, "label", label, text, label->heightForWidth(label->width()), label->height(),
+               " high");
+    else
+        report(out, "label", label, text, label->sizeHint().width(), label->width());
 }
 
 void checkButton(QStringList &out, const QAbstractButton *button) {
