@@ -27,17 +27,17 @@
 // else: comments, signs, exponents, extra values, errors). False takes nothing, so the caller
 // reads the line again with its general reader, which accepts every plain line with the same
 // result; numbers convert exactly as std::from_chars does (correctly rounded). `next` comes
-// from the line's end alone, not from the checks, so that the next line's reading need not
+// from the line's shape alone, not from its numbers, so that the next line's reading need not
 // wait for this line's numbers: the checks end in a branch that is predicted.
 //
-// Speed: a line of up to 64 bytes is classified in one sweep of 16-byte compares into bit masks
-// (digits, points, signs, slashes, blanks, line end); the numbers' and indices' places then come
-// from the masks, not from the bytes read before them, so their conversions overlap; a run of
-// lines keeps its last line's shape (NumberShape, FaceShape), and a line with the same masks
-// skips the scans and checks and only converts its digits. Longer
-// faces, and faces with an empty index ("v//vn"), go through a word-at-a-time scan. Every read
-// stays below `limit`, which must leave kReadAhead readable bytes behind it: the caller calls only
-// while the line starts before `limit`.
+// Speed: a run of lines keeps its last line's shape (NumberShape, FaceShape): a line that
+// matches its pattern (see LinePattern) skips the scans and checks and only converts its
+// digits. Another line of up to 64 bytes is classified in one sweep of 16-byte compares into
+// bit masks (digits, points, signs, slashes, blanks, line end), and the numbers' and indices'
+// places come from the masks, not from the bytes read before them, so their conversions
+// overlap. Longer faces, and faces with an empty index ("v//vn"), go through a word-at-a-time scan.
+// Every read stays below `limit`, which must leave kReadAhead readable bytes behind it: the caller
+// calls only while the line starts before `limit`.
 namespace SgObjPlainLine {
 
 constexpr std::ptrdiff_t kReadAhead = 96;
@@ -182,22 +182,53 @@ template <char Mark, char Mark2 = Mark>
     return static_cast<std::uint32_t>(((word & 0x0000FFFF0000FFFFu) * 42949672960001u) >> 32);
 }
 
-// A line's masks up to its end, which decide everything about a plain line but its digits'
-// values. Consecutive lines of a big file mostly share them (numbers printed with the same
-// number of digits, indices of the same lengths), so a line whose key equals the last one's
-// skips the scans and checks and only converts its digits.
-struct LineKey {
-    // A real key has one end bit at most: the empty key matches no line.
-    std::uint64_t digit = 0, blank = 0, end = ~std::uint64_t(0), mark = 0, mark2 = 0;
-    bool operator==(const LineKey &) const = default;
-};
+// A plain line as a pattern that the following lines of a run are matched against: a line of
+// up to 64 bytes matches when it has a digit wherever the pattern's line has one and the same
+// byte everywhere else up to and including the line end (bytes past it are free). Such a line
+// has the pattern's line's masks (see classify), so its checks and its numbers' or indices'
+// places are those of the pattern's line: only its digits are converted. Consecutive lines of a
+// big file mostly match (numbers printed with the same digits, indices of the same lengths).
+// Cost: four 16-byte compares per match, the line's end included; setting it about as much.
+struct LinePattern {
+    // '0' at the line's digits and the line's byte elsewhere; past the line's end anything.
+    alignas(16) std::uint8_t base[64];
+    // What a byte may exceed `base` by: 9 at digits, 0 at the line's other bytes, 255 past its
+    // end.
+    alignas(16) std::uint8_t range[64];
+    // The line's length, its end excluded; -1 for no pattern (matches no line).
+    int length = -1;
 
-[[gnu::always_inline]] inline LineKey keyOf(const Masks &m) {
-    // The bits up to the first line end (all bits without one).
-    const std::uint64_t upToEnd = m.end ^ (m.end - 1);
-    return {m.digit & upToEnd, m.blank & upToEnd, m.end & upToEnd, m.mark & upToEnd,
-            m.mark2 & upToEnd};
-}
+    [[gnu::always_inline]] inline bool matches(const char *p) const {
+#if defined(__SSE2__)
+        __m128i ok = _mm_set1_epi8(-1);
+#pragma GCC unroll 4
+        for (int i = 0; i < 64; i += 16) {
+            const __m128i v = _mm_loadu_si128(reinterpret_cast<const __m128i *>(p + i));
+            const __m128i d =
+                _mm_sub_epi8(v, _mm_load_si128(reinterpret_cast<const __m128i *>(base + i)));
+            const __m128i r = _mm_load_si128(reinterpret_cast<const __m128i *>(range + i));
+            ok = _mm_and_si128(ok, _mm_cmpeq_epi8(_mm_min_epu8(d, r), d));
+        }
+        return length >= 0 && _mm_movemask_epi8(ok) == 0xFFFF;
+#else
+        bool ok = length >= 0;
+        for (int i = 0; i < 64; ++i)
+            ok &= std::uint8_t(std::uint8_t(p[i]) - base[i]) <= range[i];
+        return ok;
+#endif
+    }
+
+    // Makes the line at `p`, of `length` (0 to 63) bytes before its '\n', the pattern.
+    inline void set(const char *p, int lineLength) {
+        length = lineLength;
+        for (int i = 0; i < 64; ++i) {
+            const auto c = std::uint8_t(p[i]);
+            const bool digit = std::uint8_t(c - '0') < 10;
+            base[i] = i > length ? 0 : digit ? '0' : c;
+            range[i] = i > length ? 255 : digit ? 9 : 0;
+        }
+    }
+};
 
 // What a plain line of numbers' masks say about each number.
 struct NumberShape {
@@ -208,7 +239,7 @@ struct NumberShape {
         int fractionDigits; // digits after the point
         bool negative;
     };
-    LineKey key;
+    LinePattern pattern;
     Number numbers[3];
 };
 
@@ -269,15 +300,14 @@ inline bool numberShape(const Masks &m, int count, NumberShape &shape) {
 // line's.
 [[gnu::always_inline]] inline bool numbersInWindow(const char *p, float *out, int count,
                                                    const char *&next, NumberShape &shape) {
-    const Masks m = classify<'.', '-'>(p);
-    next = p + std::countr_zero(m.end) + 1;
-    const LineKey key = keyOf(m);
-    if (!(key == shape.key)) {
-        shape.key = LineKey();
+    if (!shape.pattern.matches(p)) {
+        const Masks m = classify<'.', '-'>(p);
+        shape.pattern.length = -1;
         if (!numberShape(m, count, shape))
             return false;
-        shape.key = key;
+        shape.pattern.set(p, std::countr_zero(m.end));
     }
+    next = p + shape.pattern.length + 1;
     bool ok = true;
 #pragma GCC unroll 3
     for (int k = 0; k < count; ++k)
@@ -295,7 +325,7 @@ inline bool numberShape(const Masks &m, int count, NumberShape &shape) {
 // each index's digits start and the shift that puts them at the top of a word, corner by
 // corner.
 struct FaceShape {
-    LineKey key;
+    LinePattern pattern;
     int k = 0, count = 0;
     // A line of 64 bytes holds at most 31 indices.
     std::int8_t first[32], shift[32];
@@ -382,15 +412,14 @@ template <int K>
 [[gnu::always_inline]] inline bool faceInWindow(const char *p, SgFaceCorner *corners, int &count,
                                                 FaceIndexMax &max, const char *&next,
                                                 FaceShape &shape) {
-    const Masks m = classify<'/'>(p);
-    next = p + std::countr_zero(m.end) + 1;
-    const LineKey key = keyOf(m);
-    if (!(key == shape.key)) {
-        shape.key = LineKey();
+    if (!shape.pattern.matches(p)) {
+        const Masks m = classify<'/'>(p);
+        shape.pattern.length = -1;
         if (!faceShape(m, shape))
             return false;
-        shape.key = key;
+        shape.pattern.set(p, std::countr_zero(m.end));
     }
+    next = p + shape.pattern.length + 1;
     count = shape.count;
     return shape.k == 0   ? cornersOf<0>(p, shape, corners, max)
            : shape.k == 1 ? cornersOf<1>(p, shape, corners, max)
@@ -444,7 +473,7 @@ inline const char *faceInWords(const char *p, const char *limit, SgFaceCorner *c
 } // namespace detail
 
 // What a run of lines of one kind keeps of its last line, so that a line of the same shape is
-// read without the scans and checks (see LineKey); one per run, starting empty.
+// read without the scans and checks (see LinePattern); one per run, starting empty.
 using NumberShape = detail::NumberShape;
 using FaceShape = detail::FaceShape;
 

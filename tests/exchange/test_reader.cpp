@@ -92,8 +92,8 @@ TEST(ExchangeReaderTest, ReturnedRecordBecomesAShape) {
     ASSERT_EQ(back->getQuadCount(), 1);
     ASSERT_EQ(back->getTriangleCount(), 1);
     EXPECT_EQ(back->getTriangleMaterial(0), 1);
-    EXPECT_EQ(back->getTriangleCorners(0)[0], (SgFaceCorner{0, 1, -1}));
-    EXPECT_EQ(back->getTriangleCorners(0)[2].uv, -1);
+    EXPECT_EQ(back->triangleCorners(),
+              (std::vector<SgFaceCorner>{{0, 1, -1}, {1, 0, -1}, {2, -1, -1}}));
 
     ASSERT_EQ(shape->getMaterialCount(), 2);
     SgDefaultMaterial *m0 = materialAt(*shape, 0);
@@ -117,34 +117,15 @@ TEST(ExchangeReaderTest, EmptyBlocksAndUnknownFacetTypes) {
     // name "E", V = 3, U = 0, M = 0, F = 4: 'X' (no corners), 'T' in material 1 of 1 (read as
     // 0), a 'P' of 2 corners, a 'P' of 5 corners in material 1; trailer.
     const QByteArray record = QByteArray::fromHex(
-        "01000000"
-        "45"
-        "03000000"
-        "0000803f000000400000404000000000000000000000000000000000000000000000803f"
-        "00000000"
-        "00000000"
-        "04000000"
-        "58"
-        "00000000"
-        "54"
-        "01000000"
-        "000000000700000009000000"
-        "010000000000000000000000"
-        "020000000000000000000000"
-        "50"
-        "00000000"
-        "02000000"
-        "000000000000000000000000"
-        "010000000000000000000000"
-        "50"
-        "01000000"
-        "05000000"
-        "000000000000000000000000"
-        "010000000000000000000000"
-        "020000000000000000000000"
-        "000000000000000000000000"
-        "010000000000000000000000"
-        "00000000");
+        "0100000045" // name "E"
+        "030000000000803f000000400000404000000000000000000000000000000000000000000000803f"
+        "000000000000000004000000" // U, M, F
+        "5800000000"               // 'X'
+        "5401000000000000000700000009000000010000000000000000000000020000000000000000000000"
+        "500000000002000000000000000000000000000000010000000000000000000000"
+        "500100000005000000000000000000000000000000010000000000000000000000"
+        "020000000000000000000000000000000000000000000000010000000000000000000000"
+        "00000000"); // trailer
     auto shape = readRecord(record);
     ASSERT_TRUE(shape);
     const SgPolyMesh *mesh = shape->getPolyMesh();
@@ -162,24 +143,14 @@ TEST(ExchangeReaderTest, EmptyBlocksAndUnknownFacetTypes) {
 
 TEST(ExchangeReaderTest, FigureRoundTripKeepsVerticesUVsAndFacetOrder) {
     SgAppSettings().setInt("FacetorBridgeTools", 1); // weld the base geometry
-    auto figure = std::make_unique<SgSkeleton>("Body");
+    // Two bones that share a seam, each with quads of one material and a triangle of the other,
+    // partly mapped (-1 is "no UV").
+    std::unique_ptr<SgSkeleton> figure(sgTestFigure("Body", 2, 2));
     figure->setLabel("Body");
-    const std::vector<SgVec3> points = {{0, 0, 0}, {12.5f, 0, 0}, {0, 7.25f, 0}, {3, 3, -4}};
-    const std::vector<SgVec2> uvs = {{0, 0}, {1, 0}, {0, 1}, {0.5f, 0.5f}};
-    for (int b = 0; b < 2; ++b) {
-        auto *bone = new SgBone(QString("bone%1").arg(b));
-        figure->addBone(bone);
-        std::vector<SgVec3> moved = points;
-        for (SgVec3 &p : moved)
-            p += SgVec3(100.0f * float(b + 1), 0, 0);
-        SgPolyMesh *mesh = sgTestMesh(moved, uvs);
-        sgTestAddFacet(*mesh, 1, {{0, 0}, {1, 1}, {2, 2}});
-        sgTestAddFacet(*mesh, 0, {{0, 0}, {1, 1}, {3, 3}, {2, 2}});
-        sgTestAddFacet(*mesh, 0, {{1, 1}, {3, -1}, {2, 2}}); // partly mapped: -1 is "no UV"
-        const QStringList materials = {"skin", "nails"};
-        sgTestAttach(bone, sgTestShape(bone->getName(), mesh,
-                                       b == 0 ? materials : QStringList{"nails", "skin"}));
-    }
+    const SgBoneList bones = figure->getAllBones();
+    for (int b = 0; b < 2; ++b)
+        sgTestAddFacet(*static_cast<SgPolyMesh *>(sgTestGeometry(bones[b])), 1 - b,
+                       {{0, 0}, {4, -1}, {1, 1}});
 
     SgExchangeWriter writer(figure.get(), QString());
     ASSERT_GT(writer.getSize(), 0);

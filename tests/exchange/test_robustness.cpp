@@ -46,7 +46,7 @@ void putInt(QByteArray &bytes, qsizetype at, std::int32_t value) {
 
 } // namespace
 
-TEST(ExchangeRobustnessTest, EveryPrefixIsRejectedCleanly) {
+TEST(ExchangeRobustnessTest, EveryPrefixAndBadCountsAndIndicesAreRejectedCleanly) {
     const QByteArray record = validRecord();
     ASSERT_GT(record.size(), 100);
     ASSERT_TRUE(readRecord(record));
@@ -58,10 +58,8 @@ TEST(ExchangeRobustnessTest, EveryPrefixIsRejectedCleanly) {
     QString trailer = "kept";
     EXPECT_EQ(SgExchangeReader(nullptr, 100).readShape(trailer), nullptr);
     EXPECT_EQ(trailer, "kept");
-}
 
-TEST(ExchangeRobustnessTest, BadCountsAndIndicesAreRejected) {
-    const QByteArray record = validRecord();
+    // Bad counts and indices, and values that are not finite.
     const qsizetype v = 4 + 6;                                 // vertex count
     const qsizetype u = v + 4 + 6 * 12;                        // UV count
     const qsizetype m = u + 4 + 3 * 8;                         // material count

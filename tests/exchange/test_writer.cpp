@@ -30,12 +30,6 @@ using namespace exchangetest;
 
 namespace {
 
-// Maps the material's "Bump Strength" to `texture` through the property, as the host does.
-void mapBump(SgDefaultMaterial &material, SgTexture *texture) {
-    material.getBumpControl()->setMapValue(texture);
-    material.getBumpControl()->setMapped(true);
-}
-
 // A prop node with one polygon shape; the node owns everything.
 std::unique_ptr<SgNode> prop(const QString &label, SgPolyMesh *mesh,
                              const std::vector<SgMaterial *> &materials) {
@@ -78,7 +72,7 @@ QString writeImage(const QString &path, QColor color) {
 
 } // namespace
 
-TEST(ExchangeWriterTest, WorkedRecordByteForByte) {
+TEST(ExchangeWriterTest, WorkedRecordByteForByteAndNeverPastItsDestination) {
     SgPolyMesh *mesh = sgTestMesh({{0, 0, 0}, {10, 0, 0}, {0, 10, 0}});
     sgTestAddFacet(*mesh, 0, {{0, 0, 0}, {1, 0, 0}, {2, 0, 0}});
     auto node = prop("A", mesh, {new BareMaterial("M")});
@@ -87,43 +81,41 @@ TEST(ExchangeWriterTest, WorkedRecordByteForByte) {
     const QByteArray r = writeNode(node.get(), QString(), &measured);
     EXPECT_EQ(measured, 4257);
     ASSERT_EQ(r.size(), 165);
-
-    const QByteArray expected = QByteArray::fromHex("01000000"
-                                                    "41"                       // name "A" at 0
-                                                    "03000000"                 // V at 5
-                                                    "000000000000000000000000" // vertices at 9
-                                                    "0000803f0000000000000000"
-                                                    "000000000000803f00000000"
-                                                    "00000000" // U at 45
-                                                    "01000000" // materials block at 49
-                                                    "6d"
-                                                    "01000000"
-                                                    "4d" // 'm', name M
-                                                    "63"
-                                                    "000000000000000000000000"
-                                                    "00000000"
-                                                    "00000000" // 'c', colour, two strings
-                                                    "73"
-                                                    "000000000000000000000000" // 's', colour
-                                                    "67"
-                                                    "00000000"
-                                                    "74"
-                                                    "00000000"
-                                                    "62"
-                                                    "00000000" // 'g', 't', 'b'
-                                                    "00000000"
-                                                    "00000000" // bump strings
-                                                    "01000000" // F at 116
-                                                    "54"
-                                                    "00000000" // 'T', material 0 at 120
-                                                    "000000000000000000000000"
-                                                    "010000000000000000000000"
-                                                    "020000000000000000000000"
-                                                    "00000000"); // empty trailer at 161
+    // Name "A" at 0, V at 5 and the vertices at 9, U at 45, the materials block at 49, F at 116,
+    // the facet at 120, the empty trailer at 161.
+    const QByteArray expected = QByteArray::fromHex(
+        "0100000041"
+        "030000000000000000000000000000000000803f0000000000000000000000000000803f00000000"
+        "00000000010000006d010000004d"                   // U, M, 'm' and name "M"
+        "630000000000000000000000000000000000000000"     // 'c', colour, two strings
+        "73000000000000000000000000"                     // 's', colour
+        "6700000000740000000062000000000000000000000000" // 'g', 't', 'b' and two strings
+        "010000005400000000"                             // F, 'T' in material 0
+        "000000000000000000000000010000000000000000000000020000000000000000000000"
+        "00000000");
     EXPECT_EQ(r.toHex(), expected.toHex());
+
+    // Every capacity short of the record fails, logged, without a byte past it; the exact one
+    // fits.
+    SgExchangeWriter writer(node.get(), QString());
+    for (int capacity = 0; capacity < r.size(); ++capacity) {
+        clearLog();
+        QByteArray buffer(200, '\x7f');
+        ASSERT_EQ(writer.write(buffer.data(), capacity), 0) << capacity;
+        ASSERT_EQ(buffer.mid(capacity), QByteArray(200 - capacity, '\x7f')) << capacity;
+        EXPECT_EQ(logLines().isEmpty(), capacity == 0) << capacity;
+    }
+    QByteArray whole(200, '\x7f');
+    EXPECT_EQ(writer.write(whole.data(), r.size()), r.size());
+    EXPECT_EQ(whole.left(r.size()), r);
+    // A string that does not fit says so too.
+    clearLog();
+    EXPECT_EQ(writer.write(whole.data(), 2), 0);
+    EXPECT_EQ(logLines(), (QStringList{"Error writting string to shared memory map.",
+                                       "Error writting node to shared memory map."}));
 }
 
-TEST(ExchangeWriterTest, FacetKindsUVsTrailerAndTheMeasure) {
+TEST(ExchangeWriterTest, FacetKindsOrderUVsTrailerAndTheMeasure) {
     // Vertices in modeler units, no UVs, a trailer.
     SgPolyMesh *triangles = sgTestMesh({{10, 20, 30}, {0, 0, 0}, {1, 1, 1}, {2, 2, 2}});
     sgTestAddFacet(*triangles, 0, {{0}, {1}, {2}});
@@ -160,17 +152,33 @@ TEST(ExchangeWriterTest, FacetKindsUVsTrailerAndTheMeasure) {
     const QByteArray w = writeNode(wideNode.get(), QString(), &measured);
     EXPECT_EQ(w.size(), 9 + most * 12 + 4 + 67 + 4 + 3 * (9 + most * 12) + 4);
     EXPECT_LE(w.size(), measured);
-}
 
-TEST(ExchangeWriterTest, FacetsGoInMaterialOrderAndUnknownMaterialsAreLeftOut) {
-    SgPolyMesh *mesh = sgTestMesh({{0, 0, 0}, {1, 0, 0}, {0, 1, 0}, {1, 1, 0}, {2, 2, 0}});
-    sgTestAddFacet(*mesh, 1, {{0}, {1}, {2}});           // triangle of material 1 first
-    sgTestAddFacet(*mesh, 0, {{0}, {1}, {3}, {2}});      // quad of material 0
-    sgTestAddFacet(*mesh, 5, {{1}, {2}, {3}});           // material 5 of 2: left out
-    sgTestAddFacet(*mesh, 0, {{3}, {2}, {1}});           // triangle of material 0
-    sgTestAddFacet(*mesh, 1, {{0}, {1}, {2}, {3}, {4}}); // polygon of material 1
-    auto node = prop("O", mesh, {new BareMaterial("a"), new BareMaterial("b")});
-    EXPECT_EQ(facetsOf(decode(node.get())), (QStringList{"T0:3/3", "Q0:0/4", "T1:0/3", "P1:0/5"}));
+    // Facets go in material order, kinds in turn; facets of unknown materials are left out.
+    SgPolyMesh *mixed = sgTestMesh({{0, 0, 0}, {1, 0, 0}, {0, 1, 0}, {1, 1, 0}, {2, 2, 0}});
+    sgTestAddFacet(*mixed, 1, {{0}, {1}, {2}});           // triangle of material 1 first
+    sgTestAddFacet(*mixed, 0, {{0}, {1}, {3}, {2}});      // quad of material 0
+    sgTestAddFacet(*mixed, 5, {{1}, {2}, {3}});           // material 5 of 2: left out
+    sgTestAddFacet(*mixed, 0, {{3}, {2}, {1}});           // triangle of material 0
+    sgTestAddFacet(*mixed, 1, {{0}, {1}, {2}, {3}, {4}}); // polygon of material 1
+    auto mixedNode = prop("O", mixed, {new BareMaterial("a"), new BareMaterial("b")});
+    EXPECT_EQ(facetsOf(decode(mixedNode.get())),
+              (QStringList{"T0:3/3", "Q0:0/4", "T1:0/3", "P1:0/5"}));
+
+    // Nothing to send measures zero and writes nothing.
+    SgNode bare("empty");
+    SgExchangeWriter writer(&bare, QString());
+    EXPECT_EQ(writer.getSize(), 0);
+    char byte = 0;
+    EXPECT_EQ(writer.write(&byte), 0);
+    EXPECT_EQ(SgExchangeWriter(nullptr, QString()).write(&byte), 0);
+
+    // A shape without materials or UVs still fits its measure, with no facet (none has a
+    // material to go with).
+    SgPolyMesh *plain = sgTestMesh({{0, 0, 0}, {1, 0, 0}, {0, 1, 0}});
+    sgTestAddFacet(*plain, 0, {{0}, {1}, {2}});
+    auto plainNode = prop("N", plain, {});
+    EXPECT_LE(writeNode(plainNode.get(), QString(), &measured).size(), measured);
+    EXPECT_TRUE(decode(plainNode.get()).facets.empty());
 }
 
 TEST(ExchangeWriterTest, MaterialEntryRules) {
@@ -206,7 +214,7 @@ TEST(ExchangeWriterTest, MaterialEntryRules) {
         EXPECT_EQ(value, 0.0f);
 }
 
-TEST(ExchangeWriterTest, ImagesAreCopiedAsJpegOncePerImageFileUnderSafeUniqueNames) {
+TEST(ExchangeWriterTest, ImagesAreCopiedAsJpegOncePerImageFileUnderSafeUniqueMeasuredNames) {
     const QString source = writeImage(tempPath() + "/images/a/wood.png", Qt::red);
     const QString other = writeImage(tempPath() + "/images/b/wood.png", Qt::blue);
     SgTexture *wood = sgApp->getImageMgr()->getImage(source);
@@ -221,7 +229,8 @@ TEST(ExchangeWriterTest, ImagesAreCopiedAsJpegOncePerImageFileUnderSafeUniqueNam
     first->setColorMap(wood);
     auto *second = new SgDefaultMaterial("second");
     second->setColorMap(wood);
-    mapBump(*second, otherWood);
+    second->getBumpControl()->setMapValue(otherWood); // mapped through the property
+    second->getBumpControl()->setMapped(true);
     auto node = prop("W", sgTestMesh({}), {first, second});
 
     const QString copy = SgMaterialBlockWriter::jpegCopyPath(wood);
@@ -270,45 +279,25 @@ TEST(ExchangeWriterTest, ImagesAreCopiedAsJpegOncePerImageFileUnderSafeUniqueNam
     // An image that cannot be read gives an empty copy path.
     SgTexture missing(tempPath() + "/images/none.png");
     EXPECT_EQ(SgMaterialBlockWriter::exportTextureAsJpeg(&missing), QString());
-}
 
-TEST(ExchangeWriterTest, LongImagePathsStayInsideTheMeasuredSize) {
+    // Long image paths stay inside the measured size.
     QString deep = tempPath() + "/images";
     while (deep.size() < 1400)
         deep += "/" + QString(60, QLatin1Char('d'));
-    const QString source =
-        writeImage(deep + "/" + QString(200, QLatin1Char('n')) + ".png", Qt::green);
+    SgTexture *longImage = sgApp->getImageMgr()->getImage(
+        writeImage(deep + "/" + QString(200, QLatin1Char('n')) + ".png", Qt::green));
     auto *material = new SgDefaultMaterial("long");
-    material->setColorMap(sgApp->getImageMgr()->getImage(source));
-    mapBump(*material, sgApp->getImageMgr()->getImage(source));
-    auto node = prop("L", sgTestMesh({}), {material});
-
-    SgExchangeWriter writer(node.get(), QString());
+    material->setColorMap(longImage);
+    material->getBumpControl()->setMapValue(longImage);
+    material->getBumpControl()->setMapped(true);
+    auto longNode = prop("L", sgTestMesh({}), {material});
+    SgExchangeWriter writer(longNode.get(), QString());
     QByteArray buffer(writer.getSize() + 16, '\x7f');
     const std::int32_t written = writer.write(buffer.data());
     ASSERT_GT(written, 0);
     EXPECT_LE(written, writer.getSize());
     EXPECT_TRUE(buffer.contains(deep.toLatin1()));
     EXPECT_EQ(buffer.right(16), QByteArray(16, '\x7f'));
-}
-
-TEST(ExchangeWriterTest, EmptyNodesAndShapesWithoutMaterialsOrUVs) {
-    // Nothing to send measures zero and writes nothing.
-    SgNode bare("empty");
-    SgExchangeWriter writer(&bare, QString());
-    EXPECT_EQ(writer.getSize(), 0);
-    char byte = 0;
-    EXPECT_EQ(writer.write(&byte), 0);
-    EXPECT_EQ(SgExchangeWriter(nullptr, QString()).write(&byte), 0);
-
-    // A shape without materials or UVs still fits its measure, with no facet (none has a
-    // material to go with).
-    SgPolyMesh *mesh = sgTestMesh({{0, 0, 0}, {1, 0, 0}, {0, 1, 0}});
-    sgTestAddFacet(*mesh, 0, {{0}, {1}, {2}});
-    auto node = prop("N", mesh, {});
-    std::int32_t measured = 0;
-    EXPECT_LE(writeNode(node.get(), QString(), &measured).size(), measured);
-    EXPECT_TRUE(decode(node.get()).facets.empty());
 }
 
 TEST(ExchangeWriterTest, SubdivisionPatchesAreWrittenAsQuads) {
@@ -334,29 +323,4 @@ TEST(ExchangeWriterTest, SubdivisionPatchesAreWrittenAsQuads) {
     EXPECT_EQ(n.corners[0].uv, 0);
     EXPECT_EQ(n.corners[0].third, 0);
     EXPECT_EQ(n.corners[4].third, -1);
-}
-
-TEST(ExchangeWriterTest, ADestinationTooSmallIsNeverOverrun) {
-    SgPolyMesh *mesh = sgTestMesh({{0, 0, 0}, {10, 0, 0}, {0, 10, 0}});
-    sgTestAddFacet(*mesh, 0, {{0}, {1}, {2}});
-    auto node = prop("A", mesh, {new BareMaterial("a-long-material-name")});
-    SgExchangeWriter writer(node.get(), QString());
-    // Every capacity short of the record fails without a byte past it; the exact one fits.
-    QByteArray whole(200, '\x7f');
-    const std::int32_t size = writer.write(whole.data(), 200);
-    ASSERT_GT(size, 100);
-    for (int capacity = 0; capacity < size; ++capacity) {
-        clearLog();
-        QByteArray buffer(200, '\x7f');
-        ASSERT_EQ(writer.write(buffer.data(), capacity), 0) << capacity;
-        ASSERT_EQ(buffer.mid(capacity), QByteArray(200 - capacity, '\x7f')) << capacity;
-        EXPECT_EQ(logLines().isEmpty(), capacity == 0) << capacity; // the failure is logged
-    }
-    EXPECT_EQ(writer.write(whole.data(), size), size);
-    // A string that does not fit says so too.
-    clearLog();
-    QByteArray buffer(200, '\x7f');
-    EXPECT_EQ(writer.write(buffer.data(), 2), 0);
-    EXPECT_EQ(logLines(), (QStringList{"Error writting string to shared memory map.",
-                                       "Error writting node to shared memory map."}));
 }

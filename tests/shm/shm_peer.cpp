@@ -13,8 +13,6 @@
 
 namespace {
 
-using Clock = std::chrono::steady_clock;
-
 std::unique_ptr<SgSharedMemory> segment;
 
 // Every wait of the peer is bounded: a lock that nobody releases makes a command answer

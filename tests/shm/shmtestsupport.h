@@ -21,11 +21,11 @@ inline std::string uniqueKey(const std::string &what) {
     return "shmtest-" + what + "-" + std::to_string(SG_TEST_PID) + "-" + std::to_string(++serial);
 }
 
+using Clock = std::chrono::steady_clock;
+
 // Milliseconds since `start`.
-inline long long msSince(std::chrono::steady_clock::time_point start) {
-    return std::chrono::duration_cast<std::chrono::milliseconds>(std::chrono::steady_clock::now() -
-                                                                 start)
-        .count();
+inline long long msSince(Clock::time_point start) {
+    return std::chrono::duration_cast<std::chrono::milliseconds>(Clock::now() - start).count();
 }
 
 // The 32-bit word at `offset` of an attached segment, read and written in place.

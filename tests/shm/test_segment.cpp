@@ -11,8 +11,6 @@
 #include <cstring>
 #include <memory>
 
-using Clock = std::chrono::steady_clock;
-
 TEST(SgSharedMemory, NamesFromKeyBytesAndAFreshControlRecord) {
     SgTestSegment abc("abc");
     EXPECT_EQ(abc.dataName(), "sgsharedmemory-616263");
@@ -29,7 +27,7 @@ TEST(SgSharedMemory, NamesFromKeyBytesAndAFreshControlRecord) {
     EXPECT_EQ(std::memcmp(&fresh, expected, sizeof expected), 0);
 }
 
-TEST(SgSharedMemory, RejectsBadSizeAndEmptyKeyLeavingNothingOpen) {
+TEST(SgSharedMemory, BadSizeEmptyKeyAndMissingSegmentFailLeavingNothingOpen) {
     SgTestSegment memory(uniqueKey("size"));
     EXPECT_FALSE(memory.create(0));
     EXPECT_EQ(memory.status(), SgSharedMemory::StatusBadSize);
@@ -42,32 +40,31 @@ TEST(SgSharedMemory, RejectsBadSizeAndEmptyKeyLeavingNothingOpen) {
     EXPECT_FALSE(empty.create(16));
     EXPECT_EQ(empty.status(), SgSharedMemory::StatusEmptyKey);
     EXPECT_FALSE(empty.exists());
-}
 
-TEST(SgSharedMemory, MissingSegmentFailsLockAttachAndDetach) {
-    SgTestSegment memory(uniqueKey("missing"));
+    // A missing segment fails lock, attach and detach at once.
+    SgTestSegment absent(uniqueKey("missing"));
     long long fastest = 1000;
     for (int attempt = 0; attempt < 3; ++attempt) { // the fastest of three, against load spikes
         const auto start = Clock::now();
-        EXPECT_FALSE(memory.lock());
-        EXPECT_FALSE(memory.tryLock(25));
+        EXPECT_FALSE(absent.lock());
+        EXPECT_FALSE(absent.tryLock(25));
         fastest = std::min(fastest, msSince(start));
     }
     EXPECT_LT(fastest, 20);
-    EXPECT_EQ(memory.status(), SgSharedMemory::StatusFailed); // no lock-failure status here
-    EXPECT_EQ(memory.lockDepth(), 0);
+    EXPECT_EQ(absent.status(), SgSharedMemory::StatusFailed); // no lock-failure status here
+    EXPECT_EQ(absent.lockDepth(), 0);
 
-    EXPECT_FALSE(memory.attach(SgSharedMemory::kReadWrite));
-    EXPECT_EQ(memory.status(), SgSharedMemory::StatusLockFailed);
-    EXPECT_FALSE(memory.isAttached());
-    EXPECT_EQ(memory.data(), nullptr);
+    EXPECT_FALSE(absent.attach(SgSharedMemory::kReadWrite));
+    EXPECT_EQ(absent.status(), SgSharedMemory::StatusLockFailed);
+    EXPECT_FALSE(absent.isAttached());
+    EXPECT_EQ(absent.data(), nullptr);
 
-    EXPECT_FALSE(memory.detach());
-    EXPECT_EQ(memory.status(), SgSharedMemory::StatusNotFound);
-    EXPECT_FALSE(memory.exists());
+    EXPECT_FALSE(absent.detach());
+    EXPECT_EQ(absent.status(), SgSharedMemory::StatusNotFound);
+    EXPECT_FALSE(absent.exists());
 }
 
-TEST(SgSharedMemory, TwoProcessesShareDataCountAndRefuseSecondCreate) {
+TEST(SgSharedMemory, TwoProcessesShareDataCountsAndAnExclusiveNestedTimedLock) {
     const std::string key = uniqueKey("share");
     SgTestSegment memory(key);
     ASSERT_TRUE(memory.create(64));
@@ -94,17 +91,9 @@ TEST(SgSharedMemory, TwoProcessesShareDataCountAndRefuseSecondCreate) {
     ASSERT_TRUE(memory.attach(SgSharedMemory::kReadOnly));
     EXPECT_EQ(memory.attachCount(), 1); // both earlier attachments were uncounted
     EXPECT_EQ(readWord(memory, 0), 4242u);
-    peer.quit();
-}
 
-TEST(SgSharedMemory, LockIsExclusiveNestedAndTimed) {
-    const std::string key = uniqueKey("lock");
-    SgTestSegment memory(key);
-    ASSERT_TRUE(memory.create(16));
-    ShmPeerProcess peer;
-    ASSERT_TRUE(peer.ok("open " + key));
+    // The lock is exclusive between the processes, nested within one, and timed.
     ASSERT_TRUE(peer.ok("attach 1"));
-
     ASSERT_TRUE(memory.lock()) << kSgTestStuckLock;
     ASSERT_TRUE(memory.lock()) << kSgTestStuckLock;
     EXPECT_EQ(memory.lockDepth(), 2);

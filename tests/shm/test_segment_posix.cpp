@@ -21,17 +21,6 @@
 #include <unistd.h>
 #include <vector>
 
-using Clock = std::chrono::steady_clock;
-
-namespace {
-
-// The entries of /dev/shm that belong to the segment of `key` (data, "-ref" and "-lock").
-QStringList objectsOf(const std::string &key) {
-    return sgTestSegmentFiles(key.c_str());
-}
-
-} // namespace
-
 TEST(SgSharedMemoryPosix, ALoneHolderKilledLeavesNamesThatTheNextCreateCleansUp) {
     // Its names stay as leftovers that the next open cleans up, and a fresh create starts from
     // a fresh reference record. (A survivor's remove after a holder was killed while attached
@@ -43,7 +32,7 @@ TEST(SgSharedMemoryPosix, ALoneHolderKilledLeavesNamesThatTheNextCreateCleansUp)
     ASSERT_TRUE(peer.ok("attach 1"));
     ASSERT_TRUE(peer.ok("lock"));
     peer.kill();
-    EXPECT_FALSE(objectsOf(lone).isEmpty());
+    EXPECT_FALSE(sgTestSegmentFiles(lone.c_str()).isEmpty());
     SgTestSegment memory(lone);
     EXPECT_FALSE(memory.exists());
     ASSERT_TRUE(memory.create(16));
@@ -52,17 +41,17 @@ TEST(SgSharedMemoryPosix, ALoneHolderKilledLeavesNamesThatTheNextCreateCleansUp)
     EXPECT_TRUE(memory.tryLock(0));
     memory.unlock();
     EXPECT_TRUE(memory.remove(SgSharedMemory::kRemoveLocked));
-    EXPECT_TRUE(objectsOf(lone).isEmpty());
+    EXPECT_TRUE(sgTestSegmentFiles(lone.c_str()).isEmpty());
 }
 
 TEST(SgSharedMemoryPosix, ObjectsArePrivateAndForeignOnesAreNotTrusted) {
     const std::string key = uniqueKey("mode");
     SgTestSegment memory(key);
     EXPECT_FALSE(memory.lock()); // a lock on a missing segment creates nothing
-    EXPECT_TRUE(objectsOf(key).isEmpty());
+    EXPECT_TRUE(sgTestSegmentFiles(key.c_str()).isEmpty());
     ASSERT_TRUE(memory.create(16));
     ASSERT_TRUE(memory.lock()) << kSgTestStuckLock;
-    const QStringList objects = objectsOf(key);
+    const QStringList objects = sgTestSegmentFiles(key.c_str());
     EXPECT_EQ(objects.size(), 3);
     for (const QString &name : objects) {
         const std::string path = "/dev/shm/" + name.toStdString();
@@ -89,7 +78,7 @@ TEST(SgSharedMemoryPosix, ObjectsArePrivateAndForeignOnesAreNotTrusted) {
     EXPECT_EQ(info.st_size, 0);
     close(fd);
     shm_unlink(name.c_str());
-    EXPECT_TRUE(objectsOf(exposed).isEmpty());
+    EXPECT_TRUE(sgTestSegmentFiles(exposed.c_str()).isEmpty());
 
     // A live data object whose reference record has gone is not taken over.
     const std::string orphan = uniqueKey("orphan");
@@ -157,8 +146,8 @@ TEST(SgSharedMemoryPosix, ManyProcessesChurningOneKeyLoseNoUpdate) {
         peer->quit();
     EXPECT_TRUE(memory.detach());
     EXPECT_TRUE(memory.remove(SgSharedMemory::kRemoveLocked));
-    EXPECT_TRUE(objectsOf(anchored).isEmpty());
-    EXPECT_TRUE(objectsOf(loose).isEmpty());
+    EXPECT_TRUE(sgTestSegmentFiles(anchored.c_str()).isEmpty());
+    EXPECT_TRUE(sgTestSegmentFiles(loose.c_str()).isEmpty());
 }
 
 TEST(SgSharedMemoryPosix, BigSegmentsFillWholeAndTooLittleRoomFailsTheCreate) {
@@ -181,7 +170,7 @@ TEST(SgSharedMemoryPosix, BigSegmentsFillWholeAndTooLittleRoomFailsTheCreate) {
             EXPECT_TRUE(writer.detach());
             EXPECT_TRUE(writer.remove(SgSharedMemory::kRemoveUnlocked));
         }
-        EXPECT_TRUE(objectsOf(key).isEmpty());
+        EXPECT_TRUE(sgTestSegmentFiles(key.c_str()).isEmpty());
     }
 
     // Where /dev/shm has too little room the create fails and leaves nothing, instead of a
@@ -197,7 +186,7 @@ TEST(SgSharedMemoryPosix, BigSegmentsFillWholeAndTooLittleRoomFailsTheCreate) {
         SgSharedMemory tooBig(key);
         const bool refused = !tooBig.create(4 << 20) &&
                              tooBig.status() == SgSharedMemory::StatusFailed &&
-                             objectsOf(key).isEmpty();
+                             sgTestSegmentFiles(key.c_str()).isEmpty();
         SgSharedMemory fits(key);
         const bool created = fits.create(256 << 10) && fits.remove(SgSharedMemory::kRemoveUnlocked);
         _exit(refused && created ? 0 : 1);
