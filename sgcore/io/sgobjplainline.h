@@ -35,9 +35,10 @@
 // digits. Another line of up to 64 bytes is classified in one sweep of 16-byte compares into
 // bit masks (digits, points, signs, slashes, blanks, line end), and the numbers' and indices'
 // places come from the masks, not from the bytes read before them, so their conversions
-// overlap. Longer faces, and faces with an empty index ("v//vn"), go through a word-at-a-time scan.
-// Every read stays below `limit`, which must leave kReadAhead readable bytes behind it: the caller
-// calls only while the line starts before `limit`.
+// overlap. Numbers convert two at a time in SSE2 registers. Longer faces, and faces with an empty
+// index ("v//vn"), go through a word-at-a-time scan. Every read stays below `limit`, which must
+// leave kReadAhead readable bytes behind it: the caller calls only while the line starts before
+// `limit`.
 namespace SgObjPlainLine {
 
 constexpr std::ptrdiff_t kReadAhead = 96;
@@ -82,7 +83,8 @@ constexpr double kPowersOfTen[] = {1e0, 1e1, 1e2,  1e3,  1e4,  1e5,  1e6,  1e7,
     return others ? std::countr_zero(others) / 8 : 8;
 }
 
-constexpr double kInversePowersOfTen[] = {1e0, 1e-1, 1e-2, 1e-3, 1e-4, 1e-5, 1e-6, 1e-7};
+constexpr double kInversePowersOfTen[] = {1e0,  1e-1, 1e-2,  1e-3,  1e-4,  1e-5,  1e-6,  1e-7,
+                                          1e-8, 1e-9, 1e-10, 1e-11, 1e-12, 1e-13, 1e-14, 1e-15};
 
 // The float nearest to ±mantissa / 10^fractionDigits (mantissa below 10^15, at most fifteen
 // fraction digits), as std::from_chars rounds it; false in the one case this cannot decide.
@@ -241,6 +243,13 @@ struct NumberShape {
     };
     LinePattern pattern;
     Number numbers[3];
+    // The same numbers for numberPair, the last one repeated up to four: the first digit's
+    // place, the digits' bytes in the word there and in the word one byte further on, the
+    // power of ten that scales the digits' word value to the number, and the sign bit.
+    alignas(16) std::uint64_t pairLow[4], pairHigh[4];
+    alignas(16) double pairScale[4];
+    alignas(16) std::int32_t pairAt[4];
+    alignas(16) std::uint32_t pairSign[4];
 };
 
 // The bytes below `count` (0 to 8) of a word.
@@ -282,9 +291,56 @@ inline bool numberShape(const Masks &m, int count, NumberShape &shape) {
         // word at the first digit, the rest from the word one byte further on.
         n.low = point ? kLowBytes[integerDigits] : ~std::uint64_t(0);
         n.shift = 8 * (8 - allDigits);
+        // Read as a word with the digits from its first byte on and zeros behind them, whose
+        // value is the number times 10^(8 - allDigits + fractionDigits).
+        shape.pairAt[k] = n.digitsAt;
+        shape.pairLow[k] = kLowBytes[integerDigits];
+        shape.pairHigh[k] = kLowBytes[allDigits] ^ kLowBytes[integerDigits];
+        shape.pairScale[k] = kInversePowersOfTen[8 - allDigits + n.fractionDigits];
+        shape.pairSign[k] = n.negative ? 0x80000000u : 0;
+    }
+    for (int i = k; i < 4 && k > 0; ++i) {
+        shape.pairAt[i] = shape.pairAt[k - 1];
+        shape.pairLow[i] = shape.pairLow[k - 1];
+        shape.pairHigh[i] = shape.pairHigh[k - 1];
+        shape.pairScale[i] = shape.pairScale[k - 1];
+        shape.pairSign[i] = shape.pairSign[k - 1];
     }
     return k == count && starts == 0 && line;
 }
+
+#if defined(__SSE2__)
+// The shape's numbers `i` and `i + 1` (i is 0 or 2) of a line of its form, as the two low
+// floats of the result, converted side by side: the digits' word value (as wordValue gives it)
+// times the rounded inverse power of ten, rounded to float. That is the float std::from_chars
+// gives for every short number: for up to seven digits by toFloat's argument, and for eight
+// (whose digits may exceed 2^24) as checked for every value, point place and digit count.
+[[gnu::always_inline]] inline __m128 numberPair(const char *p, const NumberShape &s, int i) {
+    const auto words = [&](int offset) {
+        const __m128i first =
+            _mm_loadl_epi64(reinterpret_cast<const __m128i *>(p + s.pairAt[i] + offset));
+        return _mm_castpd_si128(
+            _mm_loadh_pd(_mm_castsi128_pd(first),
+                         reinterpret_cast<const double *>(p + s.pairAt[i + 1] + offset)));
+    };
+    const auto load = [](const void *x) {
+        return _mm_load_si128(reinterpret_cast<const __m128i *>(x));
+    };
+    __m128i w = _mm_or_si128(_mm_and_si128(words(0), load(s.pairLow + i)),
+                             _mm_and_si128(words(1), load(s.pairHigh + i)));
+    // Digits to values, then pairs, fours and eights of them combined (see wordValue).
+    w = _mm_and_si128(w, _mm_set1_epi8(0x0F));
+    w = _mm_add_epi16(_mm_and_si128(_mm_mullo_epi16(w, _mm_set1_epi16(10)), _mm_set1_epi16(0xFF)),
+                      _mm_srli_epi16(w, 8));
+    w = _mm_madd_epi16(w, _mm_set1_epi32(0x00010064));
+    w = _mm_add_epi64(_mm_mul_epu32(w, _mm_set1_epi64x(10000)), _mm_srli_epi64(w, 32));
+    const __m128i values = _mm_shuffle_epi32(w, _MM_SHUFFLE(3, 3, 2, 0));
+    const __m128d scaled = _mm_mul_pd(_mm_cvtepi32_pd(values), _mm_load_pd(s.pairScale + i));
+    return _mm_xor_ps(
+        _mm_cvtpd_ps(scaled),
+        _mm_castsi128_ps(_mm_loadl_epi64(reinterpret_cast<const __m128i *>(s.pairSign + i))));
+}
+#endif
 
 // One number of a line of the shape's form.
 [[gnu::always_inline]] inline bool numberOf(const char *p, const NumberShape::Number &n,
@@ -308,11 +364,18 @@ inline bool numberShape(const Masks &m, int count, NumberShape &shape) {
         shape.pattern.set(p, std::countr_zero(m.end));
     }
     next = p + shape.pattern.length + 1;
+#if defined(__SSE2__)
+    _mm_storel_pi(reinterpret_cast<__m64 *>(out), numberPair(p, shape, 0));
+    if (count == 3)
+        _mm_store_ss(out + 2, numberPair(p, shape, 2));
+    return true;
+#else
     bool ok = true;
 #pragma GCC unroll 3
     for (int k = 0; k < count; ++k)
         ok &= numberOf(p, shape.numbers[k], out[k]);
     return ok;
+#endif
 }
 
 // The bytes just after the digit runs that start at the bits of `starts`: adding a run's first
