@@ -93,13 +93,8 @@ public:
     ~StandInModeler() { qunsetenv("FACETOR_INSTALL_PATH"); }
 };
 
-class BridgeAction : public ::testing::Test {
+class BridgeAction : public SgTestCleanScene {
 protected:
-    void SetUp() override {
-        scene()->clear();
-        sgApp->getMessageSink()->clear();
-    }
-    void TearDown() override { scene()->clear(); }
     static SgScene *scene() { return sgApp->getScene(); }
 
     // Adds the nodes `names` to the selection (props made for those not in the scene).

@@ -66,14 +66,7 @@ public:
     QString fileWorkspace() const { return path(QStringLiteral("file-workspace")); }
 };
 
-class ModelerSaves : public ::testing::Test {
-protected:
-    void SetUp() override {
-        sgApp->getScene()->clear();
-        sgApp->getMessageSink()->clear();
-    }
-    void TearDown() override { sgApp->getScene()->clear(); }
-};
+class ModelerSaves : public SgTestCleanScene {};
 
 } // namespace
 

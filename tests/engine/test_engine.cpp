@@ -69,15 +69,8 @@ struct ScriptedQuestions : SgMorphLoaderQuestions {
     bool continueWithoutPose(const QString &, const QString &) override { return false; }
 };
 
-// The per-test application state: the scene emptied and the message sink cleared.
-class EngineTest : public ::testing::Test {
+class EngineTest : public SgTestCleanScene {
 protected:
-    void SetUp() override {
-        sgApp->getScene()->clear();
-        sgApp->getMessageSink()->clear();
-    }
-    void TearDown() override { sgApp->getScene()->clear(); }
-
     static SgScene *scene() { return sgApp->getScene(); }
     static QStringList logLines() { return sgApp->getMessageSink()->logLines(); }
     static QStringList statusLines() { return sgApp->getMessageSink()->statusLines(); }

@@ -1,8 +1,11 @@
 #include "tests/support/sgtestscene.h"
 
+#include "sgcore/app/sgapp.h"
+#include "sgcore/app/sgmessagesink.h"
 #include "sgcore/geometry/sgmap.h"
 #include "sgcore/materials/sgdefaultmaterial.h"
 #include "sgcore/scene/sgbone.h"
+#include "sgcore/scene/sgscene.h"
 #include "sgcore/scene/sgskeleton.h"
 
 SgPolyMesh *sgTestMesh(const std::vector<SgVec3> &vertices, const std::vector<SgVec2> &uvs) {
@@ -103,4 +106,13 @@ SgSkeleton *sgTestFigure(const QString &name, int bones, int rows, bool unusedVe
                                        {QStringLiteral("Skin"), QStringLiteral("Cloth")}));
     }
     return figure;
+}
+
+void SgTestCleanScene::SetUp() {
+    sgApp->getScene()->clear();
+    sgApp->getMessageSink()->clear();
+}
+
+void SgTestCleanScene::TearDown() {
+    sgApp->getScene()->clear();
 }

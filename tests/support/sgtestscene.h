@@ -12,9 +12,18 @@
 #include <QString>
 #include <QStringList>
 
+#include <gtest/gtest.h>
+
 #include <vector>
 
 class SgSkeleton;
+
+// A test fixture that starts and ends with an empty scene, and starts with an empty host log.
+class SgTestCleanScene : public ::testing::Test {
+protected:
+    void SetUp() override;
+    void TearDown() override;
+};
 
 // A mesh with `vertices` and, when `uvs` is not empty, a UV list; no facets.
 SgPolyMesh *sgTestMesh(const std::vector<SgVec3> &vertices, const std::vector<SgVec2> &uvs = {});
